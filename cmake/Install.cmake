@@ -1,0 +1,34 @@
+# What `cmake --install` lays out: header, libraries, CMake package, pkg-config file, documents.
+include(CMakePackageConfigHelpers)
+
+set(package_dir "${CMAKE_INSTALL_LIBDIR}/cmake/tevpf")
+
+install(TARGETS tevpf tevpf_static EXPORT tevpfTargets)
+install(FILES include/tevpf.h DESTINATION "${CMAKE_INSTALL_INCLUDEDIR}")
+install(EXPORT tevpfTargets NAMESPACE tevpf:: DESTINATION "${package_dir}")
+
+configure_package_config_file(cmake/tevpfConfig.cmake.in
+  "${PROJECT_BINARY_DIR}/tevpfConfig.cmake" INSTALL_DESTINATION "${package_dir}")
+write_basic_package_version_file("${PROJECT_BINARY_DIR}/tevpfConfigVersion.cmake"
+  COMPATIBILITY SameMajorVersion)
+install(FILES "${PROJECT_BINARY_DIR}/tevpfConfig.cmake"
+  "${PROJECT_BINARY_DIR}/tevpfConfigVersion.cmake" DESTINATION "${package_dir}")
+
+# Paths relative to the .pc file, so that an installed tree can be moved as a whole.
+file(RELATIVE_PATH TEVPF_PC_PREFIX
+  "/${CMAKE_INSTALL_LIBDIR}/pkgconfig" "/")
+string(REGEX REPLACE "/$" "" TEVPF_PC_PREFIX "${TEVPF_PC_PREFIX}")
+configure_file(cmake/tevpf.pc.in "${PROJECT_BINARY_DIR}/tevpf.pc" @ONLY)
+install(FILES "${PROJECT_BINARY_DIR}/tevpf.pc"
+  DESTINATION "${CMAKE_INSTALL_LIBDIR}/pkgconfig")
+
+install(FILES LICENSE README.md CHANGELOG.md DESTINATION "${CMAKE_INSTALL_DOCDIR}")
+install(DIRECTORY docs/ DESTINATION "${CMAKE_INSTALL_DOCDIR}" OPTIONAL
+  FILES_MATCHING PATTERN "*.md")
+
+if(TARGET tevpf_tool)
+  install(TARGETS tevpf_tool)
+  install(FILES tools/tevpf.1 DESTINATION "${CMAKE_INSTALL_MANDIR}/man1" OPTIONAL)
+  install(FILES tools/tevpf.bash DESTINATION "${CMAKE_INSTALL_DATADIR}/bash-completion/completions"
+    RENAME tevpf OPTIONAL)
+endif()

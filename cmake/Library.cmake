@@ -1,0 +1,57 @@
+# The library in its three forms: shared (tevpf), static (tevpf_static), and the static form with
+# test hooks (tevpf_testing) that only tests link.
+get_property(TEVPF_SOURCES GLOBAL PROPERTY TEVPF_SOURCES)
+if(NOT TEVPF_SOURCES)
+  file(WRITE "${PROJECT_BINARY_DIR}/empty.cpp" "")
+  set(TEVPF_SOURCES "${PROJECT_BINARY_DIR}/empty.cpp")
+endif()
+
+function(tevpf_public_header target)
+  target_include_directories(${target} PUBLIC
+    "$<BUILD_INTERFACE:${PROJECT_SOURCE_DIR}/include>"
+    "$<INSTALL_INTERFACE:${CMAKE_INSTALL_INCLUDEDIR}>")
+endfunction()
+
+add_library(tevpf_objects OBJECT ${TEVPF_SOURCES})
+tevpf_library_options(tevpf_objects)
+tevpf_public_header(tevpf_objects)
+
+add_library(tevpf SHARED $<TARGET_OBJECTS:tevpf_objects>)
+add_library(tevpf::tevpf ALIAS tevpf)
+tevpf_public_header(tevpf)
+set_target_properties(tevpf PROPERTIES
+  LINKER_LANGUAGE CXX VERSION ${PROJECT_VERSION} SOVERSION ${PROJECT_VERSION_MAJOR})
+if(WIN32)
+  set_target_properties(tevpf PROPERTIES PREFIX "")
+  target_link_options(tevpf PRIVATE -static -static-libgcc -static-libstdc++)
+else()
+  # The version script keeps the standard library's templates out of the symbol table, which
+  # hidden visibility does not.
+  set(exports "${PROJECT_SOURCE_DIR}/cmake/exports.map")
+  target_link_options(tevpf PRIVATE
+    "-Wl,--version-script=${exports}" -Wl,--exclude-libs,ALL -Wl,-Bsymbolic-functions)
+  if(NOT CMAKE_CXX_FLAGS MATCHES "-fsanitize")
+    target_link_options(tevpf PRIVATE -Wl,--no-undefined)
+  endif()
+  set_target_properties(tevpf PROPERTIES LINK_DEPENDS "${exports}")
+endif()
+
+if(WIN32)
+  # Objects marked for a DLL do not belong in a static library.
+  add_library(tevpf_static STATIC ${TEVPF_SOURCES})
+  tevpf_library_options(tevpf_static)
+else()
+  add_library(tevpf_static STATIC $<TARGET_OBJECTS:tevpf_objects>)
+endif()
+add_library(tevpf::tevpf_static ALIAS tevpf_static)
+tevpf_public_header(tevpf_static)
+target_compile_definitions(tevpf_static PUBLIC TEVPF_STATIC)
+set_target_properties(tevpf_static PROPERTIES LINKER_LANGUAGE CXX OUTPUT_NAME tevpf)
+
+if(TEVPF_BUILD_TESTS OR TEVPF_BUILD_FUZZ)
+  add_library(tevpf_testing STATIC EXCLUDE_FROM_ALL ${TEVPF_SOURCES})
+  tevpf_library_options(tevpf_testing)
+  tevpf_public_header(tevpf_testing)
+  target_include_directories(tevpf_testing INTERFACE "${PROJECT_SOURCE_DIR}")
+  target_compile_definitions(tevpf_testing PUBLIC TEVPF_STATIC TEVPF_TEST_HOOKS)
+endif()

@@ -1,0 +1,33 @@
+# tevpf_target_options(target): what every target of this project is compiled with. All of it is
+# private; a consumer sees none of these flags.
+function(tevpf_target_options target)
+  set_target_properties(${target} PROPERTIES
+    C_STANDARD 99 C_STANDARD_REQUIRED ON C_EXTENSIONS OFF
+    CXX_STANDARD 20 CXX_STANDARD_REQUIRED ON CXX_EXTENSIONS OFF)
+  if(CMAKE_SIZEOF_VOID_P EQUAL 4)
+    # Files beyond 2 GB, and the same arithmetic as on 64-bit machines: no extended precision.
+    target_compile_definitions(${target} PRIVATE _FILE_OFFSET_BITS=64)
+    target_compile_options(${target} PRIVATE -msse2 -mfpmath=sse)
+  endif()
+  target_compile_options(${target} PRIVATE -ffp-contract=off)
+  if(TEVPF_STRICT)
+    target_compile_options(${target} PRIVATE
+      -Wall -Wextra -Wpedantic -Wconversion -Wshadow -Werror)
+  endif()
+endfunction()
+
+# tevpf_library_options(target): in addition, what the library's own code is compiled with.
+function(tevpf_library_options target)
+  tevpf_target_options(${target})
+  set_target_properties(${target} PROPERTIES
+    POSITION_INDEPENDENT_CODE ON C_VISIBILITY_PRESET hidden
+    CXX_VISIBILITY_PRESET hidden VISIBILITY_INLINES_HIDDEN ON)
+  target_include_directories(${target} PRIVATE "${PROJECT_SOURCE_DIR}")
+  target_compile_definitions(${target} PRIVATE TEVPF_BUILD)
+  # The library is loaded into C programs: nothing may be thrown through it.
+  target_compile_options(${target} PRIVATE
+    $<$<COMPILE_LANGUAGE:CXX>:-fno-exceptions> $<$<COMPILE_LANGUAGE:CXX>:-fno-rtti>)
+  if(NOT WIN32)
+    target_compile_options(${target} PRIVATE -fno-semantic-interposition)
+  endif()
+endfunction()
