@@ -1,0 +1,28 @@
+// What every element record starts with, in memory as in the file.
+#pragma once
+
+#include <cstdint>
+
+#include "include/tevpf.h"
+
+extern "C" {
+
+struct TEVPF_ELEM_HEADER {
+  std::int32_t elem_type;           // PF_ELEM_LIST or PF_ELEM_TABLE
+  char elem_name[TEVPF_NAME_SIZE];  // zero-filled behind the terminator
+  char elem_desc[TEVPF_DESC_SIZE];  // likewise
+  std::int32_t btf;                 // bytes to follow: size of the stored body behind this header
+};
+static_assert(sizeof(TEVPF_ELEM_HEADER) == 108);
+
+struct TEVPF_LIST;
+struct TEVPF_TABLE;
+struct TEVPF_FILE;
+}
+
+namespace tevpf {
+
+inline constexpr std::int32_t kListHead = 12;   // stored body of a list without parameters
+inline constexpr std::int32_t kTableHead = 24;  // stored body of a table without columns
+
+}  // namespace tevpf

@@ -1,0 +1,35 @@
+// The record of one open file, and what the chain of open files offers inside the library.
+#pragma once
+
+#include <cstdint>
+#include <cstdio>
+
+#include "core/element.h"
+#include "core/name_set.h"
+
+extern "C" {
+
+struct TEVPF_FILE {
+  std::int32_t num_lists;
+  std::int32_t num_tables;
+  TEVPF_LIST** list_ptr;  // in directory order; owned, like the records
+  TEVPF_TABLE** table_ptr;
+  std::uint16_t free_lists;  // spare slots at the end of list_ptr
+  std::uint16_t free_tables;
+  TEVPF_FILE* next_file;
+  TEVPF_LIST* last_list;  // the last one found by name, or null
+  TEVPF_TABLE* last_table;
+  std::FILE* fp;           // null once a failed reopen has closed it
+  std::uint8_t new_file;   // created by this open and not saved since: deleted when closed unsaved
+  std::uint8_t read_only;  // could only be opened for reading
+  char file_name[TEVPF_FILE_NAME_SIZE];
+
+  // Beside the directory, so that names are found and checked in O(1).
+  tevpf::NameSet list_names;
+  tevpf::NameSet table_names;
+};
+
+TEVPF_API TEVPF_STATUS TEV8R1_add_file(std::FILE* stream, const char* name,
+                                       std::uint8_t read_only) noexcept;
+TEVPF_API TEVPF_STATUS TEV8R1_free_file(TEVPF_FILE* file) noexcept;
+}

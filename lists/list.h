@@ -1,0 +1,55 @@
+// Lists and their parameters as records, and what holds whole records together: their release and copy.
+//
+// Invariants: index_ptr[0 .. num_params - 1] holds each position once, ordered by name; no two names
+// compare equal; header.btf = 12 + the stored sizes of all parameters; for strings, length is the
+// length of value; description and string value are blocks of the record's own.
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+
+#include "core/element.h"
+
+extern "C" {
+
+#pragma pack(push, 4)
+struct TEVPF_PARAM {
+  char RESERVED[7];      // zero in parameters added here; carried through as read
+  std::int8_t desc_loc;  // 0: no description; strings: 1; else the description's stored offset - 8
+  TEVPF_PARAM_DEF def;
+};
+#pragma pack(pop)
+
+struct TEVPF_LIST {
+  TEVPF_ELEM_HEADER header;
+  std::int32_t num_params;
+  char RESERVED[8];          // carried through from the file
+  TEVPF_PARAM_DEF* dft_ptr;  // the five default definitions in type order, or null
+  TEVPF_PARAM* param_ptr;    // in position order
+  std::int32_t cur_param;    // position of the current parameter; -1: before the first
+  std::int32_t* index_ptr;   // positions ordered by name
+  std::int32_t free_params;  // spare slots at the end of both arrays
+
+  std::int32_t param_room;      // slots that the two blocks really have, at least what is counted
+  struct TevpfNameTable* names; // name -> position, built when look-ups pay for it; or null
+};
+
+static_assert(sizeof(void*) != 4 || sizeof(TEVPF_PARAM_DEF) == 64);
+static_assert(sizeof(void*) != 4 || sizeof(TEVPF_PARAM) == 72);
+static_assert(offsetof(TEVPF_PARAM, def) == 8);
+static_assert(offsetof(TEVPF_PARAM_DEF, description) == 32);
+}
+
+namespace tevpf {
+
+// Releases everything that the list owns, and the record; half-built ones too.
+void release_list(TEVPF_LIST* list) noexcept;
+
+// Gives `copy`, a new empty list, all that `source` holds but its name; false when memory runs out, and
+// then `copy` is still empty.
+[[nodiscard]] bool copy_list_body(const TEVPF_LIST& source, TEVPF_LIST& copy) noexcept;
+
+// Gives a new list its first spare slots; false when memory runs out.
+[[nodiscard]] bool reserve_first_params(TEVPF_LIST& list, std::int32_t slots) noexcept;
+
+}  // namespace tevpf

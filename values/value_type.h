@@ -1,0 +1,113 @@
+// The five value types: the one place that knows them by their codes.
+//
+// What differs by a number is a table (value_type); what differs by code is one dispatch with a typed
+// tag (with_number); strings are the fifth type and always stand beside the four numbers.
+#pragma once
+
+#include <cstdint>
+#include <cstring>
+#include <type_traits>
+
+#include "include/tevpf.h"
+
+namespace tevpf {
+
+struct ValueType {
+  std::int32_t size;         // bytes of a value; strings: 0, their width decides
+  std::int32_t alignment;    // of a value in a row
+  std::int32_t param_part;   // stored type part of a parameter; strings: length field alone
+  std::int32_t column_part;  // stored limits of a column
+  const char* word;          // in the error context of conversions
+};
+
+// In the order of the type codes, from PF_TYPE_INT on.
+inline constexpr ValueType kValueTypes[] = {
+    {4, 4, 12, 8, "integer"}, {4, 4, 16, 12, "real"},  {0, 1, 4, 0, ""},
+    {8, 8, 28, 20, "double"}, {2, 2, 6, 4, "short"},
+};
+
+constexpr bool is_value_type(std::int32_t type) noexcept {
+  return type >= PF_TYPE_INT && type <= PF_TYPE_SHORT;
+}
+
+// The facts of a valid type.
+constexpr const ValueType& value_type(std::int32_t type) noexcept {
+  return kValueTypes[type - PF_TYPE_INT];
+}
+
+// Bytes of one value of a valid type, in 64 bits whatever the width.
+constexpr std::int64_t value_size(std::int32_t type, std::int32_t width) noexcept {
+  return type == PF_TYPE_STRING ? std::int64_t{width} + 1 : value_type(type).size;
+}
+
+template <class T>
+inline constexpr bool kIsFloating = std::is_floating_point_v<T>;
+
+// Calls f with a value of the C++ type behind a number's type code: int32_t, float, double or int16_t.
+// The type must be one of the four numbers.
+template <class F>
+decltype(auto) with_number(std::int32_t type, F&& f) {
+  switch (type) {
+    case PF_TYPE_REAL:
+      return f(float{});
+    case PF_TYPE_DOUBLE:
+      return f(double{});
+    case PF_TYPE_SHORT:
+      return f(std::int16_t{});
+    default:
+      return f(std::int32_t{});
+  }
+}
+
+constexpr bool is_number_type(std::int32_t type) noexcept {
+  return is_value_type(type) && type != PF_TYPE_STRING;
+}
+
+constexpr bool is_floating_type(std::int32_t type) noexcept {
+  return type == PF_TYPE_REAL || type == PF_TYPE_DOUBLE;
+}
+
+// Values in rows and callers' buffers lie at any address.
+template <class T>
+T load(const void* place) noexcept {
+  static_assert(std::is_trivially_copyable_v<T>);
+  T value;
+  std::memcpy(&value, place, sizeof value);
+  return value;
+}
+
+template <class T>
+void store(void* place, T value) noexcept {
+  static_assert(std::is_trivially_copyable_v<T>);
+  std::memcpy(place, &value, sizeof value);
+}
+
+// The type part of a parameter definition, and the limits of a column definition, that hold a T.
+// Their fields may be unaligned: copy them, do not point at them.
+template <class T, class Def>
+auto& number_part(Def& definition) noexcept {
+  if constexpr (std::is_same_v<T, std::int32_t>) {
+    return definition.part.i32;
+  } else if constexpr (std::is_same_v<T, std::int16_t>) {
+    return definition.part.i16;
+  } else if constexpr (std::is_same_v<T, float>) {
+    return definition.part.f32;
+  } else {
+    return definition.part.f64;
+  }
+}
+
+template <class T, class Def>
+auto& limits_of(Def& definition) noexcept {
+  if constexpr (std::is_same_v<T, std::int32_t>) {
+    return definition.limits.i32;
+  } else if constexpr (std::is_same_v<T, std::int16_t>) {
+    return definition.limits.i16;
+  } else if constexpr (std::is_same_v<T, float>) {
+    return definition.limits.f32;
+  } else {
+    return definition.limits.f64;
+  }
+}
+
+}  // namespace tevpf
