@@ -31,5 +31,6 @@ export PKG_CONFIG_PATH
 read -ra flags <<<"$cflags $(pkg-config --cflags tevpf)"
 read -ra libs <<<"$(pkg-config --libs tevpf)"
 "$cc" -std=c99 "${flags[@]}" "$source/consumer.c" -o "$work/by_pkg_config" "${libs[@]}"
-export LD_LIBRARY_PATH="$(pkg-config --variable=libdir tevpf)${LD_LIBRARY_PATH:+:$LD_LIBRARY_PATH}"
+LD_LIBRARY_PATH=$(pkg-config --variable=libdir tevpf)
+export LD_LIBRARY_PATH
 run pkg-config "$work/by_pkg_config"

@@ -1,0 +1,42 @@
+#!/usr/bin/env bash
+# check.sh [format|tidy|cppcheck|shell...]: the static checks, all of them unless some are named.
+set -euo pipefail
+cd "$(dirname "${BASH_SOURCE[0]}")/.."
+
+checks=("$@")
+((${#checks[@]})) || checks=(format tidy cppcheck shell)
+scripts/install-packages.sh build tool test lint
+
+mapfile -t sources < <(git ls-files '*.cpp' '*.c' '*.h')
+mapfile -t library < <(git ls-files 'core/*.cpp' 'values/*.cpp' 'lists/*.cpp' 'tables/*.cpp' 'reports/*.cpp' 'tools/*.cpp')
+
+check_format() { clang-format --dry-run -Werror "${sources[@]}"; }
+
+check_tidy() {
+  cmake --preset dev >/dev/null
+  printf '%s\0' "${library[@]}" |
+    xargs -0 -n 1 -P "$(nproc)" clang-tidy --quiet --warnings-as-errors='*' -p build/dev
+}
+
+check_cppcheck() {
+  cmake --preset dev >/dev/null
+  cppcheck --project=build/dev/compile_commands.json --std=c++20 --quiet --inline-suppr \
+    --enable=warning,performance,portability --error-exitcode=1 -j "$(nproc)" \
+    --suppress='*:/usr/*' -i tests
+}
+
+check_shell() { git ls-files -z '*.sh' .ci/run | xargs -0 shellcheck; }
+
+failed=()
+for check in "${checks[@]}"; do
+  echo "== $check"
+  case $check in
+    format | tidy | cppcheck | shell) "check_$check" || failed+=("$check") ;;
+    *) echo "check.sh: no check '$check'" >&2; exit 2 ;;
+  esac
+done
+if ((${#failed[@]})); then
+  echo "Failed: ${failed[*]}"
+  exit 1
+fi
+echo "All checks passed: ${checks[*]}"

@@ -1,0 +1,35 @@
+#!/usr/bin/env bash
+# test.sh [LEG...]: installs what is missing, builds, and runs all tests. The legs, all of them
+# unless some are named:
+#   dev     64-bit debug build            asan    the same under address and UB sanitizers
+#   x86     32-bit x86 build              mingw   32-bit Windows cross-build, its DLL checked
+# The last lines are ctest's summary over all legs.
+set -euo pipefail
+cd "$(dirname "${BASH_SOURCE[0]}")/.."
+
+case ${1:-} in
+  -h | --help) sed -n '2,/^set /{/^set /d;s/^# \{0,1\}//;p}' "${BASH_SOURCE[0]}"; exit ;;
+esac
+legs=("$@")
+((${#legs[@]})) || legs=(dev asan x86 mingw)
+
+declare -A packages=([dev]=test [asan]=test [x86]="test x86" [mingw]=windows)
+groups=(build tool)
+for leg in "${legs[@]}"; do
+  [[ -n ${packages[$leg]:-} ]] || { echo "test.sh: no leg '$leg'; see --help" >&2; exit 2; }
+  read -ra more <<<"${packages[$leg]}"
+  groups+=("${more[@]}")
+done
+scripts/install-packages.sh "${groups[@]}"
+
+jobs=$(nproc)
+mkdir -p build/all
+: >build/all/CTestTestfile.cmake
+for leg in "${legs[@]}"; do
+  cmake --preset "$leg"
+  cmake --build --preset "$leg" --parallel "$jobs"
+  echo "subdirs(../$leg)" >>build/all/CTestTestfile.cmake
+done
+
+# One run over the legs, so that there is one summary.
+ctest --test-dir build/all --parallel "$jobs" --output-on-failure --no-tests=error --progress
