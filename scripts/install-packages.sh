@@ -6,7 +6,7 @@ set -euo pipefail
 declare -A groups=(
   [build]="cmake ninja-build g++"
   [tool]="libcli11-dev nlohmann-json3-dev"
-  [test]="libgtest-dev pkg-config"
+  [test]="libgtest-dev pkg-config python3"
   [bench]="libbenchmark-dev"
   [x86]="g++-multilib googletest"
   [windows]="g++-mingw-w64-i686-win32"
