@@ -1,7 +1,7 @@
 #!/usr/bin/env bash
 # check_install.sh BUILD WORK CMAKE CC TOOLCHAIN CFLAGS: installs the build into a fresh folder,
 # then builds and runs a C program against it in the three ways a user would: find_package with
-# the shared library, with the static one, and pkg-config.
+# the shared library, with the static one, and pkg-config. The README's program is built as well.
 set -euo pipefail
 build=$1 work=$2 cmake=$3 cc=$4 toolchain=$5 cflags=$6
 source=$(cd "$(dirname "${BASH_SOURCE[0]}")/consumer" && pwd)
@@ -31,6 +31,11 @@ export PKG_CONFIG_PATH
 read -ra flags <<<"$cflags $(pkg-config --cflags tevpf)"
 read -ra libs <<<"$(pkg-config --libs tevpf)"
 "$cc" -std=c99 "${flags[@]}" "$source/consumer.c" -o "$work/by_pkg_config" "${libs[@]}"
+awk '/^```c$/ { code = 1; next } /^```/ { code = 0 } code' "$source/../../../README.md" \
+  >"$work/readme.c"
+"$cc" -std=c99 -Wall -Wextra -Werror "${flags[@]}" "$work/readme.c" -o "$work/readme" "${libs[@]}"
 LD_LIBRARY_PATH=$(pkg-config --variable=libdir tevpf)
 export LD_LIBRARY_PATH
 run pkg-config "$work/by_pkg_config"
+run "the README's program" "$work/readme" # makes its file
+run "the README's program, again" "$work/readme"
