@@ -3,10 +3,10 @@
 // Terms: a row number counts rows as they are stored; a position counts them as they are traversed,
 // which follows the search column's index when there is one.
 //
-// Invariants: the columns' offsets, row_wid, mod and extra_bytes are what laying them out one behind the
-// other into an empty row gives; each index lists every row number once, in ascending order of value,
-// with room for num_rows + free_rows; header.btf = 24 + the stored sizes of all columns; padding bytes
-// of rows are zero.
+// Invariants: the columns' offsets, row_wid, mod and extra_bytes are what laying them out one
+// behind the other into an empty row gives; each index lists every row number once, in ascending
+// order of value, with room for num_rows + free_rows; header.btf = 24 + the stored sizes of all
+// columns; padding bytes of rows are zero.
 #pragma once
 
 #include <cstddef>
@@ -21,11 +21,11 @@ struct TEVPF_COLUMN {
   std::int32_t offset;  // of the value within a row
   char RESERVED[4];     // zero in columns defined here; carried through as read
   TEVPF_COL_DEF def;
-  char format[32];         // printf format of a value as reports show it; empty until it is made
-  double tolerance;        // reals and doubles: 10^-(precision + 1)
-  std::int32_t* idx_ptr;   // row numbers in ascending order of value, while idx_flag is set
-  std::int8_t desc_flag;   // 0: no description, else its stored offset - 41
-  std::int32_t index_room; // entries that the index block really has
+  char format[32];          // printf format of a value as reports show it; empty until it is made
+  double tolerance;         // reals and doubles: 10^-(precision + 1)
+  std::int32_t* idx_ptr;    // row numbers in ascending order of value, while idx_flag is set
+  std::int8_t desc_flag;    // 0: no description, else its stored offset - 41
+  std::int32_t index_room;  // entries that the index block really has
 };
 #pragma pack(pop)
 
@@ -60,8 +60,8 @@ namespace tevpf {
 // Releases everything that the table owns, and the record; half-built ones too.
 void release_table(TEVPF_TABLE* table) noexcept;
 
-// Gives `copy`, a new empty table, all that `source` holds but its name; false when memory runs out,
-// and then `copy` is still empty. Its search column is its own column at the same place.
+// Gives `copy`, a new empty table, all that `source` holds but its name; false when memory runs
+// out, and then `copy` is still empty. Its search column is its own column at the same place.
 [[nodiscard]] bool copy_table_body(const TEVPF_TABLE& source, TEVPF_TABLE& copy) noexcept;
 
 }  // namespace tevpf

@@ -1,0 +1,54 @@
+// How columns lie in a row: one behind the other in column order, each at the first suitably
+// aligned byte behind the value before it; the row ends on a multiple of its alignment unit.
+//
+// Widths are 64-bit here: what does not fit a table's 32 bits is refused before anything changes.
+#pragma once
+
+#include <cstdint>
+
+#include "tables/table.h"
+#include "values/value_type.h"
+
+extern "C" {
+
+// The layout step on a table's own figures: places a value of `size` bytes behind a row of row_wid
+// bytes; the row then has row_wid + *pad_out + size bytes. Always PF_NORMAL.
+TEVPF_API TEVPF_STATUS TEV8R1_adjust_col(std::int32_t row_wid, std::int32_t type, std::int32_t size,
+                                         std::int16_t* extra_bytes, std::int16_t* mod,
+                                         TEVPF_COLUMN* column, std::int32_t* pad_out) noexcept;
+}
+
+namespace tevpf {
+
+inline constexpr std::int64_t kMaxRowWidth = INT32_MAX;
+
+// A row in the making; starts empty.
+struct Layout {
+  std::int64_t row_wid = 0;
+  std::int16_t mod = 0;
+  std::int16_t extra_bytes = 0;
+};
+
+// The layout step: places one more value and returns its offset.
+std::int64_t place_column(Layout& layout, std::int32_t type, std::int64_t size) noexcept;
+
+// The same for a column of a valid type.
+inline std::int64_t place_column(Layout& layout, const TEVPF_COL_DEF& def) noexcept {
+  return place_column(layout, def.type, value_size(def.type, def.width));
+}
+
+// Bytes of a column's value in a row of a table, where it is known to fit.
+inline std::int32_t column_size(const TEVPF_COLUMN& column) noexcept {
+  return static_cast<std::int32_t>(value_size(column.def.type, column.def.width));
+}
+
+// The layout that the table's figures describe, and the way back.
+Layout layout_of(const TEVPF_TABLE& table) noexcept;
+void set_layout(TEVPF_TABLE& table, const Layout& layout) noexcept;
+
+// True when offsets, row width and padding of the table are what laying its columns out gives (mod
+// is not looked at). The columns' types are valid; their widths may be anything that is not
+// negative.
+bool has_proper_layout(const TEVPF_TABLE& table) noexcept;
+
+}  // namespace tevpf
