@@ -1,5 +1,5 @@
-// The only file that allocates: blocks of the C runtime, sized with overflow checks, that callers can
-// release with free. Test builds can make the n-th request fail.
+// The only file that allocates: blocks of the C runtime, sized with overflow checks, that callers
+// can release with free. Test builds can make the n-th request fail.
 #pragma once
 
 #include <cstddef>
@@ -11,7 +11,8 @@
 
 namespace tevpf {
 
-// New blocks of count * size bytes (a request of 0 bytes gets a block too); null when there is none.
+// New blocks of count * size bytes (a request of 0 bytes gets a block too); null when there is
+// none.
 [[nodiscard]] void* heap_alloc(std::uint64_t count, std::uint64_t size) noexcept;
 [[nodiscard]] void* heap_zeroed(std::uint64_t count, std::uint64_t size) noexcept;
 
@@ -44,8 +45,8 @@ template <class T>
   return Owned<T>(static_cast<T*>(heap_zeroed(count, sizeof(T))));
 }
 
-// The room to ask for when a block that holds `room` entries must hold `needed`: half as much again,
-// so that adding n entries one by one copies O(n) of them.
+// The room to ask for when a block that holds `room` entries must hold `needed`: half as much
+// again, so that adding n entries one by one copies O(n) of them.
 constexpr std::int64_t grown_room(std::int64_t room, std::int64_t needed) noexcept {
   const std::int64_t generous = room + room / 2;
   return needed > generous ? needed : generous;

@@ -1,6 +1,6 @@
 // Element names of one kind in one file, hashed by the 19 characters that are kept of a name: an
-// accelerator beside the directory, which stays the truth. It may be dropped at any time and is built
-// again when it is needed; without memory for it, callers walk the directory.
+// accelerator beside the directory, which stays the truth. It may be dropped at any time and is
+// built again when it is needed; without memory for it, callers walk the directory.
 #pragma once
 
 #include <cstdint>
@@ -15,8 +15,8 @@ struct NameSet {
   std::int32_t count;         // names in the set
 };
 
-// The element whose name has the same first 19 characters, or null. `elements` are the `count` element
-// records of the directory; a set that does not hold exactly these is built anew first.
+// The element whose name has the same first 19 characters, or null. `elements` are the `count`
+// element records of the directory; a set that does not hold exactly these is built anew first.
 TEVPF_ELEM_HEADER* find_name(NameSet& set, TEVPF_ELEM_HEADER* const* elements, std::int32_t count,
                              const char* name) noexcept;
 

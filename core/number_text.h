@@ -8,12 +8,12 @@ namespace tevpf {
 // Largest precision that a number is written with; a negative one counts as 6, as printf has it.
 inline constexpr int kMaxPrecision = 1100;
 
-// Room for any number that write_general writes with that precision: sign, digits, point, exponent and
-// the leading zeros of a small number.
+// Room for any number that write_general writes with that precision: sign, digits, point, exponent
+// and the leading zeros of a small number.
 inline constexpr int kMaxNumberText = kMaxPrecision + 32;
 
 // Write a number at `out` without a terminator and return the end of the text.
-char* write_decimal(char* out, std::int64_t number) noexcept;              // as "%d", at most 20 bytes
+char* write_decimal(char* out, std::int64_t number) noexcept;  // as "%d", at most 20 bytes
 char* write_general(char* out, double number, std::int32_t precision) noexcept;  // as "%.*g"
 
 }  // namespace tevpf

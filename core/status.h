@@ -23,7 +23,8 @@ class Text {
   char buffer_[32];
 };
 
-// What goes into one of the two texts: a fixed word and what it is about, written one behind the other.
+// What goes into one of the two texts: a fixed word and what it is about, written one behind the
+// other.
 struct Phrase {
   Phrase(const char* whole) noexcept : lead(whole), rest("") {}
   Phrase(const char* word, const char* subject) noexcept : lead(word), rest(subject) {}
@@ -47,7 +48,7 @@ void clear_error_context() noexcept;
 }  // namespace tevpf
 
 // Passes a failure on unchanged.
-#define PF_TRY(expr)                                                             \
-  do {                                                                           \
+#define PF_TRY(expr)                                                               \
+  do {                                                                             \
     if (const TEVPF_STATUS pf_try_ = (expr); pf_try_ != PF_NORMAL) return pf_try_; \
   } while (0)

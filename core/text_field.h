@@ -6,8 +6,8 @@
 
 namespace tevpf {
 
-// Copies as much of the text as fits, with a terminator, and zeroes the rest of the field. The text may
-// be the field itself.
+// Copies as much of the text as fits, with a terminator, and zeroes the rest of the field. The text
+// may be the field itself.
 template <std::size_t N>
 void set_field(char (&field)[N], const char* text) noexcept {
   const std::size_t length = strnlen(text, N - 1);
@@ -21,7 +21,9 @@ void terminate_field(char (&field)[N]) noexcept {
   field[N - 1] = '\0';
 }
 
-inline bool starts_with_blank(const char* name) noexcept { return name[0] == ' '; }
+inline bool starts_with_blank(const char* name) noexcept {
+  return name[0] == ' ';
+}
 
 // Names of elements count as equal when as much of them as is kept is equal.
 inline bool same_element_name(const char* a, const char* b) noexcept {
