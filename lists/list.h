@@ -9,6 +9,7 @@
 #include <cstdint>
 
 #include "core/element.h"
+#include "lists/name_table.h"
 
 extern "C" {
 
@@ -30,8 +31,8 @@ struct TEVPF_LIST {
   std::int32_t* index_ptr;   // positions ordered by name
   std::int32_t free_params;  // spare slots at the end of both arrays
 
-  std::int32_t param_room;      // slots that the two blocks really have, at least what is counted
-  struct TevpfNameTable* names; // name -> position, built when look-ups pay for it; or null
+  std::int32_t param_room;  // slots that the two blocks really have, at least what is counted
+  tevpf::NameTable names;   // all zero: not built
 };
 
 static_assert(sizeof(void*) != 4 || sizeof(TEVPF_PARAM_DEF) == 64);
