@@ -1,0 +1,188 @@
+// What the benchmarks share: fixed seeds, checked calls, temporary files, a thin SQLite handle.
+#pragma once
+
+#include <benchmark/benchmark.h>
+#include <sqlite3.h>
+#include <tevpf.h>
+
+#include <algorithm>
+#include <cstdint>
+#include <cstdio>
+#include <cstdlib>
+#include <filesystem>
+#include <numeric>
+#include <random>
+#include <string>
+#include <vector>
+
+namespace bench {
+
+inline constexpr std::uint32_t kSeed = 20240229;
+
+// Beyond this size an operation that costs O(n) is timed over kFewOperations of them.
+inline constexpr std::int64_t kManyRows = 100'000;
+inline constexpr std::int64_t kFewOperations = 1'000;
+
+[[noreturn]] inline void give_up(const char* what, long code) {
+  std::fprintf(stderr, "%s failed: 0x%lx\n", what, static_cast<unsigned long>(code));
+  std::abort();
+}
+
+#define MUST(call)                                                                    \
+  do {                                                                                \
+    if (const TEVPF_STATUS must_ = (call); must_ != PF_NORMAL && must_ != PF_NEWFILE) \
+      ::bench::give_up(#call, static_cast<long>(must_));                              \
+  } while (0)
+
+inline std::vector<std::int32_t> shuffled(std::int64_t n) {
+  std::vector<std::int32_t> order(static_cast<std::size_t>(n));
+  std::iota(order.begin(), order.end(), 0);
+  std::shuffle(order.begin(), order.end(), std::mt19937(kSeed));
+  return order;
+}
+
+// The first `count` of the numbers 0..n-1 in random order.
+inline std::vector<std::int32_t> some_of(std::int64_t n, std::int64_t count) {
+  std::vector<std::int32_t> order = shuffled(n);
+  order.resize(static_cast<std::size_t>(std::min(n, count)));
+  return order;
+}
+
+// A path in one folder that is emptied when the program ends.
+class Folder {
+ public:
+  Folder() : path_(std::filesystem::temp_directory_path() / "tevpf_bench") {
+    std::filesystem::create_directories(path_);
+  }
+  ~Folder() { std::filesystem::remove_all(path_); }
+  std::string file(const char* name) const { return (path_ / name).string(); }
+
+ private:
+  std::filesystem::path path_;
+};
+
+inline const Folder& folder() {
+  static const Folder instance;
+  return instance;
+}
+
+// A fresh open file without elements, closed and forgotten at the end of the scope.
+class OpenFile {
+ public:
+  explicit OpenFile(const char* name = "work.pf") : path_(folder().file(name)) {
+    std::filesystem::remove(path_);
+    TEV8R1_PF_init();
+    MUST(TEV8R1_PF_open(path_.c_str()));
+  }
+  ~OpenFile() {
+    TEV8R1_PF_change_file(path_.c_str());
+    TEV8R1_PF_close(0);
+  }
+  OpenFile(const OpenFile&) = delete;
+  OpenFile& operator=(const OpenFile&) = delete;
+
+ private:
+  std::string path_;
+};
+
+class Database {
+ public:
+  explicit Database(const std::string& path = ":memory:") {
+    if (sqlite3_open(path.c_str(), &db_) != SQLITE_OK) give_up("sqlite3_open", 0);
+    run("PRAGMA journal_mode=OFF");
+    run("PRAGMA synchronous=OFF");
+    run("PRAGMA locking_mode=EXCLUSIVE");
+    run("PRAGMA cache_size=-1000000");
+  }
+  ~Database() { sqlite3_close_v2(db_); }
+  Database(const Database&) = delete;
+  Database& operator=(const Database&) = delete;
+
+  void run(const char* sql) {
+    if (sqlite3_exec(db_, sql, nullptr, nullptr, nullptr) != SQLITE_OK) give_up(sql, 0);
+  }
+  sqlite3* get() const { return db_; }
+
+ private:
+  sqlite3* db_ = nullptr;
+};
+
+class Statement {
+ public:
+  Statement(const Database& db, const char* sql) {
+    if (sqlite3_prepare_v3(db.get(), sql, -1, SQLITE_PREPARE_PERSISTENT, &stmt_, nullptr) !=
+        SQLITE_OK)
+      give_up(sql, 0);
+  }
+  ~Statement() { sqlite3_finalize(stmt_); }
+  Statement(const Statement&) = delete;
+  Statement& operator=(const Statement&) = delete;
+
+  Statement& text(int at, const char* value, int length = -1) {
+    sqlite3_bind_text(stmt_, at, value, length, SQLITE_STATIC);
+    return *this;
+  }
+  Statement& integer(int at, std::int64_t value) {
+    sqlite3_bind_int64(stmt_, at, value);
+    return *this;
+  }
+  Statement& real(int at, double value) {
+    sqlite3_bind_double(stmt_, at, value);
+    return *this;
+  }
+  bool step() { return sqlite3_step(stmt_) == SQLITE_ROW; }
+  void once() {
+    const int code = sqlite3_step(stmt_);
+    if (code != SQLITE_DONE && code != SQLITE_ROW) give_up("sqlite3_step", code);
+    sqlite3_reset(stmt_);
+  }
+  void reset() { sqlite3_reset(stmt_); }
+  sqlite3_stmt* get() const { return stmt_; }
+
+ private:
+  sqlite3_stmt* stmt_ = nullptr;
+};
+
+inline void backup(const Database& from, const Database& to) {
+  sqlite3_backup* job = sqlite3_backup_init(to.get(), "main", from.get(), "main");
+  if (job == nullptr || sqlite3_backup_step(job, -1) != SQLITE_DONE) give_up("sqlite3_backup", 0);
+  sqlite3_backup_finish(job);
+}
+
+// The limits: one write() or read() of the same bytes, without anything else.
+void write_plainly(const std::string& path, const std::vector<char>& bytes);
+void write_and_sync(const std::string& path, const std::vector<char>& bytes);
+void read_plainly(const std::string& path, std::vector<char>& bytes);
+std::vector<char> contents(const std::string& path);
+
+// Registers a benchmark under workload/contestant/n; its figure is time per operation.
+inline benchmark::internal::Benchmark* add(const char* workload, const char* contestant,
+                                           void (*body)(benchmark::State&),
+                                           std::vector<std::int64_t> sizes = {1'000, 10'000,
+                                                                              100'000, 1'000'000}) {
+  auto* entry =
+      benchmark::RegisterBenchmark((std::string(workload) + "/" + contestant).c_str(), body);
+  for (const std::int64_t n : sizes) entry->Arg(n);
+  return entry->UseManualTime();
+}
+
+// Times one run of a workload over `operations` operations; setting up and cleaning up stay outside.
+class Timer {
+ public:
+  Timer() : start_(now()) {}
+  void stop(benchmark::State& state, std::int64_t operations) const {
+    const double seconds = now() - start_;
+    state.SetIterationTime(seconds);
+    state.counters["operations"] = static_cast<double>(operations);
+  }
+
+ private:
+  static double now() {
+    timespec t;
+    clock_gettime(CLOCK_MONOTONIC, &t);
+    return static_cast<double>(t.tv_sec) + 1e-9 * static_cast<double>(t.tv_nsec);
+  }
+  double start_;
+};
+
+}  // namespace bench

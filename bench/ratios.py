@@ -1,0 +1,112 @@
+#!/usr/bin/env python3
+"""Turns the benchmark's JSON into the table of ratios and into plots.
+
+    ratios.py RESULT.json            the table, as Markdown, on standard output
+    ratios.py RESULT.json --plots D  SVG plots of time per operation against n, one a workload, in D
+
+A ratio above 1 against a peer: the library is faster by that factor. Against a limit (the plain thing
+without a library) the figure is how many times the limit's time the library takes.
+"""
+import json
+import math
+import os
+import sys
+from collections import defaultdict
+
+UNIT = {"ns": 1.0, "us": 1e3, "ms": 1e6, "s": 1e9}
+
+
+def medians(path):
+    """{workload: {contestant: {n: nanoseconds per operation}}}, medians where a run was repeated."""
+    with open(path, encoding="utf-8") as file:
+        data = json.load(file)
+    runs = defaultdict(list)
+    for run in data["benchmarks"]:
+        if run.get("run_type") == "aggregate":
+            continue
+        workload, contestant, n = run["name"].split("/")[:3]
+        runs[workload, contestant, int(n)].append(run["real_time"] * UNIT[run["time_unit"]] / run["operations"])
+    table = defaultdict(lambda: defaultdict(dict))
+    for (workload, contestant, n), times in runs.items():
+        table[workload][contestant][n] = sorted(times)[len(times) // 2]
+    return data["context"], table
+
+
+def short(n):
+    return f"{n // 1_000_000} M" if n >= 1_000_000 else f"{n // 1000} k"
+
+
+def nice(ns):
+    return f"{ns:.3g} ns" if ns < 1e3 else f"{ns / 1e3:.3g} us" if ns < 1e6 else f"{ns / 1e6:.3g} ms"
+
+
+def print_table(context, table):
+    print(f"{context['date'][:10]}, {context['num_cpus']} x {context['mhz_per_cpu']} MHz, "
+          f"benchmark library built as {context['library_build_type']}\n")
+    print("| workload | n | per operation | against the peers | against the limit |")
+    print("|---|---|---|---|---|")
+    for workload, contestants in table.items():
+        for n in sorted(contestants["tevpf"]):
+            ours = contestants["tevpf"][n]
+            peers, limits = [], []
+            for name, times in contestants.items():
+                if name == "tevpf" or n not in times:
+                    continue
+                if name.startswith("limit: "):
+                    limits.append(f"{ours / times[n]:.2f}x the time of {name[7:]}")
+                else:
+                    peers.append(f"{times[n] / ours:.2f}x {name}")
+            print(f"| {workload} | {short(n)} | {nice(ours)} | {', '.join(peers)} | {', '.join(limits)} |")
+
+
+WIDTH, HEIGHT, LEFT, TOP, RIGHT, BOTTOM = 640, 400, 70, 40, 170, 50
+COLOURS = ["#0b6e99", "#c2571a", "#5a8f29", "#7a4fa3"]
+
+
+def plot(workload, contestants):
+    sizes = sorted({n for times in contestants.values() for n in times})
+    values = [t for times in contestants.values() for t in times.values()]
+    if len(sizes) < 2:
+        return None
+    low, high = math.floor(math.log10(min(values))), math.ceil(math.log10(max(values)) + 1e-9)
+
+    def x(n):
+        span = math.log10(sizes[-1]) - math.log10(sizes[0])
+        return LEFT + (WIDTH - LEFT - RIGHT) * (math.log10(n) - math.log10(sizes[0])) / span
+
+    def y(ns):
+        return HEIGHT - BOTTOM - (HEIGHT - TOP - BOTTOM) * (math.log10(ns) - low) / max(high - low, 1)
+
+    out = [f'<svg xmlns="http://www.w3.org/2000/svg" width="{WIDTH}" height="{HEIGHT}" font-family="sans-serif" font-size="12">',
+           '<rect width="100%" height="100%" fill="white"/>',
+           f'<text x="{LEFT}" y="24" font-size="15">{workload}: time per operation</text>']
+    for power in range(low, high + 1):
+        out.append(f'<line x1="{LEFT}" x2="{WIDTH - RIGHT}" y1="{y(10**power):.1f}" y2="{y(10**power):.1f}" stroke="#ddd"/>')
+        out.append(f'<text x="{LEFT - 6}" y="{y(10**power) + 4:.1f}" text-anchor="end">{nice(10.0**power)}</text>')
+    for n in sizes:
+        out.append(f'<text x="{x(n):.1f}" y="{HEIGHT - BOTTOM + 18}" text-anchor="middle">{short(n)}</text>')
+    for colour, (name, times) in zip(COLOURS, contestants.items()):
+        points = " ".join(f"{x(n):.1f},{y(t):.1f}" for n, t in sorted(times.items()))
+        out.append(f'<polyline points="{points}" fill="none" stroke="{colour}" stroke-width="2"/>')
+        row = TOP + 18 * list(contestants).index(name)
+        out.append(f'<rect x="{WIDTH - RIGHT + 12}" y="{row}" width="10" height="10" fill="{colour}"/>')
+        out.append(f'<text x="{WIDTH - RIGHT + 28}" y="{row + 10}">{name}</text>')
+    out.append("</svg>\n")
+    return "\n".join(out)
+
+
+def main():
+    context, table = medians(sys.argv[1])
+    if len(sys.argv) > 3 and sys.argv[2] == "--plots":
+        os.makedirs(sys.argv[3], exist_ok=True)
+        for workload, contestants in table.items():
+            picture = plot(workload, contestants)
+            if picture:
+                with open(os.path.join(sys.argv[3], workload.replace(" ", "_") + ".svg"), "w", encoding="utf-8") as file:
+                    file.write(picture)
+    else:
+        print_table(context, table)
+
+
+if __name__ == "__main__":
+    main()
