@@ -7,6 +7,7 @@
 
 #include <cstdint>
 
+#include "core/heap.h"
 #include "tables/table.h"
 
 namespace tevpf {
@@ -40,13 +41,13 @@ inline const unsigned char* column_base(const TEVPF_TABLE& table,
 void open_row_gap(TEVPF_TABLE& table, std::int32_t row) noexcept;
 void close_row_gap(TEVPF_TABLE& table, std::int32_t row) noexcept;
 
-// Zeroes the padding of a row of this table and puts a terminator into the last byte of each of its
-// string values: for rows that callers or files hand in. `row` may lie anywhere.
-void clean_row(const TEVPF_TABLE& table, unsigned char* row) noexcept;
-void clean_rows(TEVPF_TABLE& table) noexcept;  // all num_rows of them
+// Zeroes the padding of some rows of this table's layout and puts a terminator into the last byte of
+// each of their string values: for rows that callers or files hand in. They may lie anywhere.
+void clean_rows(const TEVPF_TABLE& table, unsigned char* rows, std::int64_t count) noexcept;
 
-// Gives the row block back; num_rows and free_rows stay.
+// Give the row block back, or replace it by one of `room` bytes; num_rows and free_rows stay.
 void release_rows(TEVPF_TABLE& table) noexcept;
+void adopt_rows(TEVPF_TABLE& table, Owned<unsigned char> rows, std::int64_t room) noexcept;
 
 // Gives `copy`, which has no row block and the same row_wid and num_rows, a block with the same
 // rows.
@@ -55,7 +56,7 @@ void release_rows(TEVPF_TABLE& table) noexcept;
 // ---- Changes of layout --------------------------------------------------------------------------
 
 // Widens all rows in place from row_wid to new_wid, which have room for it, and puts `value` (size
-// bytes) at `offset` of each. Bytes that are neither old nor value are zero.
+// bytes) at `offset` of each, zeros where it is null. Other new bytes are zero.
 void widen_rows(TEVPF_TABLE& table, std::int64_t new_wid, std::int64_t offset, const void* value,
                 std::int64_t size) noexcept;
 
