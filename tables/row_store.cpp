@@ -81,7 +81,7 @@ bool copy_rows(const TEVPF_TABLE& source, TEVPF_TABLE& copy) noexcept {
   const std::int64_t bytes = std::int64_t{source.num_rows} * source.row_wid;
   auto rows = new_array<unsigned char>(static_cast<std::uint64_t>(bytes));
   if (!rows) return false;
-  std::memcpy(rows.get(), source.row_data, static_cast<std::size_t>(bytes));
+  if (bytes > 0) std::memcpy(rows.get(), source.row_data, static_cast<std::size_t>(bytes));
   adopt_rows(copy, std::move(rows), bytes);
   return true;
 }

@@ -24,7 +24,7 @@ inline const unsigned char* row_at(const TEVPF_TABLE& table, std::int64_t row) n
 // next.
 inline const unsigned char* column_base(const TEVPF_TABLE& table,
                                         const TEVPF_COLUMN& column) noexcept {
-  return table.row_data + column.offset;
+  return table.row_data == nullptr ? nullptr : table.row_data + column.offset;
 }
 
 // Makes room for num_rows + spare rows of row_wid bytes; only row_data and row_room change. False
