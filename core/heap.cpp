@@ -13,18 +13,18 @@ namespace {
 #ifdef TEVPF_TEST_HOOKS
 constexpr std::int64_t kNever = -1;
 std::int64_t requests_until_failure = kNever;
+std::uint64_t largest_block = UINT64_MAX;
 bool failure_reached = false;
 
-bool must_fail() noexcept {
+bool must_fail(std::uint64_t bytes) noexcept {
+  if (bytes > largest_block) return true;
   if (requests_until_failure < 0) return false;
   if (requests_until_failure-- > 0) return false;
   failure_reached = true;
   return true;
 }
 #else
-constexpr bool must_fail() noexcept {
-  return false;
-}
+constexpr bool must_fail(std::uint64_t) noexcept { return false; }
 #endif
 
 // Bytes of a block of count * size, at least one; 0 when no block can be that large.
@@ -38,17 +38,17 @@ std::size_t block_bytes(std::uint64_t count, std::uint64_t size) noexcept {
 
 void* heap_alloc(std::uint64_t count, std::uint64_t size) noexcept {
   const std::size_t bytes = block_bytes(count, size);
-  return bytes == 0 || must_fail() ? nullptr : std::malloc(bytes);
+  return bytes == 0 || must_fail(bytes) ? nullptr : std::malloc(bytes);
 }
 
 void* heap_zeroed(std::uint64_t count, std::uint64_t size) noexcept {
   const std::size_t bytes = block_bytes(count, size);
-  return bytes == 0 || must_fail() ? nullptr : std::calloc(bytes, 1);
+  return bytes == 0 || must_fail(bytes) ? nullptr : std::calloc(bytes, 1);
 }
 
 void* heap_resize(void* block, std::uint64_t count, std::uint64_t size) noexcept {
   const std::size_t bytes = block_bytes(count, size);
-  return bytes == 0 || must_fail() ? nullptr : std::realloc(block, bytes);
+  return bytes == 0 || must_fail(bytes) ? nullptr : std::realloc(block, bytes);
 }
 
 char* heap_copy(const char* text) noexcept {
@@ -61,9 +61,7 @@ void* heap_copy(const void* bytes, std::uint64_t count) noexcept {
   return copy;
 }
 
-void heap_free(void* block) noexcept {
-  std::free(block);
-}
+void heap_free(void* block) noexcept { std::free(block); }
 
 #ifdef TEVPF_TEST_HOOKS
 void heap_fail_at(std::int64_t n) noexcept {
@@ -75,6 +73,8 @@ bool heap_fail_off() noexcept {
   requests_until_failure = kNever;
   return failure_reached;
 }
+
+void heap_fail_above(std::uint64_t bytes) noexcept { largest_block = bytes; }
 #endif
 
 }  // namespace tevpf
@@ -86,9 +86,7 @@ TEVPF_STATUS TEV8R1_memcpy(std::int32_t count, const void* source, void* destina
   return PF_NORMAL;
 }
 
-char* TEV8R1_strdup(const char* text) noexcept {
-  return heap_copy(text);
-}
+char* TEV8R1_strdup(const char* text) noexcept { return heap_copy(text); }
 
 TEVPF_STATUS TEV8R1_allocate_elem(std::int32_t count, std::int32_t increment, std::int32_t size,
                                   void** array, void** first_new_out) noexcept {

@@ -57,6 +57,8 @@ constexpr std::int64_t grown_room(std::int64_t room, std::int64_t needed) noexce
 void heap_fail_at(std::int64_t n) noexcept;
 // Ends that; true when the request was reached.
 bool heap_fail_off() noexcept;
+// Lets every request for more than that many bytes fail; UINT64_MAX ends it.
+void heap_fail_above(std::uint64_t bytes) noexcept;
 #endif
 
 }  // namespace tevpf
