@@ -1,0 +1,74 @@
+// Definitions of parameters and columns as the dumps show them: the fields that both have in common,
+// and the whole line of a column.
+#pragma once
+
+#include <cstdint>
+#include <cstdio>
+
+#include "reports/text_out.h"
+#include "tables/table.h"
+#include "values/value_type.h"
+
+extern "C" {
+
+// Writes a column's definition as one line.
+//   PF_BADTYPE  no such value type; the line stays unfinished
+TEVPF_API TEVPF_STATUS TEV8R1_print_col_def(std::FILE* stream, const TEVPF_COLUMN* column) noexcept;
+}
+
+namespace tevpf {
+
+inline constexpr char kNoValue[] = "@";  // stands for a field without a value
+
+// How definitions show a value type.
+struct TypeText {
+  const char* word;
+  std::int32_t digits;  // of the bounds of reals and doubles
+};
+
+// In the order of the type codes, from PF_TYPE_INT on.
+inline constexpr TypeText kTypeTexts[] = {
+    {"INT ", 0}, {"REAL", 5}, {"STG ", 0}, {"DBL ", 4}, {"SHT ", 0}};
+
+constexpr const TypeText& type_text(std::int32_t type) noexcept {
+  return kTypeTexts[type - PF_TYPE_INT];
+}
+
+// Write to lists and tables alike: name and units; a number right-aligned (reals and doubles with so
+// many digits); precision, maximum and minimum.
+void write_name_and_units(TextOut& out, const char (&name)[TEVPF_NAME_SIZE],
+                          const char (&units)[TEVPF_UNITS_SIZE]) noexcept;
+
+template <class T>
+void write_number(TextOut& out, T number, std::int32_t width, std::int32_t digits) noexcept {
+  if constexpr (kIsFloating<T>) {
+    out.print(General{number, width, digits});
+  } else {
+    out.print(Right{number, width});
+  }
+}
+
+// The bounds part is that of a parameter or a column whose type is T.
+template <class T, class Part>
+void write_bounds(TextOut& out, std::int32_t type, const Part& part,
+                  std::int32_t max_width) noexcept {
+  if constexpr (kIsFloating<T>) {
+    out.print(Right{part.precision, 4}, ' ');
+  } else {
+    out.print(RightText{kNoValue, 4}, ' ');
+  }
+  write_number<T>(out, part.max, max_width, type_text(type).digits);
+  out.print(' ');
+  write_number<T>(out, part.min, 11, type_text(type).digits);
+}
+
+// The same fields for a string, which has none of them.
+void write_no_bounds(TextOut& out, std::int32_t max_width) noexcept;
+
+// What TEV8R1_print_col_def does.
+TEVPF_STATUS write_column_definition(TextOut& out, const TEVPF_COLUMN& column) noexcept;
+
+// The heading above such lines.
+void write_definitions_heading(TextOut& out) noexcept;
+
+}  // namespace tevpf
