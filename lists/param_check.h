@@ -1,0 +1,29 @@
+// What a parameter's definition and its value must fulfil.
+#pragma once
+
+#include "core/status.h"
+#include "lists/list.h"
+#include "values/value_type.h"
+
+extern "C" {
+
+// Checks a definition; the list is not consulted.
+//   PF_BADNAME   the name starts with a blank; texts empty
+//   PF_BADTYPE   no such value type; texts: "parameter", the type
+//   PF_BADRANGE  max below min; texts as they were
+//   PF_RANGE     value outside min..max; texts: the value, empty
+//   PF_BADPREC   precision below 1; texts: the precision, the name
+TEVPF_API TEVPF_STATUS TEV8R1_validate_param_def(const TEVPF_LIST* list,
+                                                 TEVPF_PARAM_DEF definition) noexcept;
+}
+
+namespace tevpf {
+
+// The refusal of a number outside its bounds.
+template <class T>
+[[nodiscard]] TEVPF_STATUS out_of_range(T value) noexcept {
+  using Shown = std::conditional_t<kIsFloating<T>, double, std::int32_t>;
+  return fail(PF_RANGE, Text(static_cast<Shown>(value)));
+}
+
+}  // namespace tevpf

@@ -1,0 +1,62 @@
+// One parameter as a record: its stored size, the place of its description, and the texts it owns.
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+
+#include "core/heap.h"
+#include "lists/list.h"
+
+extern "C" {
+
+// Replaces the texts that the record points to by heap copies of its own, and gives its stored size.
+//   PF_NOMEM, PF_BADTYPE  the record is as it was
+TEVPF_API TEVPF_STATUS TEV8R1_construct_param(TEVPF_PARAM* param, std::int32_t* bytes_out) noexcept;
+}
+
+namespace tevpf {
+
+// What every parameter takes in the file before its type part.
+inline constexpr std::int32_t kParamHead = 44;
+
+// Bytes of a parameter in the file, in 64 bits so that no text is too long to be measured.
+std::int64_t stored_size(std::int32_t type, const char* description, std::int64_t length) noexcept;
+std::int64_t stored_size(const TEVPF_PARAM_DEF& definition) noexcept;
+
+// The desc_loc of a record with that definition.
+std::int8_t description_place(const TEVPF_PARAM_DEF& definition) noexcept;
+
+// Whether btf can change by that many bytes and still fit its 31 bits.
+bool btf_can_change(const TEVPF_LIST& list, std::int64_t bytes) noexcept;
+
+// A copy of a caller's definition as records hold them: name and units terminated, the absent string
+// value an empty text, length that of the value. The texts still are the caller's.
+//   PF_NOMEM  the value is longer than 31 bits can say
+[[nodiscard]] TEVPF_STATUS normalise(TEVPF_PARAM_DEF& definition) noexcept;
+
+// Releases the texts that the definition owns and leaves null pointers.
+void release_texts(TEVPF_PARAM_DEF& definition) noexcept;
+
+// Replaces the texts that the definition points to by heap copies; false when memory runs out, and then
+// the definition is as it was.
+[[nodiscard]] bool own_texts(TEVPF_PARAM_DEF& definition) noexcept;
+
+// A text on its way into a record: the record's old block is kept when it is large enough, else a new
+// one is there before anything changes.
+class NewText {
+ public:
+  // `text`, of `length` characters, is to replace what stands in a block of `capacity` bytes; null for
+  // no text. false when memory runs out.
+  [[nodiscard]] bool prepare(const char* text, std::size_t length, std::size_t capacity) noexcept;
+
+  // Writes it into the old block, or into the new one and releases the old; gives the block that holds
+  // it, null for no text.
+  char* commit(char* old) noexcept;
+
+ private:
+  const char* text_ = nullptr;
+  std::size_t length_ = 0;
+  Owned<char> block_;
+};
+
+}  // namespace tevpf

@@ -1,0 +1,102 @@
+// Walking a list: the cursor, and the definitions and values it delivers.
+#include <algorithm>
+#include <cstring>
+#include <limits>
+
+#include "core/directory.h"
+#include "core/status.h"
+#include "lists/list.h"
+#include "lists/name_index.h"
+
+namespace tevpf {
+namespace {
+
+void copy_text(char* out, const char* text) noexcept {
+  std::memcpy(out, text, std::strlen(text) + 1);
+}
+
+// Makes a parameter the current one and copies its definition into the caller's record, whose two
+// pointers lead to the caller's buffers and stay.
+void deliver(TEVPF_LIST& list, std::int32_t position, TEVPF_PARAM_DEF& out) noexcept {
+  const TEVPF_PARAM_DEF& definition = list.param_ptr[position].def;
+  TEVPF_PARAM_DEF copy = definition;
+  copy.description = out.description;
+  if (definition.type == PF_TYPE_STRING) {
+    copy.part.str.value = out.part.str.value;
+    copy_text(copy.part.str.value, definition.part.str.value);
+  }
+  copy_text(copy.description, definition.description == nullptr ? "" : definition.description);
+  out = copy;
+  list.cur_param = position;
+}
+
+}  // namespace
+}  // namespace tevpf
+
+using namespace tevpf;
+
+TEVPF_STATUS TEV8R1_PF_get_next_param(const char* list_name, char* name_out,
+                                      void* value_out) noexcept {
+  TEVPF_LIST* list;
+  PF_TRY(TEV8R1_get_list_ptr(list_name, &list));
+  if (list->cur_param < std::numeric_limits<std::int32_t>::max()) ++list->cur_param;
+  if (list->cur_param >= list->num_params) return PF_NOMORE;
+  const TEVPF_PARAM_DEF& definition = list->param_ptr[list->cur_param].def;
+  copy_text(name_out, definition.name);
+  return TEV8R1_load_param_value(&definition, value_out);
+}
+
+TEVPF_STATUS TEV8R1_PF_get_next_param_def(const char* list_name,
+                                          TEVPF_PARAM_DEF* definition) noexcept {
+  TEVPF_LIST* list;
+  PF_TRY(TEV8R1_get_list_ptr(list_name, &list));
+  if (list->cur_param >= list->num_params - 1) return PF_NOMORE;
+  deliver(*list, list->cur_param + 1, *definition);
+  return PF_NORMAL;
+}
+
+TEVPF_STATUS TEV8R1_PF_get_prev_param_def(const char* list_name,
+                                          TEVPF_PARAM_DEF* definition) noexcept {
+  TEVPF_LIST* list;
+  PF_TRY(TEV8R1_get_list_ptr(list_name, &list));
+  if (list->cur_param <= 0 || list->num_params == 0) return PF_NOMORE;
+  // A cursor that was left beyond the last parameter steps back to that one.
+  deliver(*list, std::min(list->cur_param, list->num_params) - 1, *definition);
+  return PF_NORMAL;
+}
+
+TEVPF_STATUS TEV8R1_PF_get_param_def(const char* list_name, const char* param_name,
+                                     TEVPF_PARAM_DEF* definition) noexcept {
+  TEVPF_LIST* list;
+  std::int32_t position;
+  PF_TRY(TEV8R1_get_list_ptr(list_name, &list));
+  PF_TRY(find_param(*list, param_name, position));
+  deliver(*list, position, *definition);
+  return PF_NORMAL;
+}
+
+TEVPF_STATUS TEV8R1_PF_get_param_def_by_pos(const char* list_name, std::int32_t position,
+                                            TEVPF_PARAM_DEF* definition) noexcept {
+  TEVPF_LIST* list;
+  PF_TRY(TEV8R1_get_list_ptr(list_name, &list));
+  if (position < 0 || position >= list->num_params) {
+    return fail(PF_BADPOS, Text(position), Text(list->num_params));
+  }
+  deliver(*list, position, *definition);
+  return PF_NORMAL;
+}
+
+TEVPF_STATUS TEV8R1_PF_reset_param(const char* list_name) noexcept {
+  TEVPF_LIST* list;
+  PF_TRY(TEV8R1_get_list_ptr(list_name, &list));
+  list->cur_param = -1;
+  return PF_NORMAL;
+}
+
+TEVPF_STATUS TEV8R1_set_cur_param(const char* list_name, std::int32_t position) noexcept {
+  TEVPF_LIST* list;
+  PF_TRY(TEV8R1_get_list_ptr(list_name, &list));
+  if (position < 0 || position >= list->num_params) return PF_BADPOS;
+  list->cur_param = position;
+  return PF_NORMAL;
+}

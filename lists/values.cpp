@@ -1,0 +1,112 @@
+// Values of parameters, in binary form and from text.
+#include <cstring>
+
+#include "core/directory.h"
+#include "core/heap.h"
+#include "core/status.h"
+#include "lists/list.h"
+#include "lists/name_index.h"
+#include "lists/param_check.h"
+#include "lists/param_record.h"
+#include "values/value_type.h"
+
+namespace tevpf {
+namespace {
+
+TEVPF_STATUS bad_type(std::int32_t type) noexcept {
+  return fail(PF_BADTYPE, "parameter", Text(type));
+}
+
+// Bounds are inclusive and exact; what is not a number lies outside of any.
+template <class T>
+TEVPF_STATUS change_number(TEVPF_PARAM_DEF& definition, T value) noexcept {
+  auto& part = number_part<T>(definition);
+  if (part.max < part.min) return PF_BADRANGE;
+  if (!(value >= part.min && value <= part.max)) return out_of_range(value);
+  part.value = value;
+  return PF_NORMAL;
+}
+
+TEVPF_STATUS change_string(TEVPF_LIST& list, TEVPF_PARAM_DEF& definition,
+                           const char* value) noexcept {
+  auto& string = definition.part.str;
+  const std::size_t length = std::strlen(value);
+  const std::int64_t growth = static_cast<std::int64_t>(length) - string.length;
+  NewText text;
+  if (!btf_can_change(list, growth) ||
+      !text.prepare(value, length, static_cast<std::size_t>(string.length) + 1)) {
+    return fail_empty(PF_NOMEM);
+  }
+  string.value = text.commit(string.value);
+  string.length = static_cast<std::int32_t>(length);
+  list.header.btf += static_cast<std::int32_t>(growth);
+  return PF_NORMAL;
+}
+
+template <class T>
+TEVPF_STATUS number_from_text(std::int32_t type, const char* text,
+                              TEVPF_PARAM_DEF& definition) noexcept {
+  auto& part = number_part<T>(definition);
+  T value = part.value;  // empty text may leave it
+  PF_TRY(TEV8R1_from_char(type, text, &value));
+  part.value = value;
+  return PF_NORMAL;
+}
+
+}  // namespace
+}  // namespace tevpf
+
+using namespace tevpf;
+
+TEVPF_STATUS TEV8R1_PF_modify_param(const char* list_name, const char* param_name,
+                                    const void* value) noexcept {
+  TEVPF_LIST* list;
+  std::int32_t position;
+  PF_TRY(TEV8R1_get_list_ptr(list_name, &list));
+  PF_TRY(find_param(*list, param_name, position));
+
+  TEVPF_PARAM_DEF& definition = list->param_ptr[position].def;
+  if (!is_value_type(definition.type)) return bad_type(definition.type);
+  if (definition.type == PF_TYPE_STRING) {
+    return change_string(*list, definition, static_cast<const char*>(value));
+  }
+  return with_number(definition.type, [&](auto tag) {
+    return change_number(definition, load<decltype(tag)>(value));
+  });
+}
+
+TEVPF_STATUS TEV8R1_PF_get_param_value(const char* list_name, const char* param_name,
+                                       void* value_out) noexcept {
+  TEVPF_LIST* list;
+  std::int32_t position;
+  PF_TRY(TEV8R1_get_list_ptr(list_name, &list));
+  PF_TRY(find_param(*list, param_name, position));
+  list->cur_param = position;
+  return TEV8R1_load_param_value(&list->param_ptr[position].def, value_out);
+}
+
+TEVPF_STATUS TEV8R1_load_param_value(const TEVPF_PARAM_DEF* definition, void* value_out) noexcept {
+  if (!is_value_type(definition->type)) return bad_type(definition->type);
+  if (definition->type == PF_TYPE_STRING) {
+    const char* const text = definition->part.str.value;
+    std::memcpy(value_out, text, std::strlen(text) + 1);
+  } else {
+    with_number(definition->type, [&](auto tag) {
+      store<decltype(tag)>(value_out, number_part<decltype(tag)>(*definition).value);
+    });
+  }
+  return PF_NORMAL;
+}
+
+TEVPF_STATUS TEV8R1_store_param_value(std::int32_t type, const char* text,
+                                      TEVPF_PARAM_DEF* definition) noexcept {
+  if (!is_value_type(type)) return bad_type(type);
+  if (type == PF_TYPE_STRING) {
+    char* const copy = heap_copy(text);
+    if (copy == nullptr) return fail_empty(PF_NOMEM);
+    definition->part.str.value = copy;
+    return PF_NORMAL;
+  }
+  return with_number(
+      type, [&](auto tag) { return number_from_text<decltype(tag)>(type, text, *definition); });
+}
