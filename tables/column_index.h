@@ -98,7 +98,9 @@ void insert_entry(TEVPF_COLUMN& column, std::int32_t count, std::int32_t positio
                   std::int32_t row_number) noexcept;
 
 // Takes a row out of all indexes and lowers every entry above it by one; num_rows still counts it.
-void remove_row_from_indexes(TEVPF_TABLE& table, std::int32_t row_number) noexcept;
+// Unless it is null, positions[i] receives where the row stood in the index of column i.
+void remove_row_from_indexes(TEVPF_TABLE& table, std::int32_t row_number,
+                             std::int32_t* positions) noexcept;
 
 // Moves the entry of a stored row, whose value is about to become `value`, to its new place.
 void move_entry(const TEVPF_TABLE& table, TEVPF_COLUMN& column, std::int32_t row_number,

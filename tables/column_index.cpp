@@ -1,0 +1,487 @@
+#include "tables/column_index.h"
+
+#include <algorithm>
+#include <cmath>
+#include <cstring>
+#include <limits>
+#include <utility>
+
+#include "core/status.h"
+#include "tables/row_store.h"
+#include "values/compare.h"
+
+namespace tevpf {
+namespace {
+
+// The values of one column: row number r has its value r * stride bytes behind the base.
+struct Values {
+  const unsigned char* base;
+  std::int64_t stride;
+
+  const unsigned char* of(std::int32_t row) const noexcept { return base + row * stride; }
+};
+
+Values values_of(const TEVPF_TABLE& table, const TEVPF_COLUMN& column) noexcept {
+  return {column_base(table, column), table.row_wid};
+}
+
+// Bytes that can be read from the start of a column's value in every row.
+std::int64_t readable_bytes(const TEVPF_TABLE& table, const TEVPF_COLUMN& column) noexcept {
+  return std::int64_t{table.row_wid} - column.offset;
+}
+
+// ---- Searching -----------------------------------------------------------------------------------
+
+// Integers: the first entry that is not less, found without a branch on the values. Their order is
+// total, so the answer is that of the probes below.
+template <class T>
+TEVPF_STATUS search_entries(const Values& values, const std::int32_t* entries, std::int32_t count,
+                            const NumberKey<T>& key, std::int32_t& pos) noexcept
+    requires(!kIsFloating<T>) {
+  const std::int32_t* first = entries;
+  for (std::int32_t length = count; length > 0;) {
+    const std::int32_t half = length / 2;
+    const bool less = key.is_above(values.of(first[half]));
+    first += less ? half + 1 : 0;
+    length = less ? length - half - 1 : half;
+  }
+  pos = static_cast<std::int32_t>(first - entries);
+  return pos < count && key.equals(values.of(*first)) ? PF_NORMAL : PF_NOTFOUND;
+}
+
+// Steps back over equal entries to the first of them; the entry in front of `low` is less.
+template <class Key>
+std::int32_t first_equal(const Values& values, const std::int32_t* entries, std::int32_t low,
+                         std::int32_t found, const Key& key) noexcept {
+  while (found > low && key.equals(values.of(entries[found - 1]))) --found;
+  return found;
+}
+
+// Texts that are equal stand together, so many of them are halved. A stored text that is a pattern
+// stands in front of what it matches and may part a few equal ones: nearby it is one step at a time.
+template <bool kWide>
+std::int32_t first_equal(const Values& values, const std::int32_t* entries, std::int32_t low,
+                         std::int32_t found, const TextKey<kWide>& key) noexcept {
+  const std::int32_t near = std::max(low, found - 16);
+  while (found > near && key.equals(values.of(entries[found - 1]))) --found;
+  if (found > near) return found;
+  while (low < found) {
+    const std::int32_t middle = low + (found - low) / 2;
+    if (key.equals(values.of(entries[middle]))) {
+      found = middle;
+    } else {
+      low = middle + 1;
+    }
+  }
+  return found;
+}
+
+// Reals, doubles and texts: these probes and no others, because equality within a tolerance chains and
+// what is not a number equals everything.
+template <class Key>
+TEVPF_STATUS search_entries(const Values& values, const std::int32_t* entries, std::int32_t count,
+                            const Key& key, std::int32_t& pos) noexcept {
+  std::int32_t low = 0, high = count - 1;
+  while (low <= high) {
+    const std::int32_t middle = low + (high - low) / 2;
+    const int answer = key.compare(values.of(entries[middle]));
+    if (answer == 0) {
+      pos = first_equal(values, entries, low, middle, key);
+      return PF_NORMAL;
+    }
+    if (answer < 0) {
+      low = middle + 1;
+    } else {
+      high = middle - 1;
+    }
+  }
+  pos = low;
+  return PF_NOTFOUND;
+}
+
+// ---- Sorting -------------------------------------------------------------------------------------
+
+// Numbers as unsigned keys in the order of their values; 0.0 and -0.0 are one value, and what is not a
+// number stands behind everything.
+std::uint32_t sort_key(std::int32_t value) noexcept {
+  return static_cast<std::uint32_t>(value) ^ 0x80000000u;
+}
+std::uint32_t sort_key(std::int16_t value) noexcept { return sort_key(std::int32_t{value}); }
+
+template <class Bits, class T>
+Bits floating_sort_key(T value) noexcept {
+  if (std::isnan(value)) return ~Bits{0};
+  value += T{0};
+  const Bits bits = load<Bits>(&value);
+  constexpr Bits sign = Bits{1} << (8 * sizeof(Bits) - 1);
+  return (bits & sign) != 0 ? ~bits : bits | sign;
+}
+std::uint32_t sort_key(float value) noexcept { return floating_sort_key<std::uint32_t>(value); }
+std::uint64_t sort_key(double value) noexcept { return floating_sort_key<std::uint64_t>(value); }
+
+struct KeyedRow {
+  std::uint64_t key;
+  std::int32_t row;
+};
+
+template <class Entry, class Less>
+void sort_entries(Entry* entries, std::int32_t count, Less less) noexcept {
+  if (!std::is_sorted(entries, entries + count, less)) std::sort(entries, entries + count, less);
+}
+
+// A key of 32 bits and its row make one number.
+template <class T>
+bool sort_rows_by_short_key(const Values& values, std::int32_t count, std::int32_t* out) noexcept {
+  const auto keys = new_array<std::uint64_t>(static_cast<std::uint64_t>(count));
+  if (!keys) return false;
+  for (std::int32_t row = 0; row < count; ++row) {
+    const std::uint64_t key = sort_key(load<T>(values.of(row)));
+    keys[row] = key << 32 | static_cast<std::uint32_t>(row);
+  }
+  sort_entries(keys.get(), count, [](std::uint64_t a, std::uint64_t b) { return a < b; });
+  for (std::int32_t i = 0; i < count; ++i) out[i] = static_cast<std::int32_t>(keys[i]);
+  return true;
+}
+
+// Keys of 64 bits; `rest` orders two rows of equal keys (below 0, 0, above 0).
+template <class KeyOf, class Rest>
+bool sort_rows_by_long_key(std::int32_t count, std::int32_t* out, KeyOf key_of,
+                           Rest rest) noexcept {
+  const auto keys = new_array<KeyedRow>(static_cast<std::uint64_t>(count));
+  if (!keys) return false;
+  for (std::int32_t row = 0; row < count; ++row) keys[row] = {key_of(row), row};
+  sort_entries(keys.get(), count, [&](const KeyedRow& a, const KeyedRow& b) {
+    if (a.key != b.key) return a.key < b.key;
+    const int order = rest(a, b);
+    return order != 0 ? order < 0 : a.row < b.row;
+  });
+  for (std::int32_t i = 0; i < count; ++i) out[i] = keys[i].row;
+  return true;
+}
+
+bool sort_rows_by_text(const Values& values, std::int64_t readable, std::int32_t count,
+                       std::int32_t* out) noexcept {
+  const bool wide = readable >= std::int64_t{kHeadSize};
+  const auto head = [&](std::int32_t row) {
+    return wide ? wide_text_head(values.of(row)) : text_head(values.of(row));
+  };
+  const auto rest = [&](const KeyedRow& a, const KeyedRow& b) {
+    if (holds_whole_text(a.key)) return 0;
+    return std::strcmp(reinterpret_cast<const char*>(values.of(a.row)) + kHeadSize,
+                       reinterpret_cast<const char*>(values.of(b.row)) + kHeadSize);
+  };
+  return sort_rows_by_long_key(count, out, head, rest);
+}
+
+bool sort_rows(const TEVPF_TABLE& table, const TEVPF_COLUMN& column, std::int32_t* out) noexcept {
+  const Values values = values_of(table, column);
+  const std::int32_t count = table.num_rows;
+  if (column.def.type == PF_TYPE_STRING) {
+    return sort_rows_by_text(values, readable_bytes(table, column), count, out);
+  }
+  return with_number(column.def.type, [&](auto tag) {
+    using T = decltype(tag);
+    if constexpr (sizeof(T) <= 4) {
+      return sort_rows_by_short_key<T>(values, count, out);
+    } else {
+      return sort_rows_by_long_key(
+          count, out, [&](std::int32_t row) { return sort_key(load<T>(values.of(row))); },
+          [](const KeyedRow&, const KeyedRow&) { return 0; });
+    }
+  });
+}
+
+// What TEV8R1_sort_comp compares: the column whose index was built last.
+struct SortContext {
+  Values values;
+  std::int32_t type;
+  double tolerance;
+};
+SortContext sort_context{{nullptr, 0}, PF_TYPE_INT, 0.0};
+
+// ---- Blocks --------------------------------------------------------------------------------------
+
+// A block of `room` entries, those from `used` on zero; room 0: none. False when there is no memory.
+bool make_block(std::int64_t used, std::int64_t room, NewIndex& out) noexcept {
+  out = NewIndex{};
+  if (room <= 0) return true;
+  if (room > std::numeric_limits<std::int32_t>::max()) return false;
+  out.entries = new_array<std::int32_t>(static_cast<std::uint64_t>(room));
+  if (!out.entries) return false;
+  std::fill(out.entries.get() + used, out.entries.get() + room, 0);
+  out.room = static_cast<std::int32_t>(room);
+  return true;
+}
+
+void fill_identity(std::int32_t* entries, std::int32_t count) noexcept {
+  for (std::int32_t i = 0; i < count; ++i) entries[i] = i;
+}
+
+bool reserve_entries(TEVPF_COLUMN& column, std::int64_t needed) noexcept {
+  if (column.index_room >= needed && column.idx_ptr != nullptr) return true;
+  constexpr std::int64_t most = std::numeric_limits<std::int32_t>::max();
+  if (needed > most) return false;
+  const std::int64_t room = std::min(grown_room(column.index_room, needed), most);
+  void* const block = heap_resize(column.idx_ptr, static_cast<std::uint64_t>(room), 4);
+  if (block == nullptr) return false;
+  column.idx_ptr = static_cast<std::int32_t*>(block);
+  column.index_room = static_cast<std::int32_t>(room);
+  return true;
+}
+
+// ---- Passes over entries, written so that the compiler makes vectors of them ---------------------
+
+constexpr std::int32_t kBlock = 64;
+
+// The position of a row number from `first` on; count when it is not there.
+std::int32_t find_entry(const std::int32_t* entries, std::int32_t first, std::int32_t count,
+                        std::int32_t row) noexcept {
+  std::int32_t at = first;
+  for (; count - at >= kBlock; at += kBlock) {
+    std::uint32_t seen = 0;
+    for (std::int32_t i = 0; i < kBlock; ++i) seen |= entries[at + i] == row ? 1u : 0u;
+    if (seen != 0) break;
+  }
+  while (at < count && entries[at] != row) ++at;
+  return at;
+}
+
+// Lowers by one every entry above `row` up to the entry that is `row`, and returns its position; count
+// when there is none.
+std::int32_t lower_up_to(std::int32_t* entries, std::int32_t count, std::int32_t row) noexcept {
+  std::int32_t at = 0;
+  for (; count - at >= kBlock; at += kBlock) {
+    std::uint32_t seen = 0;
+    for (std::int32_t i = 0; i < kBlock; ++i) seen |= entries[at + i] == row ? 1u : 0u;
+    if (seen != 0) break;
+    for (std::int32_t i = 0; i < kBlock; ++i) entries[at + i] -= entries[at + i] > row ? 1 : 0;
+  }
+  for (; at < count && entries[at] != row; ++at) entries[at] -= entries[at] > row ? 1 : 0;
+  return at;
+}
+
+// Takes a row out of `count` entries, lowers those above it, and returns where it stood.
+std::int32_t remove_row(std::int32_t* entries, std::int32_t count, std::int32_t row) noexcept {
+  const std::int32_t position = lower_up_to(entries, count, row);
+  for (std::int32_t i = position; i < count - 1; ++i) {
+    const std::int32_t next = entries[i + 1];
+    entries[i] = next - (next > row ? 1 : 0);
+  }
+  return position;
+}
+
+// Whether the comparison of some entry's value with that of the next one passes the test.
+template <class Test>
+bool some_neighbours(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
+                     const std::int32_t* entries, double tolerance, Test test) noexcept {
+  const Values values = values_of(table, column);
+  const auto any = [&](auto compare) {
+    for (std::int32_t i = 0; i + 1 < table.num_rows; ++i) {
+      if (test(compare(values.of(entries[i]), values.of(entries[i + 1])))) return true;
+    }
+    return false;
+  };
+  if (column.def.type == PF_TYPE_STRING) {
+    return any([](const unsigned char* a, const unsigned char* b) {
+      return compare_text(reinterpret_cast<const char*>(a),
+                          make_pattern(reinterpret_cast<const char*>(b)));
+    });
+  }
+  return with_number(column.def.type, [&](auto tag) {
+    using T = decltype(tag);
+    return any([&](const unsigned char* a, const unsigned char* b) {
+      return compare_numbers(load<T>(a), load<T>(b), tolerance);
+    });
+  });
+}
+
+void move_entries(std::int32_t* to, const std::int32_t* from, std::int32_t count) noexcept {
+  std::memmove(to, from, static_cast<std::size_t>(count) * sizeof *to);
+}
+
+}  // namespace
+
+// ---- Whole indexes -------------------------------------------------------------------------------
+
+bool build_index(const TEVPF_TABLE& table, const TEVPF_COLUMN& column, std::int64_t room,
+                 NewIndex& out) noexcept {
+  if (!make_block(table.num_rows, room, out)) return false;
+  return !out.entries || sort_rows(table, column, out.entries.get());
+}
+
+bool make_identity_index(std::int32_t count, std::int64_t room, NewIndex& out) noexcept {
+  if (!make_block(count, room, out)) return false;
+  if (out.entries) fill_identity(out.entries.get(), count);
+  return true;
+}
+
+bool copy_index(const TEVPF_COLUMN& column, std::int32_t count, NewIndex& out) noexcept {
+  if (!make_block(count, count, out)) return false;
+  if (out.entries) move_entries(out.entries.get(), column.idx_ptr, count);
+  return true;
+}
+
+void adopt_index(TEVPF_COLUMN& column, NewIndex index) noexcept {
+  heap_free(column.idx_ptr);
+  column.idx_ptr = index.entries.release();
+  column.index_room = index.room;
+}
+
+void release_index(TEVPF_COLUMN& column) noexcept { adopt_index(column, NewIndex{}); }
+
+bool new_index(std::int32_t count, NewIndex& out) noexcept { return make_block(count, count, out); }
+
+bool is_permutation_of_rows(const std::int32_t* entries, std::int32_t count,
+                            bool& answered) noexcept {
+  const auto words = (static_cast<std::uint64_t>(count) + 63) / 64;
+  const auto seen = new_zeroed<std::uint64_t>(words);
+  answered = seen != nullptr;
+  if (!answered) return false;
+  for (std::int32_t i = 0; i < count; ++i) {
+    const std::int32_t row = entries[i];
+    if (row < 0 || row >= count) return false;
+    const std::uint64_t bit = std::uint64_t{1} << (row % 64);
+    if ((seen[row / 64] & bit) != 0) return false;
+    seen[row / 64] |= bit;
+  }
+  return true;
+}
+
+bool is_index_in_order(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
+                       double tolerance) noexcept {
+  return !some_neighbours(table, column, column.idx_ptr, tolerance,
+                          [](int order) { return order > 0; });
+}
+
+bool has_equal_neighbours(const TEVPF_TABLE& table, const std::int32_t* entries,
+                          const TEVPF_COLUMN& column) noexcept {
+  return some_neighbours(table, column, entries, column.tolerance,
+                         [](int order) { return order == 0; });
+}
+
+bool reserve_index_entries(TEVPF_TABLE& table, std::int32_t rows) noexcept {
+  const std::int64_t needed = std::int64_t{table.num_rows} + rows;
+  for (std::int32_t i = 0; i < table.num_cols; ++i) {
+    TEVPF_COLUMN& column = table.col_array[i];
+    if (column.def.idx_flag != 0 && !reserve_entries(column, needed)) return false;
+  }
+  return true;
+}
+
+// ---- Entries -------------------------------------------------------------------------------------
+
+TEVPF_STATUS search_index(const TEVPF_TABLE& table, const TEVPF_COLUMN& column, std::int32_t first,
+                          std::int32_t count, const void* key, std::int32_t& pos) noexcept {
+  pos = 0;
+  if (count < 1) return PF_NOTFOUND;
+  const Values values = values_of(table, column);
+  return with_key(column.def.type, column.tolerance, key, readable_bytes(table, column),
+                  [&](const auto& prepared) {
+                    return search_entries(values, column.idx_ptr + first, count, prepared, pos);
+                  });
+}
+
+void renumber_for_insertion(TEVPF_TABLE& table, std::int32_t row_number) noexcept {
+  for (std::int32_t i = 0; i < table.num_cols; ++i) {
+    if (table.col_array[i].def.idx_flag == 0) continue;
+    std::int32_t* const entries = table.col_array[i].idx_ptr;
+    for (std::int32_t k = 0; k < table.num_rows; ++k)
+      entries[k] += entries[k] >= row_number ? 1 : 0;
+  }
+}
+
+void insert_entry(TEVPF_COLUMN& column, std::int32_t count, std::int32_t position,
+                  std::int32_t row_number) noexcept {
+  std::int32_t* const place = column.idx_ptr + position;
+  move_entries(place + 1, place, count - position);
+  *place = row_number;
+}
+
+void remove_row_from_indexes(TEVPF_TABLE& table, std::int32_t row_number,
+                             std::int32_t* positions) noexcept {
+  for (std::int32_t i = 0; i < table.num_cols; ++i) {
+    if (table.col_array[i].def.idx_flag == 0) continue;
+    const std::int32_t position =
+        remove_row(table.col_array[i].idx_ptr, table.num_rows, row_number);
+    if (positions != nullptr) positions[i] = position;
+  }
+}
+
+void move_entry(const TEVPF_TABLE& table, TEVPF_COLUMN& column, std::int32_t row_number,
+                const void* value) noexcept {
+  const std::int32_t count = table.num_rows;
+  const unsigned char* const stored = values_of(table, column).of(row_number);
+  std::int32_t first = 0;
+  if (search_index(table, column, 0, count, stored, first) != PF_NORMAL) first = 0;
+  std::int32_t position = find_entry(column.idx_ptr, first, count, row_number);
+  // Values that drifted within the tolerance can stand where their search does not lead.
+  if (position == count) position = find_entry(column.idx_ptr, 0, first, row_number);
+
+  std::int32_t* const place = column.idx_ptr + position;
+  move_entries(place, place + 1, count - 1 - position);
+  std::int32_t target = 0;
+  (void)search_index(table, column, 0, count - 1, value, target);
+  insert_entry(column, count - 1, target, row_number);
+}
+
+}  // namespace tevpf
+
+using namespace tevpf;
+
+TEVPF_STATUS TEV8R1_create_index(TEVPF_TABLE* table, TEVPF_COLUMN* column) noexcept {
+  const std::int64_t room = std::int64_t{table->num_rows} + table->free_rows;
+  if (room < 1) return PF_NORMAL;
+  sort_context = {values_of(*table, *column), column->def.type, column->tolerance};
+  NewIndex index;
+  if (!build_index(*table, *column, room, index)) return fail_empty(PF_NOMEM);
+  adopt_index(*column, std::move(index));
+  return PF_NORMAL;
+}
+
+int32_t TEV8R1_sort_comp(const void* a, const void* b) noexcept {
+  const Values& values = sort_context.values;
+  const TEVPF_STATUS order = TEV8R1_compare(sort_context.type, values.of(load<int32_t>(a)),
+                                            values.of(load<int32_t>(b)), sort_context.tolerance);
+  return order == PF_NORMAL ? 0 : static_cast<int32_t>(order);
+}
+
+TEVPF_STATUS TEV8R1_binary_search(int32_t type, double tolerance, int32_t count, int32_t row_wid,
+                                  const int32_t* index, const void* column_base, const void* key,
+                                  int32_t* pos_out) noexcept {
+  if (count < 1) {
+    *pos_out = 0;
+    return PF_NOTFOUND;
+  }
+  if (!is_value_type(type)) return PF_CMPFAIL;
+  const Values values{static_cast<const unsigned char*>(column_base), row_wid};
+  return with_key(type, tolerance, key, 0, [&](const auto& prepared) {
+    return search_entries(values, index, count, prepared, *pos_out);
+  });
+}
+
+TEVPF_STATUS TEV8R1_update_indexes(TEVPF_TABLE* table, const void* row,
+                                   int32_t row_number) noexcept {
+  for (int32_t i = 0; i < table->num_cols; ++i) {
+    TEVPF_COLUMN& column = table->col_array[i];
+    if (column.def.idx_flag == 0) continue;
+    const auto* const value = static_cast<const unsigned char*>(row) + column.offset;
+    int32_t position = 0;
+    (void)search_index(*table, column, 0, table->num_rows, value, position);
+    insert_entry(column, table->num_rows, position, row_number);
+  }
+  return PF_NORMAL;
+}
+
+TEVPF_STATUS TEV8R1_remove_index(int32_t* index, int32_t row_number, int32_t count) noexcept {
+  remove_row(index, count, row_number);
+  return PF_NORMAL;
+}
+
+TEVPF_STATUS TEV8R1_adjust_index(int32_t num_rows, int16_t free_rows, int32_t** idx_out) noexcept {
+  NewIndex index;
+  if (!make_identity_index(num_rows, int64_t{num_rows} + free_rows, index)) {
+    return fail_empty(PF_NOMEM);
+  }
+  *idx_out = index.entries.release();
+  return PF_NORMAL;
+}

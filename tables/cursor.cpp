@@ -1,0 +1,83 @@
+#include "tables/cursor.h"
+
+#include <cstring>
+
+#include "core/directory.h"
+#include "core/status.h"
+#include "tables/column_index.h"
+#include "tables/row_store.h"
+
+namespace tevpf {
+namespace {
+
+bool has_position(const TEVPF_TABLE& table, std::int32_t position) noexcept {
+  return position >= 0 && position < table.num_rows;
+}
+
+// In search order rows lie anywhere: ask for one some positions ahead, so that it is there in time.
+void fetch_ahead(const TEVPF_TABLE& table, std::int32_t position) noexcept {
+  if (table.cur_col == nullptr || table.num_rows - position <= kRowsAhead) return;
+  const unsigned char* const row = row_at(table, row_at_position(table, position + kRowsAhead));
+  __builtin_prefetch(row);
+  __builtin_prefetch(row + table.row_wid - 1);
+}
+
+}  // namespace
+
+void deliver_row(TEVPF_TABLE& table, std::int32_t position, void* row_out) noexcept {
+  fetch_ahead(table, position);
+  const unsigned char* const row = row_at(table, row_at_position(table, position));
+  if (table.row_wid > 0) std::memcpy(row_out, row, static_cast<std::size_t>(table.row_wid));
+  table.cur_row = position;
+  table.next_row = position + 1;
+}
+
+}  // namespace tevpf
+
+using namespace tevpf;
+
+TEVPF_STATUS TEV8R1_get_next_row_ptr(TEVPF_TABLE* table, void** row_ptr_out,
+                                     int32_t* row_number_out) noexcept {
+  const bool exists = has_position(*table, table->next_row);
+  *row_number_out = exists ? row_at_position(*table, table->next_row) : table->next_row;
+  *row_ptr_out = exists ? row_at(*table, *row_number_out) : nullptr;
+  return PF_NORMAL;
+}
+
+TEVPF_STATUS TEV8R1_get_cur_row_ptr(TEVPF_TABLE* table, void** row_ptr_out,
+                                    int32_t* row_number_out) noexcept {
+  if (!has_position(*table, table->cur_row)) return fail_empty(PF_NOCURROW);
+  *row_number_out = row_at_position(*table, table->cur_row);
+  *row_ptr_out = row_at(*table, *row_number_out);
+  return PF_NORMAL;
+}
+
+TEVPF_STATUS TEV8R1_PF_get_next_row(const char* table_name, void* row_out) noexcept {
+  TEVPF_TABLE* table;
+  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  if (!has_position(*table, table->next_row)) return PF_NOMORE;
+  deliver_row(*table, table->next_row, row_out);
+  return PF_NORMAL;
+}
+
+TEVPF_STATUS TEV8R1_PF_get_row_by_pos(const char* table_name, int32_t pos, void* row_out) noexcept {
+  TEVPF_TABLE* table;
+  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  if (!has_position(*table, pos)) return fail(PF_BADPOS, Text(pos), Text(table->num_rows));
+  deliver_row(*table, pos, row_out);
+  return PF_NORMAL;
+}
+
+TEVPF_STATUS TEV8R1_PF_reset_table(const char* table_name) noexcept {
+  TEVPF_TABLE* table;
+  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  table->cur_row = -1;
+  table->next_row = 0;
+  return PF_NORMAL;
+}
+
+int32_t TEV8R1_convert_row(const char* table_name, int32_t pos) noexcept {
+  TEVPF_TABLE* table;
+  if (TEV8R1_get_table_ptr(table_name, &table) != PF_NORMAL) return -1;
+  return has_position(*table, pos) ? row_at_position(*table, pos) : pos;
+}

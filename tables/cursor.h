@@ -1,0 +1,29 @@
+// The table's cursor: the position of the current row and of the next one.
+#pragma once
+
+#include <cstdint>
+
+#include "tables/table.h"
+
+extern "C" {
+
+// The row at position next_row, and its row number. Without a next row: null, and the position.
+// Always PF_NORMAL.
+TEVPF_API TEVPF_STATUS TEV8R1_get_next_row_ptr(TEVPF_TABLE* table, void** row_ptr_out,
+                                               std::int32_t* row_number_out) noexcept;
+
+// The row at position cur_row, and its row number.
+//   PF_NOCURROW  no row is current; texts empty
+TEVPF_API TEVPF_STATUS TEV8R1_get_cur_row_ptr(TEVPF_TABLE* table, void** row_ptr_out,
+                                              std::int32_t* row_number_out) noexcept;
+}
+
+namespace tevpf {
+
+// How many positions ahead rows are fetched into the cache while they are read in search order.
+inline constexpr std::int32_t kRowsAhead = 12;
+
+// Copies the row at a position to row_out and makes it the current one.
+void deliver_row(TEVPF_TABLE& table, std::int32_t position, void* row_out) noexcept;
+
+}  // namespace tevpf

@@ -1,0 +1,139 @@
+// Rows found by value, and one column's values of all rows.
+#include <cstring>
+#include <type_traits>
+
+#include "core/directory.h"
+#include "core/status.h"
+#include "tables/column_index.h"
+#include "tables/column_record.h"
+#include "tables/cursor.h"
+#include "tables/layout.h"
+#include "tables/row_store.h"
+#include "tables/validate.h"
+#include "values/compare.h"
+#include "values/value_text.h"
+
+using namespace tevpf;
+
+namespace {
+
+constexpr std::int8_t kExact = 0;
+constexpr std::int8_t kNearest = 1;
+
+// The first position from `first` on whose row has a value equal to the key, walking in storage order
+// (order null) or through an index; num_rows when there is none. At the speed of memory: one typed
+// comparison a row.
+template <class Key>
+std::int32_t walk(const TEVPF_TABLE& table, const TEVPF_COLUMN& column, const std::int32_t* order,
+                  std::int32_t first, const Key& key) noexcept {
+  const unsigned char* const base = column_base(table, column);
+  const std::int64_t stride = table.row_wid;
+  const std::int32_t count = table.num_rows;
+  std::int32_t at = first;
+  if (order == nullptr) {
+    const unsigned char* value = base + at * stride;
+    for (; at < count && !key.equals(value); value += stride) ++at;
+    return at;
+  }
+  for (; at < count; ++at) {
+    if (count - at > kRowsAhead) __builtin_prefetch(base + order[at + kRowsAhead] * stride);
+    if (key.equals(base + order[at] * stride)) break;
+  }
+  return at;
+}
+
+std::int32_t walk_for_key(const TEVPF_TABLE& table, const TEVPF_COLUMN& column, std::int32_t first,
+                          const void* key) noexcept {
+  const std::int32_t* const order =
+      table.cur_col != nullptr ? index_entries(*table.cur_col) : nullptr;
+  return with_key(
+      column.def.type, column.tolerance, key, table.row_wid - column.offset,
+      [&](const auto& prepared) { return walk(table, column, order, first, prepared); });
+}
+
+// The position from `first` on whose row has the key, or in nearest mode, which acts on the search
+// column only, the next greater value.
+TEVPF_STATUS find_position(const TEVPF_TABLE& table, const TEVPF_COLUMN& column, std::int8_t mode,
+                           const void* key, std::int32_t first, std::int32_t& position) noexcept {
+  const std::int32_t remaining = table.num_rows - first;
+  bool found = false;
+  if (remaining > 0 && is_indexed(column) && &column == table.cur_col) {
+    std::int32_t pos = 0;
+    const TEVPF_STATUS status = search_index(table, column, first, remaining, key, pos);
+    found = status == PF_NORMAL || (mode == kNearest && pos < remaining);
+    position = first + pos;
+  } else if (remaining > 0) {
+    position = walk_for_key(table, column, first, key);
+    found = position < table.num_rows;
+  }
+  return found ? PF_NORMAL : fail(PF_NOTFOUND, ValueText(column.def.type, key).c_str());
+}
+
+void copy_column(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
+                 unsigned char* out) noexcept {
+  const unsigned char* value = column_base(table, column);
+  const auto copy = [&](auto size) {  // a constant for numbers, so that each copy is a plain move
+    for (std::int32_t row = 0; row < table.num_rows; ++row, value += table.row_wid, out += size) {
+      std::memcpy(out, value, size);
+    }
+  };
+  if (column.def.type == PF_TYPE_STRING) return copy(static_cast<std::size_t>(column_size(column)));
+  with_number(column.def.type,
+              [&](auto tag) { copy(std::integral_constant<std::size_t, sizeof tag>{}); });
+}
+
+}  // namespace
+
+TEVPF_STATUS TEV8R1_PF_define_table_search(const char* table_name,
+                                           const char* column_name) noexcept {
+  TEVPF_TABLE* table;
+  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  TEVPF_COLUMN* column = nullptr;
+  if (column_name != nullptr) {
+    PF_TRY(TEV8R1_get_col_ptr(table, column_name, &column));
+    if (!is_indexed(*column)) return fail(PF_BADSEARCH, column_name);
+  }
+  table->cur_col = column;
+  return PF_NORMAL;
+}
+
+TEVPF_STATUS TEV8R1_PF_get_row_by_value(const char* table_name, int8_t mode,
+                                        const char* column_name, const void* key,
+                                        void* row_out) noexcept {
+  TEVPF_TABLE* table;
+  TEVPF_COLUMN* column;
+  int32_t position = 0;
+  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  if (table->num_rows == 0) return fail_empty(PF_NOTFOUND);
+  PF_TRY(TEV8R1_get_col_ptr(table, column_name, &column));
+  PF_TRY(find_position(*table, *column, mode, key, table->next_row, position));
+  deliver_row(*table, position, row_out);
+  return PF_NORMAL;
+}
+
+// The value is copied from where it is stored: no row is delivered, so the cursor never moves.
+TEVPF_STATUS TEV8R1_PF_get_value(const char* table_name, const char* column_name, const void* key,
+                                 void* value_out) noexcept {
+  TEVPF_TABLE* table;
+  TEVPF_COLUMN* column;
+  int32_t position = 0;
+  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  if (table->num_cols == 0) return PF_NORMAL;
+  if (table->num_rows == 0) return fail_empty(PF_NOTFOUND);
+  PF_TRY(find_position(*table, table->col_array[0], kExact, key, 0, position));
+  PF_TRY(TEV8R1_get_col_ptr(table, column_name, &column));
+  std::memcpy(value_out, row_at(*table, row_at_position(*table, position)) + column->offset,
+              static_cast<std::size_t>(column_size(*column)));
+  return PF_NORMAL;
+}
+
+TEVPF_STATUS TEV8R1_PF_get_col_values(const char* table_name, const char* column_name,
+                                      void* values_out) noexcept {
+  TEVPF_TABLE* table;
+  TEVPF_COLUMN* column;
+  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  if (table->num_rows == 0) return PF_NOMORE;
+  PF_TRY(TEV8R1_get_col_ptr(table, column_name, &column));
+  copy_column(*table, *column, static_cast<unsigned char*>(values_out));
+  return PF_NORMAL;
+}

@@ -1,0 +1,119 @@
+// How values are ordered and matched: every index, range check, uniqueness check and search compares
+// through here.
+//
+// A search prepares its key once (with_key) and then compares stored values with it, without a look at
+// the type at each step. The stored value is always the left side, so that only a key can be a pattern.
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <cstring>
+
+#include "values/text_compare.h"
+#include "values/value_type.h"
+
+namespace tevpf {
+
+// a against b: negative, 0 or positive. Reals and doubles that lie within the tolerance are equal, and
+// so is anything compared with what is not a number.
+template <class T>
+int compare_numbers(T a, T b, [[maybe_unused]] double tolerance) noexcept {
+  if constexpr (kIsFloating<T>) {
+    const double x = a, y = b;
+    return int{(y < x) & (x - tolerance > y)} - int{(y > x) & (x + tolerance < y)};
+  } else {
+    return int{a > b} - int{a < b};
+  }
+}
+
+// A number to search for.
+template <class T>
+class NumberKey {
+ public:
+  NumberKey(const void* key, double tolerance) noexcept
+      : key_(load<T>(key)), tolerance_(tolerance) {}
+
+  // The value stored at `place` against the key: negative, 0 or positive.
+  int compare(const unsigned char* place) const noexcept {
+    return compare_numbers(load<T>(place), key_, tolerance_);
+  }
+  bool is_above(const unsigned char* place) const noexcept { return load<T>(place) < key_; }
+  bool equals(const unsigned char* place) const noexcept {
+    if constexpr (kIsFloating<T>) {
+      return compare(place) == 0;
+    } else {
+      return load<T>(place) == key_;
+    }
+  }
+
+ private:
+  T key_;
+  double tolerance_;  // of no use to integers
+};
+
+inline constexpr std::size_t kHeadSize = 8;
+
+// The first eight bytes of a text as a number that orders as they do; zeros behind its terminator.
+// All eight bytes must be readable.
+inline std::uint64_t wide_text_head(const unsigned char* text) noexcept {
+  const std::uint64_t bytes = load<std::uint64_t>(text);
+  const std::uint64_t ends = (bytes - 0x0101010101010101u) & ~bytes & 0x8080808080808080u;
+  return __builtin_bswap64(bytes & (ends ^ (ends - 1)));  // up to the first zero byte; all without
+}
+
+// The same when nothing behind the terminator may be read.
+inline std::uint64_t text_head(const unsigned char* text) noexcept {
+  std::uint64_t head = 0;
+  for (std::size_t i = 0; i < kHeadSize && text[i] != 0; ++i) {
+    head |= std::uint64_t{text[i]} << (56 - 8 * i);
+  }
+  return head;
+}
+
+// Whether a head holds its whole text, so that equal heads are equal texts.
+constexpr bool holds_whole_text(std::uint64_t head) noexcept { return (head & 0xFF) == 0; }
+
+// A text or pattern to search for. kWide: eight bytes may be read from the start of every value.
+template <bool kWide>
+class TextKey {
+ public:
+  explicit TextKey(const void* key) noexcept
+      : pattern_(make_pattern(static_cast<const char*>(key))) {
+    // Of a prefix only its own bytes are compared, of a text the terminator too.
+    const bool short_prefix = pattern_.prefix && pattern_.length < kHeadSize;
+    if (short_prefix) head_mask_ = ~(~std::uint64_t{0} >> (8 * pattern_.length));
+    head_ = text_head(static_cast<const unsigned char*>(key)) & head_mask_;
+    has_rest_ = !short_prefix && pattern_.length >= kHeadSize;
+    if (!has_rest_) return;
+    pattern_.text += kHeadSize;
+    pattern_.length -= kHeadSize;
+  }
+
+  int compare(const unsigned char* place) const noexcept {
+    const std::uint64_t head = (kWide ? wide_text_head(place) : text_head(place)) & head_mask_;
+    if (head != head_) return head < head_ ? -1 : 1;
+    if (!has_rest_) return 0;
+    return compare_text(reinterpret_cast<const char*>(place) + kHeadSize, pattern_);
+  }
+  bool equals(const unsigned char* place) const noexcept { return compare(place) == 0; }
+
+ private:
+  TextPattern pattern_;  // what follows the head
+  bool has_rest_;        // false: the head says it all
+  std::uint64_t head_;
+  std::uint64_t head_mask_ = ~std::uint64_t{0};
+};
+
+// Calls f with the prepared key of a valid type. `readable` is how many bytes can be read from the
+// start of every stored value, or 0 when that is not known.
+template <class F>
+decltype(auto) with_key(std::int32_t type, double tolerance, const void* key, std::int64_t readable,
+                        F&& f) {
+  if (type == PF_TYPE_STRING) {
+    if (readable >= std::int64_t{kHeadSize}) return f(TextKey<true>(key));
+    return f(TextKey<false>(key));
+  }
+  return with_number(type, [&](auto tag) { return f(NumberKey<decltype(tag)>(key, tolerance)); });
+}
+
+}  // namespace tevpf
