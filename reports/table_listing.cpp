@@ -10,7 +10,7 @@
 #include "reports/segments.h"
 #include "reports/table_dump.h"
 #include "tables/column_index.h"
-#include "tables/columns.h"
+#include "tables/column_record.h"
 #include "tables/row_store.h"
 
 namespace tevpf {
