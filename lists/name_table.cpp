@@ -51,7 +51,8 @@ bool build(TEVPF_LIST& list, std::int64_t names) noexcept {
   while (slots < 2 * static_cast<std::uint64_t>(names)) slots *= 2;
   Owned<NameSlot> block = new_array<NameSlot>(slots);
   if (!block) return false;
-  std::memset(block.get(), 0xFF, slots * sizeof(NameSlot));  // every position -1
+  const auto bytes = static_cast<std::size_t>(slots * sizeof(NameSlot));
+  std::memset(block.get(), 0xFF, bytes);  // every position -1
 
   heap_free(list.names.slots);
   list.names.slots = block.release();
