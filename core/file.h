@@ -5,6 +5,7 @@
 #include <cstdio>
 
 #include "core/element.h"
+#include "core/heap.h"
 #include "core/name_set.h"
 
 extern "C" {
@@ -24,6 +25,9 @@ struct TEVPF_FILE {
   std::uint8_t read_only;  // could only be opened for reading
   char file_name[TEVPF_FILE_NAME_SIZE];
 
+  std::int32_t list_room;  // slots that the two arrays really have
+  std::int32_t table_room;
+
   // Beside the directory, so that names are found and checked in O(1).
   tevpf::NameSet list_names;
   tevpf::NameSet table_names;
@@ -33,3 +37,23 @@ TEVPF_API TEVPF_STATUS TEV8R1_add_file(std::FILE* stream, const char* name,
                                        std::uint8_t read_only) noexcept;
 TEVPF_API TEVPF_STATUS TEV8R1_free_file(TEVPF_FILE* file) noexcept;
 }
+
+namespace tevpf {
+
+// A record for a file of that name (at most TEVPF_FILE_NAME_SIZE - 1 characters) that is not yet in
+// the chain; null when memory runs out.
+[[nodiscard]] Owned<TEVPF_FILE> new_file_record(const char* name) noexcept;
+
+// Puts a record at the end of the chain and makes it current.
+TEVPF_FILE& append_file(Owned<TEVPF_FILE> record, std::FILE* stream, bool read_only) noexcept;
+
+// Takes a file out of the chain; the current file becomes its neighbour.
+void unlink_file(TEVPF_FILE& file) noexcept;
+
+// The open file of exactly that name, or null.
+[[nodiscard]] TEVPF_FILE* find_open_file(const char* name) noexcept;
+
+// Whether the system refused access for lack of rights, or because nobody may write there.
+[[nodiscard]] bool access_denied(int error_number) noexcept;
+
+}  // namespace tevpf

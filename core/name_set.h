@@ -1,6 +1,6 @@
 // Element names of one kind in one file, hashed by the 19 characters that are kept of a name: an
-// accelerator beside the directory, which stays the truth. It may be dropped at any time and is
-// built again when it is needed; without memory for it, callers walk the directory.
+// accelerator beside the directory, which stays the truth. It may be dropped at any time and is built
+// again when it is needed; without memory for it, callers walk the directory.
 #pragma once
 
 #include <cstdint>
@@ -10,21 +10,25 @@
 namespace tevpf {
 
 struct NameSet {
-  TEVPF_ELEM_HEADER** slots;  // open addressing; null while not built
-  std::uint32_t mask;         // slots - 1, a power of two - 1
-  std::int32_t count;         // names in the set
+  struct Slot {
+    TEVPF_ELEM_HEADER* element;  // null: empty
+    std::uint32_t hash;
+  };
+  Slot* slots;         // open addressing with linear probing; null while not built
+  std::uint32_t mask;  // slots - 1, a power of two - 1
+  std::int32_t count;  // names in the set
 };
 
-// The element whose name has the same first 19 characters, or null. `elements` are the `count`
-// element records of the directory; a set that does not hold exactly these is built anew first.
-TEVPF_ELEM_HEADER* find_name(NameSet& set, TEVPF_ELEM_HEADER* const* elements, std::int32_t count,
-                             const char* name) noexcept;
-
-// Keeps the set in step with an element that was appended to the directory; drops the set when it
-// cannot.
+// Adds an element, whose name must not change while it is in the set. Without memory, all names are
+// dropped.
 void add_name(NameSet& set, TEVPF_ELEM_HEADER* element) noexcept;
 
-// Before a name is changed or an element taken out.
+// The element whose name has the same first 19 characters, or null.
+TEVPF_ELEM_HEADER* find_name(const NameSet& set, const char* name) noexcept;
+
+// Takes an element out, before its name changes or it is released. O(1).
+void remove_name(NameSet& set, const TEVPF_ELEM_HEADER* element) noexcept;
+
 void drop_names(NameSet& set) noexcept;
 
 }  // namespace tevpf

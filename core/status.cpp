@@ -30,13 +30,9 @@ void write(char (&text)[N], const Phrase& phrase) noexcept {
 
 }  // namespace
 
-Text::Text(std::int32_t number) noexcept {
-  *write_decimal(buffer_, number) = '\0';
-}
+Text::Text(std::int32_t number) noexcept { *write_decimal(buffer_, number) = '\0'; }
 
-Text::Text(double number) noexcept {
-  *write_general(buffer_, number, kTextPrecision) = '\0';
-}
+Text::Text(double number) noexcept { *write_general(buffer_, number, kTextPrecision) = '\0'; }
 
 TEVPF_STATUS fail(TEVPF_STATUS status, Phrase item, Phrase value) noexcept {
   write(err_item, item);

@@ -21,9 +21,7 @@ void terminate_field(char (&field)[N]) noexcept {
   field[N - 1] = '\0';
 }
 
-inline bool starts_with_blank(const char* name) noexcept {
-  return name[0] == ' ';
-}
+inline bool starts_with_blank(const char* name) noexcept { return name[0] == ' '; }
 
 // Names of elements count as equal when as much of them as is kept is equal.
 inline bool same_element_name(const char* a, const char* b) noexcept {

@@ -1,0 +1,94 @@
+#include "core/input.h"
+
+#include <algorithm>
+#include <cstring>
+
+#include "core/stream_size.h"
+
+namespace tevpf {
+
+namespace {
+constexpr std::size_t kReadAhead = 64 * 1024;
+constexpr std::uint64_t kSmallClaim = 64 * 1024;            // not worth asking how much is left
+constexpr std::uint64_t kMaxRead = std::uint64_t{1} << 30;  // fits size_t everywhere
+}  // namespace
+
+bool Input::read_ahead() noexcept {
+  buffer_ = new_array<unsigned char>(kReadAhead);
+  next_ = end_ = buffer_.get();
+  return buffer_ != nullptr;
+}
+
+std::uint64_t Input::read_stream(unsigned char* to, std::uint64_t count) noexcept {
+  std::uint64_t done = 0;
+  while (done != count) {
+    const auto part = static_cast<std::size_t>(std::min(count - done, kMaxRead));
+    const std::size_t got = std::fread(to + done, 1, part, stream_);
+    done += got;
+    if (got != part) break;
+  }
+  return done;
+}
+
+std::uint64_t Input::read(void* to, std::uint64_t count) noexcept {
+  auto* place = static_cast<unsigned char*>(to);
+  std::uint64_t done = 0;
+  for (;;) {
+    const auto part = static_cast<std::size_t>(std::min<std::uint64_t>(buffered(), count - done));
+    if (part != 0) std::memcpy(place + done, next_, part);
+    next_ += part;
+    done += part;
+    if (done == count) return done;
+    if (!buffer_ || count - done >= kReadAhead) {
+      return done + read_stream(place + done, count - done);
+    }
+    next_ = buffer_.get();
+    end_ = next_ + read_stream(buffer_.get(), kReadAhead);
+    if (next_ == end_) return done;
+  }
+}
+
+Input::Claim Input::weigh(std::uint64_t bytes) const noexcept {
+  if (bytes <= kSmallClaim) return Claim::kFits;
+  const std::int64_t left = stream_bytes_left(stream_);
+  if (left < 0) return Claim::kUnknown;
+  return bytes <= static_cast<std::uint64_t>(left) + buffered() ? Claim::kFits : Claim::kTooLarge;
+}
+
+Input::Got Input::read_block(std::uint64_t bytes, Owned<unsigned char>& out) noexcept {
+  const Claim claim = weigh(bytes);
+  if (claim == Claim::kTooLarge) return Got::kPart;
+  std::uint64_t room = claim == Claim::kFits ? bytes : kSmallClaim;
+  Owned<unsigned char> block = new_array<unsigned char>(room);
+  if (!block) return Got::kNoMemory;
+  for (std::uint64_t done = 0;;) {
+    const std::uint64_t part = std::min(room, bytes) - done;
+    if (read(block.get() + done, part) != part) return Got::kPart;
+    done += part;
+    if (done == bytes) break;
+    room *= 2;
+    void* larger = heap_resize(block.get(), std::min(room, bytes), 1);
+    if (larger == nullptr) return Got::kNoMemory;
+    (void)block.release();
+    block.reset(static_cast<unsigned char*>(larger));
+  }
+  out = std::move(block);
+  return Got::kAll;
+}
+
+const unsigned char* ByteReader::take(std::int64_t count) noexcept {
+  if (count < 0 || count > left()) return nullptr;
+  const unsigned char* part = next_;
+  next_ += count;
+  return part;
+}
+
+const char* ByteReader::take_text() noexcept {
+  const void* terminator = std::memchr(next_, '\0', static_cast<std::size_t>(left()));
+  if (terminator == nullptr) return nullptr;
+  const auto* text = reinterpret_cast<const char*>(next_);
+  next_ = static_cast<const unsigned char*>(terminator) + 1;
+  return text;
+}
+
+}  // namespace tevpf

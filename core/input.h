@@ -1,0 +1,69 @@
+// Where stored bytes come from: a stream, read once from front to back. What a file says about itself
+// is a claim; Input tells whether the rest of the stream can hold it, before anything is allocated.
+#pragma once
+
+#include <cstdint>
+#include <cstdio>
+
+#include "core/heap.h"
+
+namespace tevpf {
+
+class Input {
+ public:
+  explicit Input(std::FILE* stream) noexcept : stream_(stream) {}
+  Input(const Input&) = delete;
+  Input& operator=(const Input&) = delete;
+
+  // Gets a buffer, so that many small records arrive in few large reads: the stream is then read
+  // further than it is asked for. False when memory runs out.
+  [[nodiscard]] bool read_ahead() noexcept;
+
+  // Reads up to `count` bytes and gives their number: fewer only at the end of the stream.
+  [[nodiscard]] std::uint64_t read(void* to, std::uint64_t count) noexcept;
+
+  // True when the stream ended by an error.
+  [[nodiscard]] bool has_failed() const noexcept { return std::ferror(stream_) != 0; }
+
+  enum class Claim {
+    kFits,      // so many bytes are left, or they are few
+    kTooLarge,  // fewer are left
+    kUnknown,   // the stream does not say; allocate step by step
+  };
+  [[nodiscard]] Claim weigh(std::uint64_t bytes) const noexcept;
+
+  enum class Got { kAll, kPart, kNoMemory };
+
+  // Reads a block of so many bytes, allocated as far as the stream holds them.
+  [[nodiscard]] Got read_block(std::uint64_t bytes, Owned<unsigned char>& out) noexcept;
+
+ private:
+  std::size_t buffered() const noexcept { return static_cast<std::size_t>(end_ - next_); }
+  std::uint64_t read_stream(unsigned char* to, std::uint64_t count) noexcept;
+
+  std::FILE* stream_;
+  Owned<unsigned char> buffer_;
+  const unsigned char* next_ = nullptr;  // what is read ahead
+  const unsigned char* end_ = nullptr;
+};
+
+// The bytes of a body: takes parts off its front and never goes beyond its end.
+class ByteReader {
+ public:
+  ByteReader(const void* bytes, std::int32_t count) noexcept
+      : next_(static_cast<const unsigned char*>(bytes)), end_(next_ + count) {}
+
+  std::int64_t left() const noexcept { return end_ - next_; }
+
+  // The next `count` bytes; null when there are not so many.
+  [[nodiscard]] const unsigned char* take(std::int64_t count) noexcept;
+
+  // A text with its terminator; null when there is none before the end.
+  [[nodiscard]] const char* take_text() noexcept;
+
+ private:
+  const unsigned char* next_;
+  const unsigned char* end_;
+};
+
+}  // namespace tevpf

@@ -1,0 +1,104 @@
+// Loads a file, element after element, in one pass.
+#include "core/reader.h"
+
+#include <cstring>
+
+#include "core/element_builder.h"
+#include "core/file.h"
+#include "core/input.h"
+#include "core/status.h"
+#include "core/text_field.h"
+
+namespace tevpf {
+
+namespace {
+
+constexpr std::int32_t kFirstScratch = 4096;
+
+// The body of the element being read; one block, replaced by larger ones only.
+struct Scratch {
+  Owned<unsigned char> block;
+  std::int32_t room = 0;
+};
+
+Input::Got read_body(Input& input, std::int32_t bytes, Scratch& scratch) noexcept {
+  if (bytes > scratch.room) {
+    const Input::Got got = input.read_block(static_cast<std::uint32_t>(bytes), scratch.block);
+    if (got == Input::Got::kAll) scratch.room = bytes;
+    return got;
+  }
+  const auto count = static_cast<std::uint64_t>(bytes);
+  return input.read(scratch.block.get(), count) == count ? Input::Got::kAll : Input::Got::kPart;
+}
+
+// The file ends inside this element, or contradicts itself. The file may be gone afterwards.
+TEVPF_STATUS refuse(TEVPF_FILE& file, const TEVPF_ELEM_HEADER& header) noexcept {
+  PF_TRY(TEV8R1_check_valid_file(&file));
+  return fail(PF_BADFORMAT, header.elem_name);
+}
+
+TEVPF_STATUS load_element(TEVPF_FILE& file, TEVPF_ELEM_HEADER& header, Input& input,
+                          Scratch& scratch) noexcept {
+  const bool is_list = header.elem_type == PF_ELEM_LIST;
+  if (!is_list && header.elem_type != PF_ELEM_TABLE) {
+    PF_TRY(TEV8R1_check_valid_file(&file));
+    return fail(PF_BADTYPE, {"element", header.elem_name}, Text(header.elem_type));
+  }
+  if (header.btf < (is_list ? kListHead : kTableHead)) return refuse(file, header);
+  switch (read_body(input, header.btf, scratch)) {
+    case Input::Got::kPart:
+      return refuse(file, header);
+    case Input::Got::kNoMemory:
+      return fail_empty(PF_NOMEM);
+    case Input::Got::kAll:
+      break;
+  }
+  const TEVPF_STATUS status = is_list ? build_list(header, scratch.block.get(), input)
+                                      : build_table(header, scratch.block.get(), input);
+  if (status == PF_BADFORMAT) PF_TRY(TEV8R1_check_valid_file(&file));
+  return status;
+}
+
+}  // namespace
+
+TEVPF_STATUS load_file(TEVPF_FILE& file) noexcept {
+  Input input(file.fp);
+  Scratch scratch{new_array<unsigned char>(kFirstScratch), kFirstScratch};
+  if (!scratch.block || !input.read_ahead()) return fail_empty(PF_NOMEM);
+  for (;;) {
+    TEVPF_ELEM_HEADER header = {};
+    const std::uint64_t got = input.read(&header, sizeof header);
+    terminate_field(header.elem_name);
+    terminate_field(header.elem_desc);
+    if (got == 0 && !input.has_failed()) {
+      file.new_file = 0;
+      return PF_NORMAL;
+    }
+    if (got != sizeof header) return refuse(file, header);
+    PF_TRY(load_element(file, header, input, scratch));
+  }
+}
+
+}  // namespace tevpf
+
+using namespace tevpf;
+
+TEVPF_STATUS TEV8R1_check_valid_file(TEVPF_FILE* file) noexcept {
+  if (file->num_lists > 0 || file->num_tables > 0) return PF_NORMAL;
+  const TEVPF_STATUS status = fail(PF_BADFILE, file->file_name);
+  file->new_file = 0;
+  TEV8R1_PF_close(0);
+  return status;
+}
+
+TEVPF_STATUS TEV8R1_format_list(TEVPF_ELEM_HEADER header, const void* body,
+                                std::FILE* stream) noexcept {
+  Input input(stream);
+  return build_list(header, body, input);
+}
+
+TEVPF_STATUS TEV8R1_format_table(TEVPF_ELEM_HEADER header, const void* body,
+                                 std::FILE* stream) noexcept {
+  Input input(stream);
+  return build_table(header, body, input);
+}

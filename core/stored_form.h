@@ -1,0 +1,112 @@
+// The file format, written down once: the stored fields of each record in stored order. Sizes, reader
+// and writer follow from these tables. Little-endian, without padding; the stored form is the same
+// whatever the size of a pointer.
+//
+//   element      list head, or table head; then btf - 12, or btf - 24 bytes of parameters or columns
+//   parameter    kParamHead, type part, [description and terminator]
+//                type part: the first param_part bytes of `part`; strings: then the text and terminator
+//   column       kColumnHead, the first column_part bytes of `limits`, [description and terminator]
+//   behind       list: name index; table: the index of each indexed column, then the rows
+#pragma once
+
+#include <bit>
+#include <cstddef>
+#include <cstdint>
+#include <cstring>
+#include <iterator>
+#include <utility>
+
+#include "lists/list.h"
+#include "tables/table.h"
+#include "values/value_type.h"
+
+namespace tevpf {
+
+static_assert(std::endian::native == std::endian::little);
+
+struct Field {
+  std::size_t place;  // in the record
+  std::size_t bytes;
+};
+
+inline constexpr std::size_t kNowhere = SIZE_MAX;  // zero in the file, no part of the record
+
+// Bodies without parameters or columns.
+inline constexpr Field kListFields[] = {
+    {offsetof(TEVPF_LIST, num_params), 4},
+    {offsetof(TEVPF_LIST, RESERVED), 8},
+};
+inline constexpr Field kTableFields[] = {
+    {offsetof(TEVPF_TABLE, num_cols), 4}, {offsetof(TEVPF_TABLE, num_rows), 4},
+    {offsetof(TEVPF_TABLE, row_wid), 4},  {offsetof(TEVPF_TABLE, dsp_wid), 4},
+    {offsetof(TEVPF_TABLE, RESERVED), 8},
+};
+
+inline constexpr Field kParamFields[] = {
+    {offsetof(TEVPF_PARAM, RESERVED), 7},
+    {offsetof(TEVPF_PARAM, desc_loc), 1},
+    {offsetof(TEVPF_PARAM, def.type), 4},
+    {offsetof(TEVPF_PARAM, def.name), TEVPF_NAME_SIZE},
+    {offsetof(TEVPF_PARAM, def.units), TEVPF_UNITS_SIZE},
+    {kNowhere, 4},
+};
+
+inline constexpr Field kColumnFields[] = {
+    {offsetof(TEVPF_COLUMN, offset), 4},
+    {offsetof(TEVPF_COLUMN, RESERVED), 4},
+    {offsetof(TEVPF_COLUMN, def.type), 4},
+    {offsetof(TEVPF_COLUMN, def.name), TEVPF_NAME_SIZE},
+    {offsetof(TEVPF_COLUMN, def.units), TEVPF_UNITS_SIZE},
+    {offsetof(TEVPF_COLUMN, desc_flag), 1},  // in the place of desc_byte
+    {offsetof(TEVPF_COLUMN, def.spare_byte), 1},
+    {offsetof(TEVPF_COLUMN, def.idx_flag), 1},
+    {offsetof(TEVPF_COLUMN, def.unq_flag), 1},
+    {offsetof(TEVPF_COLUMN, def.width), 4},
+};
+
+template <std::size_t N>
+constexpr std::int32_t stored_size(const Field (&fields)[N]) noexcept {
+  std::size_t bytes = 0;
+  for (const Field& field : fields) bytes += field.bytes;
+  return static_cast<std::int32_t>(bytes);
+}
+
+static_assert(stored_size(kListFields) == kListHead);
+static_assert(stored_size(kTableFields) == kTableHead);
+static_assert(stored_size(kParamFields) == 44);
+static_assert(stored_size(kColumnFields) == 48);
+
+namespace stored_form {
+
+// Each field is copied with a size known to the compiler.
+template <const auto& Fields, std::size_t... I>
+void pack(const void* record, unsigned char* out, std::index_sequence<I...>) noexcept {
+  const auto* from = static_cast<const unsigned char*>(record);
+  ((Fields[I].place == kNowhere ? std::memset(out, 0, Fields[I].bytes)
+                                : std::memcpy(out, from + Fields[I].place, Fields[I].bytes),
+    out += Fields[I].bytes),
+   ...);
+}
+
+template <const auto& Fields, std::size_t... I>
+void unpack(const unsigned char* in, void* record, std::index_sequence<I...>) noexcept {
+  auto* to = static_cast<unsigned char*>(record);
+  ((Fields[I].place == kNowhere ? to : std::memcpy(to + Fields[I].place, in, Fields[I].bytes),
+    in += Fields[I].bytes),
+   ...);
+}
+
+}  // namespace stored_form
+
+// Copies the fields of a record to their stored form, and back.
+template <const auto& Fields>
+void pack(const void* record, unsigned char* out) noexcept {
+  stored_form::pack<Fields>(record, out, std::make_index_sequence<std::size(Fields)>{});
+}
+
+template <const auto& Fields>
+void unpack(const unsigned char* in, void* record) noexcept {
+  stored_form::unpack<Fields>(in, record, std::make_index_sequence<std::size(Fields)>{});
+}
+
+}  // namespace tevpf
