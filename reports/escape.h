@@ -13,13 +13,11 @@ struct EscapeLetters {
 };
 constexpr EscapeLetters make_escape_letters() noexcept {
   EscapeLetters letters{};
-  letters.of['\b'] = 'b';
-  letters.of['\t'] = 't';
-  letters.of['\n'] = 'n';
-  letters.of['\v'] = 'v';
-  letters.of['\f'] = 'f';
-  letters.of['\r'] = 'r';
-  letters.of['\\'] = '\\';
+  constexpr char kCharacters[] = "\b\t\n\v\f\r\\";
+  constexpr char kLetters[] = "btnvfr\\";
+  for (int i = 0; kLetters[i] != 0; ++i) {
+    letters.of[static_cast<unsigned char>(kCharacters[i])] = kLetters[i];
+  }
   return letters;
 }
 inline constexpr EscapeLetters kEscapeLetters = make_escape_letters();
