@@ -195,7 +195,8 @@ static void print_parameter(const TEVPF_PARAM_DEF* def) {
   } else {
     format_number(def, number);
   }
-  printf("  %-19s  %-7s  %s %s\n", def->name, type_word(def->type), value, def->units);
+  printf("  %-19s  %-7s  %s%s%s\n", def->name, type_word(def->type), value,
+         def->units[0] == '\0' ? "" : " ", def->units);
 }
 
 /* ---- The steps of the program ---------------------------------------------------------------- */
@@ -268,7 +269,7 @@ static void look_up(const char* name, Parameter* parameter) {
     return;
   }
   check_status(PF_NORMAL, status, "TEV8R1_PF_get_param_def", __FILE__, __LINE__);
-  printf("  \"%s\" finds %s: %s\n", name, parameter->def.name, parameter->description);
+  printf("  \"%s\" finds: %s\n  ", name, parameter->description);
   print_parameter(&parameter->def);
 }
 
@@ -287,7 +288,8 @@ static void try_gravitation(double value, const char* origin, TEVPF_STATUS expec
   const TEVPF_STATUS status = TEV8R1_PF_modify_param(LIST, "gravitation", &value);
   check_status(expected, status, "TEV8R1_PF_modify_param", __FILE__, __LINE__);
   CHECK(TEV8R1_PF_get_param_value(LIST, "gravitation", &after));
-  printf("  set %.6g (%s): %s, now %.6g\n", value, origin, status_name(status), after);
+  printf("  set it to %.6g (%s): %s, so it is %.6g now\n", value, origin, status_name(status),
+         after);
 }
 
 static void change_values(void) {
@@ -301,7 +303,7 @@ static void change_values(void) {
 
   try_gravitation(6.67408e-11, "CODATA 2014", PF_NORMAL);
   try_gravitation(6.67259e-11, "CODATA 1986", PF_RANGE);
-  try_gravitation(original, "the first value", PF_NORMAL);
+  try_gravitation(original, "CODATA 2018 again", PF_NORMAL);
 }
 
 static void walk_forwards(void) {
@@ -318,7 +320,7 @@ static void walk_forwards(void) {
   CHECK_IS(PF_NOMORE, TEV8R1_PF_get_next_param_def(LIST, ready(&parameter)));
   free_parameter(&parameter);
   REQUIRE(seen == count);
-  printf("  PF_NOMORE: that were all %d\n", (int)seen);
+  printf("  PF_NOMORE: all %d were seen\n", (int)seen);
 }
 
 /* The cursor stands on the last parameter, where the walk forwards left it. Every parameter is
@@ -361,6 +363,7 @@ int main(int argc, char** argv) {
   walk_forwards();
   walk_backwards((int32_t)csv.records);
   CHECK(TEV8R1_PF_close(0)); /* without saving: the file holds what it held */
+  printf("\nThe file " FILE_NAME " stays in the current directory.\n");
   csv_free(&csv);
   return EXIT_SUCCESS;
 }

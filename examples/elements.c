@@ -269,16 +269,16 @@ static void hottest(const Layout* layout, char* row) {
   printf("  position %d: PF_BADPOS\n", (int)rows);
 }
 
-/* Gives zirconium the atomic weight of the 2024 revision, then tries to give it the number of
- * hydrogen. */
+/* Gives zirconium the standard atomic weight of the revision of 2024 (IUPAC Commission on Isotopic
+ * Abundances and Atomic Weights), then tries to give it the number of hydrogen. */
 static void replace_row(const Layout* layout, char* row) {
   const float revised = 91.222F;
   const int32_t taken = 1;
-  heading("Replace a row");
+  heading("Replace a row: the weight of zirconium as revised in 2024");
   find_number(layout, row, 40);
   memcpy(row + layout->offsets[WEIGHT], &revised, sizeof revised);
   CHECK(TEV8R1_PF_replace_row(TABLE, row));
-  find_number(layout, row, 40);
+  find_number(layout, row, 40); /* the replaced row, as it is stored now */
 
   memcpy(row + layout->offsets[NUMBER], &taken, sizeof taken);
   CHECK_IS(PF_DUPLICATE, TEV8R1_PF_replace_row(TABLE, row));
@@ -349,7 +349,7 @@ static void save_and_compare(const Layout* layout) {
     free(before[i]);
   }
   CHECK(TEV8R1_PF_close(0));
-  printf("  the file is " FILE_NAME "\n");
+  printf("\nThe file " FILE_NAME " stays in the current directory.\n");
 }
 
 int main(int argc, char** argv) {
