@@ -31,8 +31,6 @@ Parsed parse_column(ByteReader& body, TEVPF_COLUMN& column) noexcept {
   TEVPF_COL_DEF& def = column.def;
   if (!is_value_type(def.type)) return Parsed::kUnknownType;
   terminate_texts(def);
-  def.idx_flag = def.idx_flag != 0 ? 1 : 0;
-  def.unq_flag = def.idx_flag != 0 && def.unq_flag != 0 ? 1 : 0;
 
   const std::int32_t limit_bytes = value_type(def.type).column_part;
   const unsigned char* limits = body.take(limit_bytes);

@@ -329,24 +329,6 @@ void adopt_index(TEVPF_COLUMN& column, NewIndex index) noexcept {
 
 void release_index(TEVPF_COLUMN& column) noexcept { adopt_index(column, NewIndex{}); }
 
-bool new_index(std::int32_t count, NewIndex& out) noexcept { return make_block(count, count, out); }
-
-bool is_permutation_of_rows(const std::int32_t* entries, std::int32_t count,
-                            bool& answered) noexcept {
-  const auto words = (static_cast<std::uint64_t>(count) + 63) / 64;
-  const auto seen = new_zeroed<std::uint64_t>(words);
-  answered = seen != nullptr;
-  if (!answered) return false;
-  for (std::int32_t i = 0; i < count; ++i) {
-    const std::int32_t row = entries[i];
-    if (row < 0 || row >= count) return false;
-    const std::uint64_t bit = std::uint64_t{1} << (row % 64);
-    if ((seen[row / 64] & bit) != 0) return false;
-    seen[row / 64] |= bit;
-  }
-  return true;
-}
-
 bool is_index_in_order(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
                        double tolerance) noexcept {
   return !some_neighbours(table, column, column.idx_ptr, tolerance,

@@ -47,13 +47,6 @@ struct NewIndex {
 void adopt_index(TEVPF_COLUMN& column, NewIndex index) noexcept;
 void release_index(TEVPF_COLUMN& column) noexcept;
 
-// A block for `count` entries that a file reader fills through entries.get().
-[[nodiscard]] bool new_index(std::int32_t count, NewIndex& out) noexcept;
-
-// Whether `entries` holds each of 0 .. count - 1 once. False in `answered` when memory runs out.
-[[nodiscard]] bool is_permutation_of_rows(const std::int32_t* entries, std::int32_t count,
-                                          bool& answered) noexcept;
-
 // Whether no entry's value is greater than its follower's, by the column's type and this tolerance.
 [[nodiscard]] bool is_index_in_order(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
                                      double tolerance) noexcept;

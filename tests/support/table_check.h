@@ -63,7 +63,8 @@ inline bool in_order(const TEVPF_COLUMN& column, const unsigned char* a, const u
   return tevpf::with_number(column.def.type, [&](auto tag) {
     using T = decltype(tag);
     const double slack = tevpf::kIsFloating<T> ? 10 * column.tolerance : 0;
-    return !(double{tevpf::load<T>(a)} > double{tevpf::load<T>(b)} + slack);
+    return !(static_cast<double>(tevpf::load<T>(a)) >
+             static_cast<double>(tevpf::load<T>(b)) + slack);
   });
 }
 
@@ -78,8 +79,7 @@ inline const char* broken_index(const TEVPF_TABLE& table, const TEVPF_COLUMN& co
     if (row < 0 || row >= table.num_rows) return "index entry is no row number";
     if (seen[static_cast<std::size_t>(row)]) return "index entry twice";
     seen[static_cast<std::size_t>(row)] = true;
-    const unsigned char* value =
-        table.row_data + std::int64_t{row} * table.row_wid + column.offset;
+    const unsigned char* value = table.row_data + std::int64_t{row} * table.row_wid + column.offset;
     if (previous != nullptr && !in_order(column, previous, value)) return "index out of order";
     previous = value;
   }

@@ -1,0 +1,902 @@
+// Random sequences of all table operations on the library and on a plain model: vectors of values, and
+// indexes kept by the documented rules in the simplest way. After every step the status, both texts of
+// a refusal, every row, index, default value and the cursor are compared, and the invariants checked.
+#include <gtest/gtest.h>
+#include <stdlib.h>
+
+#include <cmath>
+#include <cstdio>
+#include <functional>
+#include <map>
+#include <optional>
+#include <random>
+#include <set>
+#include <variant>
+
+#include "core/directory.h"
+#include "core/error_context.h"
+#include "support/table_check.h"
+
+namespace {
+
+using tevpf_test::broken_rule;
+
+// In the order of the type codes, so that the index of the alternative tells the type.
+using Value = std::variant<std::int32_t, float, std::string, double, std::int16_t>;
+using Row = std::vector<Value>;
+
+struct Column {
+  TEVPF_COL_DEF def{};  // its description is desc
+  std::optional<std::string> desc;
+  double tolerance = 0;
+  std::vector<int> index;
+};
+
+struct Result {
+  TEVPF_STATUS status = PF_NORMAL;
+  std::string item = "was", value = "here";  // what the context holds before each step
+};
+
+Result empty_texts(TEVPF_STATUS status) { return {status, "", ""}; }
+
+std::string text_of(const Value& value) {
+  char buffer[64];
+  if (const auto* text = std::get_if<std::string>(&value)) return *text;
+  std::visit(
+      [&](const auto& v) {
+        using T = std::decay_t<decltype(v)>;
+        if constexpr (std::is_floating_point_v<T>) {
+          std::snprintf(buffer, sizeof buffer, "%g", static_cast<double>(v));
+        } else if constexpr (std::is_integral_v<T>) {
+          std::snprintf(buffer, sizeof buffer, "%d", v);
+        }
+      },
+      value);
+  return buffer;
+}
+
+double number(const Value& value) {
+  return std::visit(
+      [](const auto& v) -> double {
+        if constexpr (std::is_arithmetic_v<std::decay_t<decltype(v)>>) return v;
+        return 0;
+      },
+      value);
+}
+
+Value make_value(int type, double x) {
+  switch (type) {
+    case PF_TYPE_INT:
+      return static_cast<std::int32_t>(x);
+    case PF_TYPE_REAL:
+      return static_cast<float>(x);
+    case PF_TYPE_DOUBLE:
+      return x;
+    case PF_TYPE_SHORT:
+      return static_cast<std::int16_t>(x);
+    default:
+      return std::string();
+  }
+}
+
+bool is_real(int type) { return type == PF_TYPE_REAL || type == PF_TYPE_DOUBLE; }
+
+struct Limits {
+  double max = 0, min = 0;
+  int precision = 1;
+};
+
+Limits limits(const TEVPF_COL_DEF& def) {
+  switch (def.type) {
+    case PF_TYPE_INT:
+      return {double(def.limits.i32.max), double(def.limits.i32.min)};
+    case PF_TYPE_SHORT:
+      return {double(def.limits.i16.max), double(def.limits.i16.min)};
+    case PF_TYPE_REAL:
+      return {def.limits.f32.max, def.limits.f32.min, def.limits.f32.precision};
+    case PF_TYPE_DOUBLE:
+      return {def.limits.f64.max, def.limits.f64.min, def.limits.f64.precision};
+    default:
+      return {};
+  }
+}
+
+void set_limits(TEVPF_COL_DEF& def, const Limits& l) {
+  std::memset(&def.limits, 0, sizeof def.limits);
+  switch (def.type) {
+    case PF_TYPE_INT:
+      def.limits.i32 = {int(l.max), int(l.min)};
+      break;
+    case PF_TYPE_SHORT:
+      def.limits.i16 = {static_cast<std::int16_t>(l.max), static_cast<std::int16_t>(l.min)};
+      break;
+    case PF_TYPE_REAL:
+      def.limits.f32 = {float(l.max), float(l.min), l.precision};
+      break;
+    case PF_TYPE_DOUBLE:
+      def.limits.f64 = {l.max, l.min, l.precision};
+      break;
+    default:
+      break;
+  }
+}
+
+Value least(const TEVPF_COL_DEF& def) { return make_value(def.type, limits(def).min); }
+
+int compare_values(const Value& a, const Value& b, double tolerance) {
+  if (const auto* text = std::get_if<std::string>(&a)) {
+    std::string left = *text, right = std::get<std::string>(b);
+    const auto star = right.find('*');
+    if (star != std::string::npos && star + 1 == right.size()) {
+      right.resize(star);
+      left = left.substr(0, star);
+    }
+    const int order = left.compare(right);
+    return order < 0 ? -1 : order > 0;
+  }
+  const double x = number(a), y = number(b);
+  const double slack = is_real(int(a.index()) + PF_TYPE_INT) ? tolerance : 0;
+  if (x > y) return x - slack > y;
+  return x < y && x + slack < y ? -1 : 0;
+}
+
+// ---- The model -----------------------------------------------------------------------------------
+
+struct Model {
+  std::vector<Column> columns;
+  std::vector<Row> rows;
+  Row defaults;
+  int cur = -1, next = 0, search = -1, free_rows = 0, free_cols = 0;
+  bool interactive = false;
+  static constexpr int kInitial = 5, kIncrement = 3;
+
+  int count() const { return int(rows.size()); }
+  const Value& at(int row, int column) const { return rows[size_t(row)][size_t(column)]; }
+  Column& col(int i) { return columns[size_t(i)]; }
+  int row_at(int position) { return search < 0 ? position : col(search).index[size_t(position)]; }
+  int column_named(const std::string& name) const {
+    for (size_t i = 0; i < columns.size(); ++i) {
+      if (name == columns[i].def.name) return int(i);
+    }
+    return -1;
+  }
+
+  // The documented probes.
+  bool find(int column, const std::vector<int>& index, int first, const Value& key, int& pos) {
+    const auto order = [&](int p) {
+      return compare_values(at(index[size_t(p)], column), key, col(column).tolerance);
+    };
+    int low = first, high = int(index.size()) - 1;
+    while (low <= high) {
+      const int middle = first + ((low - first) + (high - first)) / 2;
+      const int answer = order(middle);
+      if (answer == 0) {
+        for (pos = middle; pos > first && order(pos - 1) == 0; --pos) {
+        }
+        return true;
+      }
+      (answer < 0 ? low = middle + 1 : high = middle - 1);
+    }
+    pos = low;
+    return false;
+  }
+
+  std::vector<int> sorted(int column) {
+    std::vector<int> index;
+    for (int i = 0; i < count(); ++i) index.push_back(i);
+    std::stable_sort(index.begin(), index.end(), [&](int a, int b) {
+      return compare_values(at(a, column), at(b, column), 0) < 0;
+    });
+    return index;
+  }
+
+  Result check_value(int column, const Value& value, int* holder = nullptr) {
+    const Column& c = col(column);
+    const Limits l = limits(c.def);
+    if (c.def.type != PF_TYPE_STRING &&
+        (compare_values(value, make_value(c.def.type, l.max), c.tolerance) > 0 ||
+         compare_values(value, make_value(c.def.type, l.min), c.tolerance) < 0)) {
+      return {PF_RANGE, text_of(value), ""};
+    }
+    int pos = 0;
+    if (!c.def.idx_flag || !c.def.unq_flag || !find(column, c.index, 0, value, pos)) return {};
+    if (holder != nullptr) *holder = c.index[size_t(pos)];
+    return {PF_DUPLICATE, "value " + text_of(value), std::string("column ") + c.def.name};
+  }
+
+  // owner: a row that may hold the values already; -2: any row may.
+  Result check_row(const Row& row, int owner) {
+    for (size_t i = 0; i < row.size(); ++i) {
+      int holder = -1;
+      const Result r = check_value(int(i), row[i], &holder);
+      if (r.status == PF_DUPLICATE && (owner == -2 || holder == owner)) continue;
+      if (r.status != PF_NORMAL) return r;
+    }
+    return {};
+  }
+
+  void insert_entries(int row) {
+    for (int c = 0; c < int(columns.size()); ++c) {
+      if (!col(c).def.idx_flag) continue;
+      int pos = 0;
+      find(c, col(c).index, 0, at(row, c), pos);
+      col(c).index.insert(col(c).index.begin() + pos, row);
+    }
+  }
+
+  Result add(const Row& row, int place) {
+    if (free_rows == 0) free_rows = rows.empty() ? kInitial : kIncrement;
+    if (!interactive) {
+      if (const Result r = check_row(row, -1); r.status != PF_NORMAL) return r;
+    }
+    place = std::clamp(place, 0, count());
+    for (Column& c : columns) {
+      for (int& entry : c.index) entry += entry >= place;
+    }
+    rows.insert(rows.begin() + place, row);
+    insert_entries(place);
+    --free_rows;
+    return {};
+  }
+
+  void erase(int row) {
+    for (Column& c : columns) {
+      std::erase(c.index, row);
+      for (int& entry : c.index) entry -= entry > row;
+    }
+    rows.erase(rows.begin() + row);
+    ++free_rows;
+  }
+
+  Result replace(const Row& row) {
+    if (cur < 0) return empty_texts(PF_NOCURROW);
+    const int n = row_at(cur);
+    if (const Result r = check_row(row, n); r.status != PF_NORMAL) return r;
+    for (int c = 0; c < int(columns.size()); ++c) {
+      if (!col(c).def.idx_flag) continue;
+      if (compare_values(at(n, c), row[size_t(c)], col(c).tolerance) == 0) continue;
+      std::erase(col(c).index, n);
+      int pos = 0;
+      find(c, col(c).index, 0, row[size_t(c)], pos);
+      col(c).index.insert(col(c).index.begin() + pos, n);
+    }
+    rows[size_t(n)] = row;
+    return {};
+  }
+
+  Result move(int from, int to) {
+    if (search >= 0) return {PF_SEARCHSET};
+    if (from < 0 || from >= count() || count() < 2) {
+      return {PF_BADPOS, std::to_string(from), std::to_string(count())};
+    }
+    const Model before = *this;
+    const Row row = rows[size_t(from)];
+    erase(from);
+    const Result r = add(row, to);
+    if (r.status != PF_NORMAL) *this = before;
+    return r;
+  }
+
+  Result at_position(int pos, TEVPF_STATUS refusal) {
+    if (pos < 0 || pos >= count()) {
+      if (refusal == PF_NOMORE) return {PF_NOMORE};
+      return {refusal, std::to_string(pos), std::to_string(count())};
+    }
+    cur = pos;
+    next = pos + 1;
+    return {};
+  }
+
+  Result by_value(int mode, int column, const Value& key) {
+    const Result missing = {PF_NOTFOUND, text_of(key), ""};
+    if (rows.empty()) return empty_texts(PF_NOTFOUND);
+    if (column == search) {
+      int pos = 0;
+      const bool found = find(column, col(column).index, next, key, pos);
+      if (!found && (mode != 1 || pos >= count())) return missing;
+      return at_position(pos, PF_BADPOS);
+    }
+    for (int p = next; p < count(); ++p) {
+      if (compare_values(at(row_at(p), column), key, col(column).tolerance) == 0) {
+        return at_position(p, PF_BADPOS);
+      }
+    }
+    return missing;
+  }
+
+  static Result check_definition(const TEVPF_COL_DEF& def) {
+    const Limits l = limits(def);
+    if (l.max < l.min) return {PF_BADRANGE, text_of(make_value(def.type, l.min)), ""};
+    if (l.precision < 1) return {PF_BADPREC, std::to_string(l.precision), def.name};
+    return {};
+  }
+
+  Result check_name(const char* name) const {
+    if (name[0] == ' ') return empty_texts(PF_BADNAME);
+    if (column_named(name) < 0) return {};
+    return {PF_DUPLICATE, std::string("column ") + name, "table t"};
+  }
+
+  Result define(const Column& column) {
+    const TEVPF_COL_DEF& def = column.def;
+    if (const Result r = check_name(def.name); r.status != PF_NORMAL) return r;
+    if (def.idx_flag && def.unq_flag && !rows.empty()) return empty_texts(PF_BADUNIQUE);
+    if (const Result r = check_definition(def); r.status != PF_NORMAL) return r;
+    if (def.width < 1) return {PF_BADWIDTH, std::to_string(def.width), def.name};
+    columns.push_back(column);
+    Column& added = columns.back();
+    if (!def.idx_flag) added.def.unq_flag = 0;
+    for (Row& row : rows) row.push_back(least(def));
+    defaults.push_back(least(def));
+    if (def.idx_flag) added.index = sorted(int(columns.size()) - 1);
+    free_rows = 0;
+    if (free_cols == 0) free_cols = 3;
+    --free_cols;
+    return {};
+  }
+
+  Result check_values(const Column& column, int place, const TEVPF_COL_DEF& def) {
+    const Limits l = limits(def);
+    for (int i = 0; i < count(); ++i) {
+      const Value& v = at(i, place);
+      if (compare_values(v, make_value(def.type, l.max), column.tolerance) > 0 ||
+          compare_values(v, make_value(def.type, l.min), column.tolerance) < 0) {
+        return {PF_RANGE, text_of(v), ""};
+      }
+    }
+    return {};
+  }
+
+  bool any_neighbours(int column, const std::vector<int>& index, double tolerance, int order) {
+    for (size_t i = 0; i + 1 < index.size(); ++i) {
+      const int answer = compare_values(at(index[i], column), at(index[i + 1], column), tolerance);
+      if (answer == order) return true;
+    }
+    return false;
+  }
+
+  Result redefine(int place, const Column& changed) {
+    Column& old = col(place);
+    const TEVPF_COL_DEF& def = changed.def;
+    if (std::strcmp(def.name, old.def.name) != 0) {
+      if (const Result r = check_name(def.name); r.status != PF_NORMAL) return r;
+    }
+    if (def.type != old.def.type && !rows.empty()) return {PF_TYPECHG};
+    if (const Result r = check_definition(def); r.status != PF_NORMAL) return r;
+    if (def.type != PF_TYPE_STRING) {
+      Result r = check_values(old, place, def);
+      if (def.width < 1) r.status = PF_BADWIDTH;
+      if (r.status != PF_NORMAL) return r;
+    } else {
+      if (def.width != old.def.width && !rows.empty()) return empty_texts(PF_BADCOLCHG);
+      if (def.width < 1) return {PF_BADWIDTH};
+    }
+    std::vector<int> index;
+    if (def.idx_flag) index = old.def.idx_flag ? old.index : sorted(place);
+    if (def.idx_flag && def.unq_flag && !old.def.unq_flag &&
+        any_neighbours(place, index, old.tolerance, 0)) {
+      return empty_texts(PF_NOTUNIQUE);
+    }
+    if (!def.idx_flag && search == place) search = -1;
+    const bool finer = changed.tolerance < old.tolerance;
+    old = changed;
+    if (finer && any_neighbours(place, index, old.tolerance, 1)) index = sorted(place);
+    old.index = index;
+    for (size_t i = 0; i < columns.size(); ++i) defaults[i] = least(columns[i].def);
+    return {};
+  }
+
+  void remove_column(int place) {
+    columns.erase(columns.begin() + place);
+    defaults.erase(defaults.begin() + place);
+    for (Row& row : rows) row.erase(row.begin() + place);
+    free_rows = 0;
+    search = search == place ? -1 : search - (search > place);
+    if (!columns.empty()) return;
+    rows.clear();
+    cur = -1;
+    next = 0;
+  }
+
+  void move_column(int from, int before) {  // before: -1 to the end
+    if (columns.size() < 2) return;
+    const int to = (before < 0 ? int(columns.size()) : before) - (before < 0 || before > from);
+    const auto shift = [&](auto& items) {
+      auto item = items[size_t(from)];
+      items.erase(items.begin() + from);
+      items.insert(items.begin() + to, item);
+    };
+    const std::string searched = search < 0 ? "" : col(search).def.name;
+    shift(columns);
+    shift(defaults);
+    for (Row& row : rows) shift(row);
+    if (search >= 0) search = column_named(searched);
+    free_rows = free_cols = 0;
+  }
+};
+
+// ---- Library and model side by side --------------------------------------------------------------
+
+TEVPF_TABLE* table_named(const char* name) {
+  TEVPF_TABLE* table = nullptr;
+  return TEV8R1_get_table_ptr(name, &table) == PF_NORMAL ? table : nullptr;
+}
+
+Value load_value(const TEVPF_COL_DEF& def, const unsigned char* place) {
+  if (def.type == PF_TYPE_STRING) return std::string(reinterpret_cast<const char*>(place));
+  return tevpf::with_number(def.type,
+                            [&](auto tag) -> Value { return tevpf::load<decltype(tag)>(place); });
+}
+
+// A value as callers hand it in: a text in its own block.
+std::vector<unsigned char> bytes_of(const Value& value) {
+  std::vector<unsigned char> bytes(8);
+  std::visit(
+      [&](const auto& v) {
+        using T = std::decay_t<decltype(v)>;
+        if constexpr (std::is_same_v<T, std::string>) {
+          bytes.assign(v.c_str(), v.c_str() + v.size() + 1);
+        } else {
+          tevpf::store(bytes.data(), v);
+        }
+      },
+      value);
+  return bytes;
+}
+
+// A row as a careless caller hands it in: rubbish in the padding and behind texts, and no terminator
+// behind a text as wide as its column.
+std::vector<unsigned char> image(const TEVPF_TABLE& table, const Row& row) {
+  std::vector<unsigned char> bytes(size_t(table.row_wid), 0xEE);
+  for (size_t i = 0; i < row.size(); ++i) {
+    const TEVPF_COLUMN& column = table.col_array[i];
+    const auto value = bytes_of(row[i]);
+    const bool text = column.def.type == PF_TYPE_STRING;
+    const size_t size = text && int(value.size()) > column.def.width ? value.size() - 1
+                        : text                                       ? value.size()
+                               : size_t(tevpf_test::size_of(column));
+    std::copy_n(value.begin(), size, bytes.begin() + column.offset);
+  }
+  return bytes;
+}
+
+Row decode(const TEVPF_TABLE& table, const unsigned char* bytes) {
+  Row row;
+  for (int i = 0; i < table.num_cols; ++i) {
+    row.push_back(load_value(table.col_array[i].def, bytes + table.col_array[i].offset));
+  }
+  return row;
+}
+
+std::string text(const Row& row) {
+  std::string all;
+  for (const Value& v : row) all += text_of(v) + "|";
+  return all;
+}
+
+class Pair {
+ public:
+  explicit Pair(unsigned seed) : random_(seed) {
+    path_ = testing::TempDir() + "tevpf_table_model_" + std::to_string(seed);
+    std::remove(path_.c_str());
+    EXPECT_EQ(TEV8R1_PF_open(path_.c_str()), PF_NEWFILE);
+    EXPECT_EQ(TEV8R1_PF_create_elem("t", "model", PF_ELEM_TABLE), PF_NORMAL);
+    TEV8R1_PF_set_memory_allocation(Model::kInitial, Model::kIncrement);
+    define_column();
+  }
+  ~Pair() {
+    TEV8R1_turn_off_interactive();
+    TEV8R1_PF_set_memory_allocation(0, 0);
+    EXPECT_EQ(TEV8R1_PF_close(0), PF_NORMAL);
+    std::remove(path_.c_str());
+  }
+
+  void step() {
+    std::strcpy(tevpf::err_item, "was");
+    std::strcpy(tevpf::err_value, "here");
+    static constexpr struct {
+      int weight;
+      void (Pair::*run)();
+    } kOperations[] = {
+        {24, &Pair::add_row},
+        {10, &Pair::insert_row},
+        {4, &Pair::add_with_defaults},
+        {12, &Pair::replace_row},
+        {10, &Pair::delete_row},
+        {5, &Pair::move_row},
+        {8, &Pair::next_row},
+        {6, &Pair::row_by_pos},
+        {1, &Pair::reset},
+        {10, &Pair::row_by_value},
+        {3, &Pair::get_value},
+        {3, &Pair::define_search},
+        {3, &Pair::set_defaults},
+        {1, &Pair::interactive},
+        {2, &Pair::define_column},
+        {5, &Pair::redefine_column},
+        {1, &Pair::delete_column},
+        {2, &Pair::move_column},
+        {1, &Pair::copy},
+        {1, &Pair::reopen},
+        {2, &Pair::column_values},
+        {2, &Pair::check_value},
+    };
+    int total = 0;
+    for (const auto& operation : kOperations) total += operation.weight;
+    int pick = below(total);
+    for (const auto& operation : kOperations) {
+      if ((pick -= operation.weight) < 0) return (this->*operation.run)();
+    }
+  }
+
+  // The first difference between library and model, or an empty text.
+  std::string difference() {
+    const TEVPF_TABLE& t = *table_named("t");
+    if (!complaint_.empty()) return complaint_;
+    if (const char* rule = broken_rule(t)) return rule;
+    if (t.num_cols != int(model_.columns.size()) || t.num_rows != model_.count()) return "counts";
+    // Slots without rows may go with a change of layout.
+    if (t.num_rows == 0 && t.free_rows == 0) model_.free_rows = 0;
+    if (t.free_rows != model_.free_rows) return "free_rows " + std::to_string(t.free_rows);
+    if (t.free_cols != model_.free_cols) return "free_cols";
+    if (t.cur_row != model_.cur || t.next_row != model_.next) return "cursor";
+    if ((t.cur_col == nullptr ? -1 : t.cur_col - t.col_array) != model_.search) return "search";
+    for (int i = 0; i < t.num_rows; ++i) {
+      const Row row = decode(t, t.row_data + std::int64_t{i} * t.row_wid);
+      if (row != model_.rows[size_t(i)]) return "row " + std::to_string(i) + ": " + text(row);
+    }
+    for (int i = 0; i < t.num_cols; ++i) {
+      if (const char* wrong = column_difference(t, i)) return wrong;
+    }
+    if (t.num_cols > 0 && decode(t, t.dft_row) != model_.defaults) return "default row";
+    return "";
+  }
+
+  std::string last;  // the operation of the last step
+  std::map<TEVPF_STATUS, int> seen;
+
+ private:
+  int below(int n) { return n < 1 ? 0 : int(random_() % unsigned(n)); }
+  bool chance(int percent) { return below(100) < percent; }
+
+  const char* column_difference(const TEVPF_TABLE& t, int i) {
+    const TEVPF_COLUMN& column = t.col_array[i];
+    const Column& expected = model_.col(i);
+    const TEVPF_COL_DEF &a = column.def, &b = expected.def;
+    const Limits la = limits(a), lb = limits(b);
+    if (std::strcmp(a.name, b.name) != 0 || std::strcmp(a.units, b.units) != 0) return "texts";
+    if (a.type != b.type || a.width != b.width) return "type or width";
+    if (a.idx_flag != b.idx_flag || a.unq_flag != b.unq_flag) return "flags";
+    if (la.max != lb.max || la.min != lb.min || la.precision != lb.precision) return "limits";
+    if ((a.description != nullptr) != expected.desc.has_value()) return "description";
+    if (a.description != nullptr && *expected.desc != a.description) return "description";
+    if (!a.idx_flag) return nullptr;
+    const std::vector<int> entries(column.idx_ptr, column.idx_ptr + t.num_rows);
+    return entries == expected.index ? nullptr : "index";
+  }
+
+  void expect(const std::string& operation, const Result& expected, TEVPF_STATUS status) {
+    last = operation;
+    ++seen[expected.status];
+    char code[64];
+    std::snprintf(code, sizeof code, ": status %08x, not %08x", status, expected.status);
+    if (status != expected.status) complaint_ = operation + code;
+    if (status == PF_NORMAL || !complaint_.empty()) return;
+    if (expected.item != tevpf::err_item || expected.value != tevpf::err_value) {
+      complaint_ = operation + ": texts " + tevpf::err_item + ", " + tevpf::err_value;
+    }
+  }
+
+  Value random_value(const Column& c) {
+    const Limits l = limits(c.def);
+    if (c.def.type == PF_TYPE_STRING) {
+      std::string v;
+      for (int n = below(c.def.width + 1); n > 0; --n) v += "aab\xC3"[below(4)];
+      return v;
+    }
+    if (chance(2)) return make_value(c.def.type, chance(50) ? l.max + 1 : l.min - 1);
+    const double few = l.min + below(chance(70) ? 4 : int(l.max - l.min) + 1);
+    // Some reals differ by less than the tolerance, in chains.
+    return make_value(c.def.type, is_real(c.def.type) ? few + below(4) * 0.7 * c.tolerance : few);
+  }
+
+  Row random_row() {
+    Row row;
+    for (const Column& c : model_.columns) row.push_back(random_value(c));
+    return row;
+  }
+
+  // Mostly a value that some row holds.
+  Value random_key(int column) {
+    if (model_.rows.empty() || chance(30)) return random_value(model_.col(column));
+    Value key = model_.at(below(model_.count()), column);
+    if (auto* t = std::get_if<std::string>(&key); t != nullptr && chance(40)) {
+      t->resize(size_t(below(int(t->size()) + 1)));
+      *t += "*";
+    }
+    return key;
+  }
+
+  int any_column() { return below(int(model_.columns.size())); }
+  bool no_columns() const { return model_.columns.empty(); }
+
+  void add_row() {
+    if (no_columns()) return;
+    const Row row = random_row();
+    const auto bytes = image(*table_named("t"), row);
+    expect("add " + text(row), model_.add(row, PF_END_POS), TEV8R1_PF_add_row("t", bytes.data()));
+  }
+  void insert_row() {
+    if (no_columns()) return;
+    const Row row = random_row();
+    const int place = chance(10) ? PF_END_POS : below(model_.count() + 4) - 2;
+    const auto bytes = image(*table_named("t"), row);
+    expect("insert " + std::to_string(place) + ": " + text(row), model_.add(row, place),
+           TEV8R1_PF_add_row_by_pos("t", bytes.data(), place));
+  }
+  void add_with_defaults() {
+    if (no_columns()) return;
+    Row row = random_row();
+    auto bytes = image(*table_named("t"), row);
+    std::vector<std::int32_t> supplied;
+    for (size_t i = 0; i < row.size(); ++i) {
+      supplied.push_back(below(2));
+      if (supplied[i] == 0) row[i] = model_.defaults[i];
+    }
+    expect("add with defaults " + text(row), model_.add(row, PF_END_POS),
+           TEV8R1_PF_add_row_with_dft("t", bytes.data(), supplied.data()));
+    for (size_t i = 0; i < row.size(); ++i) {
+      const TEVPF_COLUMN& column = table_named("t")->col_array[i];
+      if (supplied[i] == 0 && load_value(column.def, bytes.data() + column.offset) != row[i]) {
+        complaint_ = "the buffer does not keep the default";
+      }
+    }
+  }
+  void replace_row() {
+    if (no_columns()) return;
+    Row row = random_row();
+    if (model_.cur >= 0 && chance(70)) {  // change one value only
+      const Row old = model_.rows[size_t(model_.row_at(model_.cur))];
+      const auto kept = size_t(any_column());
+      const Value changed = row[kept];
+      row = old;
+      row[kept] = changed;
+    }
+    const auto bytes = image(*table_named("t"), row);
+    expect("replace " + text(row), model_.replace(row), TEV8R1_PF_replace_row("t", bytes.data()));
+  }
+  void delete_row() {
+    Result expected = empty_texts(PF_NOCURROW);
+    if (model_.cur >= 0) {
+      model_.erase(model_.row_at(model_.cur));
+      model_.cur = -1;
+      --model_.next;
+      expected = {};
+    }
+    expect("delete row", expected, TEV8R1_PF_delete_row("t"));
+  }
+  void move_row() {
+    if (model_.search >= 0 && chance(60)) {
+      model_.search = -1;
+      TEV8R1_PF_define_table_search("t", nullptr);
+    }
+    const int from = below(model_.count() + 2) - 1;
+    const int to = chance(10) ? PF_END_POS : below(model_.count() + 2) - 1;
+    expect("move row " + std::to_string(from) + " to " + std::to_string(to), model_.move(from, to),
+           TEV8R1_PF_move_row("t", from, to));
+  }
+  void delivered(const std::string& operation, const Result& expected, TEVPF_STATUS status,
+                 const std::vector<unsigned char>& out) {
+    expect(operation, expected, status);
+    if (status != PF_NORMAL || !complaint_.empty()) return;
+    const Row row = decode(*table_named("t"), out.data());
+    if (row != model_.rows[size_t(model_.row_at(model_.cur))]) complaint_ = operation + ": row";
+    if (TEV8R1_convert_row("t", model_.cur) != model_.row_at(model_.cur)) complaint_ = "convert";
+  }
+  std::vector<unsigned char> row_buffer() {
+    return std::vector<unsigned char>(size_t(table_named("t")->row_wid) + 1);
+  }
+  void next_row() {
+    auto out = row_buffer();
+    const Result expected = model_.at_position(model_.next, PF_NOMORE);
+    delivered("next row", expected, TEV8R1_PF_get_next_row("t", out.data()), out);
+  }
+  void row_by_pos() {
+    auto out = row_buffer();
+    const int pos = below(model_.count() + 2) - 1;
+    const Result expected = model_.at_position(pos, PF_BADPOS);
+    delivered("row at " + std::to_string(pos), expected,
+              TEV8R1_PF_get_row_by_pos("t", pos, out.data()), out);
+  }
+  void reset() {
+    model_.cur = -1;
+    model_.next = 0;
+    expect("reset", {}, TEV8R1_PF_reset_table("t"));
+  }
+  void row_by_value() {
+    if (no_columns()) return;
+    if (chance(40)) reset();
+    const int column = model_.search >= 0 && chance(60) ? model_.search : any_column();
+    const int mode = below(3);
+    const Value key = random_key(column);
+    auto out = row_buffer();
+    const Result expected = model_.by_value(mode, column, key);
+    delivered("row by value " + text_of(key), expected,
+              TEV8R1_PF_get_row_by_value("t", std::int8_t(mode), model_.col(column).def.name,
+                                         bytes_of(key).data(), out.data()),
+              out);
+  }
+  void get_value() {
+    if (no_columns()) return;
+    const Value key = random_key(0);
+    const int column = any_column();
+    const int cur = model_.cur, next = model_.next;
+    model_.next = 0;
+    const Result expected = model_.by_value(0, 0, key);
+    const int found = model_.row_at(std::max(model_.cur, 0));
+    model_.cur = cur;
+    model_.next = next;
+    std::vector<unsigned char> out(size_t(model_.col(column).def.width) + 9);
+    expect("get value for " + text_of(key), expected,
+           TEV8R1_PF_get_value("t", model_.col(column).def.name, bytes_of(key).data(), out.data()));
+    if (expected.status == PF_NORMAL &&
+        load_value(model_.col(column).def, out.data()) != model_.at(found, column)) {
+      complaint_ = "value found";
+    }
+  }
+  void define_search() {
+    if (no_columns()) return;
+    const int column = any_column();
+    const std::string name = model_.col(column).def.name;
+    Result expected;
+    if (!model_.col(column).def.idx_flag) {
+      expected = {PF_BADSEARCH, name, ""};
+    } else {
+      model_.search = column;
+    }
+    expect("search " + name, expected, TEV8R1_PF_define_table_search("t", name.c_str()));
+  }
+  void set_defaults() {
+    if (no_columns()) return;
+    const Row row = random_row();
+    const auto bytes = image(*table_named("t"), row);
+    const Result expected = model_.interactive ? Result{} : model_.check_row(row, -2);
+    if (expected.status == PF_NORMAL) model_.defaults = row;
+    expect("set defaults " + text(row), expected, TEV8R1_PF_set_dft_row("t", bytes.data()));
+    auto out = row_buffer();
+    TEV8R1_PF_inq_dft_row("t", out.data());
+    if (decode(*table_named("t"), out.data()) != model_.defaults) complaint_ = "default row read";
+  }
+  void interactive() {
+    model_.interactive = !model_.interactive && chance(30);
+    expect("interactive", {},
+           model_.interactive ? TEV8R1_set_interactive_table("t") : TEV8R1_turn_off_interactive());
+  }
+
+  // A definition that is valid most of the time; names are few, so that they collide.
+  Column random_column(int type) {
+    Column c;
+    TEVPF_COL_DEF& def = c.def;
+    def.type = type;
+    std::snprintf(def.name, sizeof def.name, "%sc%d", chance(3) ? " " : "", below(9));
+    std::snprintf(def.units, sizeof def.units, "u%d", below(3));
+    def.width = chance(4) ? 0 : 1 + below(12);
+    def.idx_flag = std::int8_t(chance(60));
+    def.unq_flag = std::int8_t(chance(30));
+    Limits l{double(below(3) - 1 + (chance(80) ? 200 : 5)), double(below(3)), 1 + below(4)};
+    if (chance(3)) l.max = l.min - 1;
+    if (chance(3)) l.precision = 0;
+    finish(c, l);
+    if (chance(50)) c.desc = std::string(size_t(below(6)), 'd');
+    return c;
+  }
+  void finish(Column& c, const Limits& l) {
+    set_limits(c.def, l);
+    c.tolerance = is_real(c.def.type) ? std::pow(10.0, -(l.precision + 1)) : 0;
+  }
+  TEVPF_COL_DEF handed_in(Column& c) {
+    TEVPF_COL_DEF def = c.def;
+    def.description = c.desc ? c.desc->data() : nullptr;
+    return def;
+  }
+  void define_column() {
+    if (model_.columns.size() > 6) return;
+    Column c = random_column(PF_TYPE_INT + below(5));
+    const TEVPF_COL_DEF def = handed_in(c);
+    expect(std::string("define ") + def.name, model_.define(c), TEV8R1_PF_def_column("t", def));
+  }
+  void redefine_column() {
+    if (no_columns()) return;
+    const int place = any_column();
+    const std::string name = model_.col(place).def.name;
+    const TEVPF_COL_DEF& old = model_.col(place).def;
+    Column c = random_column(chance(10) ? PF_TYPE_INT + below(5) : old.type);
+    if (chance(70)) std::strcpy(c.def.name, old.name);
+    if (chance(90)) c.def.width = old.width;
+    if (chance(60)) c.def.idx_flag = old.idx_flag;
+    if (chance(60) && c.def.type == old.type) {
+      Limits l = limits(old);
+      if (chance(40)) l.precision = 1 + below(4);
+      finish(c, l);
+    }
+    const TEVPF_COL_DEF def = handed_in(c);
+    expect("redefine " + name, model_.redefine(place, c),
+           TEV8R1_PF_modify_col_def("t", name.c_str(), def));
+  }
+  void delete_column() {
+    if (no_columns()) return;
+    const int place = any_column();
+    const std::string name = model_.col(place).def.name;
+    model_.remove_column(place);
+    expect("delete " + name, {}, TEV8R1_PF_delete_col("t", name.c_str()));
+    expect("delete again", {PF_NOCOLUMN, name, ""}, TEV8R1_PF_delete_col("t", name.c_str()));
+  }
+  void move_column() {
+    if (no_columns()) return;
+    const int from = any_column(), before = below(int(model_.columns.size()) + 1) - 1;
+    const std::string name = model_.col(from).def.name;
+    const std::string other = before < 0 ? "" : model_.col(before).def.name;
+    model_.move_column(from, before);
+    expect("move " + name + " before " + other, {},
+           TEV8R1_PF_move_col("t", name.c_str(), before < 0 ? nullptr : other.c_str()));
+  }
+
+  // The copy takes the place of its source: whatever they shared would be gone.
+  void copy() {
+    expect("copy", {}, TEV8R1_PF_copy_table("t", "copy"));
+    TEV8R1_PF_delete_table("t");
+    TEV8R1_modify_elem_name(PF_ELEM_TABLE, "copy", "t");
+    model_.free_rows = model_.free_cols = 0;
+  }
+  void reopen() {
+    expect("save", {}, TEV8R1_PF_save(nullptr));
+    TEV8R1_PF_close(0);
+    expect("reopen", {}, TEV8R1_PF_open(path_.c_str()));
+    model_.cur = model_.search = -1;
+    model_.next = model_.free_rows = model_.free_cols = 0;
+    for (size_t i = 0; i < model_.columns.size(); ++i) {
+      model_.defaults[i] = least(model_.columns[i].def);
+    }
+  }
+  void column_values() {
+    if (no_columns()) return;
+    const int column = any_column();
+    const TEVPF_COLUMN& stored = table_named("t")->col_array[column];
+    const auto size = size_t(tevpf_test::size_of(stored));
+    std::vector<unsigned char> out(size * model_.rows.size() + 1);
+    expect("column values", {model_.rows.empty() ? PF_NOMORE : PF_NORMAL},
+           TEV8R1_PF_get_col_values("t", stored.def.name, out.data()));
+    for (int i = 0; i < model_.count(); ++i) {
+      if (load_value(stored.def, out.data() + size_t(i) * size) != model_.at(i, column)) {
+        complaint_ = "column values";
+      }
+    }
+  }
+  void check_value() {
+    if (no_columns()) return;
+    const int column = any_column();
+    const Value value = random_key(column);
+    expect("check " + text_of(value), model_.check_value(column, value),
+           TEV8R1_validate_row_value("t", model_.col(column).def.name, bytes_of(value).data()));
+  }
+
+  std::mt19937 random_;
+  std::string path_;
+  Model model_;
+  std::string complaint_;
+};
+
+class TableModelTest : public testing::TestWithParam<unsigned> {};
+
+TEST_P(TableModelTest, RandomSequencesEqualAPlainModel) {
+  const unsigned seed = GetParam();
+  Pair pair(seed);
+  for (int i = 0; i < 1500; ++i) {
+    pair.step();
+    ASSERT_EQ(pair.difference(), "") << "seed " << seed << ", step " << i << ": " << pair.last;
+  }
+}
+
+INSTANTIATE_TEST_SUITE_P(Seeds, TableModelTest, testing::Range(1u, 21u));
+
+}  // namespace
