@@ -1,0 +1,140 @@
+#include "reports/list_dump.h"
+#include "reports/row_text.h"
+#include "reports/table_dump.h"
+#include "tests/reports/report_fixture.h"
+
+namespace tevpf {
+namespace {
+
+using Dump = ReportTest;
+
+TEST_F(Dump, AFileWithAllKindsOfLists) {
+  fill_lists();
+  table("TEVPF_FILE_HEADER", "only a name");
+  ASSERT_EQ(TEV8R1_PF_dump_file("out.txt"), PF_NORMAL);
+  EXPECT_EQ(slurp("out.txt"), golden("file"));
+}
+
+TEST_F(Dump, WithoutAHeaderListTheBlockIsShortAndTheTextsStay) {
+  ASSERT_EQ(TEV8R1_PF_dump_file("out.txt"), PF_NORMAL);
+  EXPECT_EQ(slurp("out.txt"),
+            "\t\tFile name           : report.pf\n\n.\t\tNumber of lists     : 0\n\n"
+            ".\t\tNumber of tables    : 0\n\n\f\n");
+  EXPECT_STREQ(err_item, "list");
+  EXPECT_STREQ(err_value, "TEVPF_FILE_HEADER");
+}
+
+TEST_F(Dump, RefusalsAndWhatTheyLeave) {
+  const char names[1][TEVPF_NAME_SIZE] = {"x"};
+  EXPECT_EQ(TEV8R1_PF_dump_list("No", "list.txt"), PF_NOELEM);
+  EXPECT_EQ(slurp("list.txt"), "");
+  EXPECT_EQ(TEV8R1_PF_dump_table("No", "table.txt"), PF_NOELEM);
+  EXPECT_EQ(slurp("table.txt"), "");
+  EXPECT_EQ(TEV8R1_PF_print_table("No", "print.txt", 1, 1, names, 0, 1), PF_NOELEM);
+  EXPECT_EQ(slurp("print.txt"), "");
+  EXPECT_STREQ(err_item, "table");
+  EXPECT_STREQ(err_value, "No");
+  const std::string nowhere = "no/such/directory";
+  for (int op = 0; op < 4; ++op) {
+    std::strcpy(err_value, "old");
+    EXPECT_EQ(op == 0   ? TEV8R1_PF_dump_file(nowhere.c_str())
+              : op == 1 ? TEV8R1_PF_dump_list("No", nowhere.c_str())
+              : op == 2 ? TEV8R1_PF_dump_table("No", nowhere.c_str())
+                        : TEV8R1_PF_print_table("No", nowhere.c_str(), 0, 1, names, 0, 1),
+              PF_OPENFAIL);
+    EXPECT_EQ(err_item, nowhere);
+    EXPECT_STREQ(err_value, "");
+  }
+  ASSERT_EQ(TEV8R1_PF_close(0), PF_NORMAL);
+  std::strcpy(err_item, "left");
+  EXPECT_EQ(TEV8R1_PF_dump_file("none.txt"), PF_NOFILE);
+  EXPECT_STREQ(err_item, "left");
+  EXPECT_FALSE(std::filesystem::exists("none.txt"));
+  EXPECT_EQ(TEV8R1_PF_dump_list("No", "list.txt"), PF_NOFILE);
+}
+
+TEST_F(Dump, ATableOfMixedColumnsInStorageOrder) {
+  fill_mixed_table();
+  ASSERT_EQ(TEV8R1_PF_define_table_search("Mixed", "id"), PF_NORMAL);
+  EXPECT_EQ(dump_table(), golden("table"));
+  EXPECT_EQ(table_->dsp_wid, 52);
+  std::FILE* stream = std::fopen("own.txt", "w");
+  std::fputs("mine\n", stream);
+  EXPECT_EQ(TEV8R1_table_dump(table_, stream), PF_NORMAL);
+  std::fclose(stream);
+  EXPECT_EQ(slurp("own.txt"), "mine\n" + golden("table"));
+}
+
+// A column defined after the formats were made has none: a dump makes all of them, and the width.
+TEST_F(Dump, AColumnAddedBetweenDumpsIsFormatted) {
+  table("T", "");
+  number_column("a", PF_TYPE_INT, 5, 9, 1);
+  row({3.0});
+  EXPECT_EQ(data_of(dump_table()), ".  a\n.-----\n\n     3\n");
+  text_column("name", 2);
+  EXPECT_EQ(data_of(dump_table()), ".  a    name\n.-----------\n\n     3  \\0  \n");
+}
+
+TEST_F(Dump, DebugOutputShowsInnerFields) {
+  setenv("TEV8R1_debug", "", 1);
+  EXPECT_EQ(TEV8R1_PF_init(), PF_INITDONE);
+  list("Tiny", "three");
+  number("c", "", PF_TYPE_INT, 9, 1, 5, "text");
+  number("a", "", PF_TYPE_INT, 9, 1, 2);
+  text("b", "v", "d");
+  table("Pair", "two");
+  number_column("a", PF_TYPE_DOUBLE, 5, 9, 1, kNone, nullptr, 2);
+  number_column("b", PF_TYPE_INT, 5, 9, 1, kIndexed, "key");
+  row({2.0, 9.0});
+  row({3.0, 4.0});
+  row({4.0, 5.0});
+
+  TEVPF_LIST* tiny = nullptr;
+  ASSERT_EQ(TEV8R1_get_list_ptr("Tiny", &tiny), PF_NORMAL);
+  ASSERT_EQ(TEV8R1_PF_dump_list("Tiny", "out.txt"), PF_NORMAL);
+  const auto with_address = [](const char* name, const void* address) {
+    std::string text = golden(name);
+    const std::string mark = "ADDRESS";
+    text.replace(text.find(mark), mark.size(),
+                 std::to_string(reinterpret_cast<std::uintptr_t>(address)));
+    return text;
+  };
+  EXPECT_EQ(slurp("out.txt"), with_address("debug_list", tiny->index_ptr));
+  EXPECT_EQ(dump_table(), with_address("debug_table", table_->col_array[1].idx_ptr));
+  ASSERT_EQ(TEV8R1_PF_define_table_search("Pair", "b"), PF_NORMAL);
+  EXPECT_NE(dump_table().find("\ncur_col = b\n\n\n."), std::string::npos);
+}
+
+// An operation of its own: any columns of a table, in a buffer that is exactly large enough.
+TEST_F(Dump, HeadingsAndRowsOfSomeColumns) {
+  fill_mixed_table();
+  dump_table();
+  char heading[60];
+  std::memset(heading, '#', sizeof heading);
+  std::int32_t lead = -1;
+  ASSERT_EQ(TEV8R1_create_table_header("Mixed", 2, 5, 1, 25, &lead, heading), PF_NORMAL);
+  EXPECT_EQ(lead, 3);
+  EXPECT_STREQ(heading, "   x     y  s    t");
+  EXPECT_EQ(std::string(heading + 19, 7), "      #");
+  ASSERT_EQ(TEV8R1_create_table_header("Mixed", 1, 2, 3, 0, &lead, heading), PF_NORMAL);
+  EXPECT_EQ(lead, 0);
+  EXPECT_STREQ(heading, "a_rather_long_name      x");
+  EXPECT_EQ(TEV8R1_create_table_header("No", 0, 1, 3, 0, &lead, heading), PF_NOELEM);
+
+  std::string line(40, '#');
+  std::int32_t length = -1;
+  TEVPF_COLUMN* const columns = table_->col_array;
+  EXPECT_EQ(TEV8R1_review_row(columns + 1, columns + 2, table_->row_data, line.data(), &length),
+            PF_NORMAL);
+  EXPECT_EQ(length, 28);
+  EXPECT_STREQ(line.c_str(), "ab\\n                     1.5");
+  TEVPF_COLUMN odd[2] = {columns[4], columns[4]};
+  odd[1].def.type = 16;
+  EXPECT_EQ(TEV8R1_review_row(odd, odd + 1, table_->row_data, line.data(), &length), PF_BADTYPE);
+  EXPECT_STREQ(line.c_str(), "  7  ");
+  EXPECT_STREQ(err_item, "value");
+  EXPECT_STREQ(err_value, "16");
+}
+
+}  // namespace
+}  // namespace tevpf
