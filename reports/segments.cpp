@@ -35,7 +35,7 @@ char character_at(std::string_view line, std::int64_t place) noexcept {
 }
 
 std::string_view take_front(std::string_view& line, std::int64_t length) noexcept {
-  const auto taken = static_cast<std::size_t>(std::min(length, std::ssize(line)));
+  const auto taken = static_cast<std::size_t>(std::min<std::int64_t>(length, std::ssize(line)));
   const std::string_view front(line.data(), taken);
   line.remove_prefix(taken);
   return front;
