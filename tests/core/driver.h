@@ -19,6 +19,7 @@
 
 inline std::string saved_bytes(const TempDir& dir) {
   const std::string path = dir / "saved";
+  std::filesystem::remove(path);  // some file systems flush a file that is emptied and filled again
   EXPECT_EQ(TEV8R1_PF_save(path.c_str()), PF_NORMAL);
   return read_file(path);
 }
@@ -37,13 +38,20 @@ inline void expect_reopens_alike(const TempDir& dir) {
 inline void drive_list(const char* name) {
   TEVPF_LIST* list = nullptr;
   ASSERT_EQ(TEV8R1_get_list_ptr(name, &list), PF_NORMAL);
-  TEVPF_PARAM_DEF def;
+  TEV8R1_PF_reset_param(name);
   int walked = 0;
-  while (TEV8R1_PF_get_next_param_def(name, &def) == PF_NORMAL) {
+  std::int32_t type = 0, value_size = 0, desc_size = 0;
+  while (TEV8R1_PF_inq_next_param_size(name, &type, &value_size, &desc_size) == PF_NORMAL) {
+    std::vector<char> value(static_cast<std::size_t>(value_size) + 1);
+    std::vector<char> desc(static_cast<std::size_t>(desc_size) + 1);
+    TEVPF_PARAM_DEF def{};
+    def.description = desc.data();
+    if (type == PF_TYPE_STRING) def.part.str.value = value.data();
+    ASSERT_EQ(TEV8R1_PF_get_next_param_def(name, &def), PF_NORMAL);
+    EXPECT_EQ(def.type, type);
+    const char number[sizeof(double)] = {};
+    TEV8R1_PF_modify_param(name, def.name, number);
     ++walked;
-    TEV8R1_PF_modify_param(name, def.name, "1");
-    std::free(def.description);
-    if (def.type == PF_TYPE_STRING) std::free(def.part.str.value);
   }
   EXPECT_EQ(walked, list->num_params);
   TEVPF_PARAM_DEF added{};
@@ -60,6 +68,7 @@ inline void drive_table(const char* name) {
   TEVPF_TABLE* table = nullptr;
   ASSERT_EQ(TEV8R1_get_table_ptr(name, &table), PF_NORMAL);
   std::vector<unsigned char> row(static_cast<std::size_t>(table->row_wid) + 64);
+  TEV8R1_PF_reset_table(name);
   int walked = 0;
   while (TEV8R1_PF_get_next_row(name, row.data()) == PF_NORMAL) ++walked;
   EXPECT_EQ(walked, table->num_rows);
@@ -70,7 +79,8 @@ inline void drive_table(const char* name) {
     while (TEV8R1_PF_get_next_row(name, row.data()) == PF_NORMAL) {
     }
   }
-  TEV8R1_PF_add_row_with_dft(name);
+  const std::vector<std::int32_t> no_fields(static_cast<std::size_t>(table->num_cols) + 1);
+  TEV8R1_PF_add_row_with_dft(name, row.data(), no_fields.data());
   TEVPF_COL_DEF added{};
   added.type = PF_TYPE_SHORT;
   added.width = 4;

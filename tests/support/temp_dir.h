@@ -43,6 +43,7 @@ inline std::string read_file(const std::string& path) {
 }
 
 inline void write_file(const std::string& path, const std::string& bytes) {
+  if (std::filesystem::is_regular_file(path)) std::filesystem::remove(path);
   std::ofstream(path, std::ios::binary) << bytes;
 }
 
