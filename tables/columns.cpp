@@ -122,7 +122,6 @@ void append_column(TEVPF_TABLE& table, NewColumn column) noexcept {
   unsigned char value[8];
   widen_rows(table, column.layout.row_wid, record.offset, initial_value(record.def, value),
              column_size(record));
-  give_up_spare_rows(table);
 
   // Bytes of the default row between the old row's end and the new value are padding.
   if (record.offset > table.row_wid) {
@@ -133,6 +132,7 @@ void append_column(TEVPF_TABLE& table, NewColumn column) noexcept {
     replace_columns(table, std::move(column.larger), column_position(table, table.cur_col));
     table.free_cols = kColumnIncrement;
   }
+  give_up_spare_rows(table);  // in the array that stays
   record.def.description = column.description.release();
   adopt_index(record, std::move(column.index));
   table.col_array[table.num_cols] = record;
