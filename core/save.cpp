@@ -13,12 +13,18 @@ namespace tevpf {
 
 namespace {
 
-// Empties the file on the disk and writes it again.
+// Takes a stream for writing in place of the one that the file had.
+void adopt_stream(TEVPF_FILE& file, std::FILE* stream) noexcept {
+  if (file.fp != nullptr) std::fclose(file.fp);
+  file.fp = stream;
+}
+
+// Empties the file on the disk and writes it again. Not by freopen, which would leave no stream when it
+// fails.
 TEVPF_STATUS overwrite(TEVPF_FILE& file) noexcept {
-  // A reopen that fails has closed the stream; the next save starts without one.
-  file.fp = file.fp != nullptr ? std::freopen(file.file_name, "wb", file.fp)
-                               : std::fopen(file.file_name, "wb");
-  if (file.fp == nullptr) return fail(PF_OPENFAIL, file.file_name);
+  std::FILE* stream = std::fopen(file.file_name, "wb");
+  if (stream == nullptr) return fail(PF_OPENFAIL, file.file_name);
+  adopt_stream(file, stream);
   return write_elements(file, file.fp, file.file_name);
 }
 
@@ -35,8 +41,7 @@ TEVPF_STATUS rewrite(TEVPF_FILE& file) noexcept {
     case Replacement::Outcome::kDone:
       break;
   }
-  if (file.fp != nullptr) std::fclose(file.fp);
-  file.fp = replacement.release_stream();
+  adopt_stream(file, replacement.release_stream());
   return PF_NORMAL;
 }
 

@@ -1,0 +1,402 @@
+// Open files: which one is current, names, access, and saving when the disk does not play along.
+#include <fcntl.h>
+#include <gtest/gtest.h>
+#include <signal.h>
+#include <sys/resource.h>
+#include <sys/stat.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include <cstdlib>
+#include <filesystem>
+#include <functional>
+
+#include "core/file.h"
+#include "core/library.h"
+#include "include/tevpf.h"
+#include "support/error_texts.h"
+#include "support/temp_dir.h"
+
+namespace {
+
+namespace fs = std::filesystem;
+
+class FilesTest : public testing::Test {
+ protected:
+  FilesTest() {
+    TEV8R1_PF_init();
+    set_error_texts();
+  }
+  ~FilesTest() override {
+    while (TEV8R1_PF_close(0) == PF_NORMAL) {
+    }
+  }
+
+  std::string at(const std::string& name) const { return dir_ / name; }
+  static TEVPF_STATUS open(const std::string& name) { return TEV8R1_PF_open(name.c_str()); }
+
+  // The current file's name without its folder; "" when none is current.
+  std::string current() const {
+    char name[TEVPF_FILE_NAME_SIZE] = "";
+    TEV8R1_PF_inq_current_file(name);
+    EXPECT_EQ(error_texts(), kEmpty);
+    return fs::path(name).filename();
+  }
+
+  // A file with one list of that name, saved and closed.
+  void make(const std::string& path, const char* list) const {
+    ASSERT_EQ(open(path), PF_NEWFILE);
+    ASSERT_EQ(TEV8R1_PF_create_elem(list, "", PF_ELEM_LIST), PF_NORMAL);
+    ASSERT_EQ(TEV8R1_PF_close(1), PF_NORMAL);
+  }
+
+  TempDir dir_;
+};
+
+// Calls in a child process, as an ordinary user when the tests run as root.
+int in_child(const std::function<void()>& body, bool as_user) {
+  const pid_t child = fork();
+  if (child == 0) {
+    if (as_user && getuid() == 0 && (setgid(65534) != 0 || setuid(65534) != 0)) _exit(2);
+    body();
+    std::fflush(nullptr);
+    _exit(testing::Test::HasFailure() ? 1 : 0);
+  }
+  int status = -1;
+  waitpid(child, &status, 0);
+  return status;
+}
+
+TEST_F(FilesTest, ClosingMakesTheNeighbourCurrent) {
+  struct Case {
+    const char* opened;
+    char current;
+    const char* then;  // current after each close; "" at the end
+  };
+  for (const Case& c : {Case{"ABC", 'B', "AC"}, Case{"ABC", 'A', "BC"}, Case{"ABC", 'C', "BA"},
+                        Case{"A", 'A', ""}, Case{"AB", 'A', "B"}}) {
+    SCOPED_TRACE(std::string(c.opened) + c.current);
+    for (const char* name = c.opened; *name != 0; ++name) {
+      EXPECT_EQ(open(at({*name})), PF_NEWFILE);
+      EXPECT_EQ(current(), std::string{*name});
+    }
+    set_error_texts();
+    EXPECT_EQ(TEV8R1_PF_change_file(at({c.current}).c_str()), PF_NORMAL);
+    EXPECT_EQ(error_texts(), kEmpty);
+    for (const char* then = c.then; *then != 0; ++then) {
+      EXPECT_EQ(TEV8R1_PF_close(0), PF_NORMAL);
+      EXPECT_EQ(current(), std::string{*then});
+    }
+    EXPECT_EQ(TEV8R1_PF_close(0), PF_NORMAL);
+    EXPECT_EQ(tevpf::library.num_files, 0);
+    EXPECT_EQ(tevpf::library.last_file, nullptr);
+    EXPECT_TRUE(dir_.entries().empty());  // new files that were never saved are gone
+  }
+}
+
+TEST_F(FilesTest, WithoutAFileEveryOperationSaysSo) {
+  char name[TEVPF_FILE_NAME_SIZE];
+  std::int32_t n = 7;
+  char(*names)[TEVPF_NAME_SIZE];
+  char(*descs)[TEVPF_DESC_SIZE];
+  const std::function<TEVPF_STATUS()> calls[] = {
+      [&] { return TEV8R1_PF_change_file("x"); },
+      [&] { return TEV8R1_PF_inq_current_file(name); },
+      [&] { return TEV8R1_PF_inq_file_access(&n); },
+      [&] { return TEV8R1_PF_inq_file_elements(name, &n, &names, &descs, &n, &names, &descs); },
+      [] { return TEV8R1_PF_save(nullptr); },
+      [] { return TEV8R1_PF_save("/nowhere/x"); },
+      [] { return TEV8R1_PF_close(1); },
+      [] { return TEV8R1_PF_create_elem(" ", "", 3); },
+      [] { return TEV8R1_modify_elem_name(3, "a", "b"); },
+      [] { return TEV8R1_modify_elem_desc(PF_ELEM_LIST, "a", "b"); },
+      [] { return TEV8R1_PF_delete_table("a"); },
+      [] { return TEV8R1_PF_copy_list("a", " "); },
+  };
+  for (const auto& call : calls) {
+    set_error_texts();
+    EXPECT_EQ(call(), PF_NOFILE);
+    EXPECT_EQ(error_texts(), kEmpty);
+  }
+  EXPECT_EQ(n, 7);
+}
+
+TEST_F(FilesTest, AnOpenFileIsNotOpenedAgain) {
+  make(at("a"), "L");
+  EXPECT_EQ(open(at("a")), PF_NORMAL);
+  EXPECT_EQ(error_texts(), kUntouched);
+  EXPECT_EQ(open(at("b")), PF_NEWFILE);
+  set_error_texts();
+  EXPECT_EQ(open(at("a")), PF_FILEOPEN);
+  EXPECT_EQ(error_texts(), kEmpty);
+  EXPECT_EQ(current(), "b");
+  EXPECT_EQ(TEV8R1_PF_change_file("a"), PF_NOFILE);  // not by another name
+  write_file(at("empty"), "");
+  EXPECT_EQ(open(at("empty")), PF_NORMAL);
+  EXPECT_EQ(TEV8R1_PF_close(0), PF_NORMAL);
+  EXPECT_EQ(read_file(at("empty")), "");
+  // A file that is none: closed again, not deleted, and its neighbour is current.
+  write_file(at("text"), "Dear reader");
+  EXPECT_EQ(open(at("text")), PF_BADFILE);
+  EXPECT_EQ(error_texts(), (ErrorTexts{at("text"), ""}));
+  EXPECT_EQ(current(), "b");
+  EXPECT_EQ(read_file(at("text")), "Dear reader");
+  EXPECT_EQ(open(dir_.path()), PF_OPENFAIL);
+  EXPECT_EQ(error_texts(), (ErrorTexts{dir_.path(), ""}));
+}
+
+TEST_F(FilesTest, VariablesStandForFolders) {
+  EXPECT_EQ(open("$PFDIR/a"), PF_OPENFAIL);
+  EXPECT_EQ(error_texts(), (ErrorTexts{"$PFDIR/a", kUntouched.value}));
+  setenv("PFDIR", "/nowhere", 1);  // the "$" is part of the name
+  EXPECT_EQ(open("$PFDIR/a"), PF_OPENFAIL);
+  setenv("$PFDIR", dir_.path().c_str(), 1);
+  EXPECT_EQ(open("$PFDIR/a"), PF_NEWFILE);
+  EXPECT_EQ(TEV8R1_PF_change_file(at("a").c_str()), PF_NORMAL);
+  EXPECT_EQ(TEV8R1_PF_change_file("$PFDIR/a"), PF_NOFILE);
+  EXPECT_EQ(open("$PFDIR/a"), PF_FILEOPEN);
+  setenv("$PFDIR", at("whole").c_str(), 1);
+  EXPECT_EQ(open("$PFDIR"), PF_NEWFILE);
+  EXPECT_EQ(current(), "whole");
+  setenv("$PFDIR", std::string(300, 'v').c_str(), 1);
+  EXPECT_EQ(open("$PFDIR/a"), PF_OPENFAIL);
+  EXPECT_EQ(error_texts(), (ErrorTexts{std::string(256, 'v'), ""}));
+  unsetenv("$PFDIR");
+  unsetenv("PFDIR");
+}
+
+TEST_F(FilesTest, NamesHaveUpTo257Characters) {
+  const std::string folder = at(std::string(100, 'd'));
+  fs::create_directory(folder);
+  const std::string longest = folder + "/" + std::string(256 - folder.size(), 'f');
+  EXPECT_EQ(open(longest), PF_NEWFILE);
+  char name[TEVPF_FILE_NAME_SIZE];
+  EXPECT_EQ(TEV8R1_PF_inq_current_file(name), PF_NORMAL);
+  EXPECT_EQ(name, longest);
+  EXPECT_EQ(open(longest + "f"), PF_OPENFAIL);
+  EXPECT_EQ(error_texts(), (ErrorTexts{longest.substr(0, 256), ""}));
+  EXPECT_EQ(TEV8R1_PF_save(nullptr), PF_NORMAL);
+}
+
+TEST_F(FilesTest, InitialisingTwiceKeepsTheFiles) {
+  EXPECT_EQ(open(at("a")), PF_NEWFILE);
+  setenv("TEV8R1_debug", "", 1);
+  set_error_texts();
+  EXPECT_EQ(TEV8R1_PF_init(), PF_INITDONE);
+  EXPECT_EQ(error_texts(), kUntouched);
+  EXPECT_NE(tevpf::library.debug_value, nullptr);
+  unsetenv("TEV8R1_debug");
+  EXPECT_EQ(TEV8R1_PF_init(), PF_INITDONE);
+  EXPECT_EQ(tevpf::library.debug_value, nullptr);
+  EXPECT_EQ(current(), "a");
+  const auto first_init_drops_files = [] {
+    tevpf::library.init_done = 0;
+    EXPECT_EQ(TEV8R1_PF_init(), PF_NORMAL);
+    EXPECT_EQ(TEV8R1_PF_close(0), PF_NOFILE);
+  };
+  EXPECT_EQ(in_child(first_init_drops_files, false), 0);
+}
+
+TEST_F(FilesTest, AllocationSettings) {
+  const auto settings = [] {
+    return std::pair(tevpf::library.alloc_initial, tevpf::library.alloc_increment);
+  };
+  EXPECT_EQ(TEV8R1_PF_set_memory_allocation(-1, 5), PF_BADARG);
+  EXPECT_EQ(settings(), std::pair(25, 5));
+  EXPECT_EQ(TEV8R1_PF_set_memory_allocation(3, INT32_MIN), PF_BADARG);
+  EXPECT_EQ(settings(), std::pair(3, 5));
+  EXPECT_EQ(error_texts(), kUntouched);
+  EXPECT_EQ(TEV8R1_PF_set_memory_allocation(0, 0), PF_NORMAL);
+  EXPECT_EQ(settings(), std::pair(25, 10));
+}
+
+TEST_F(FilesTest, ACopyLeavesTheFileAsItIs) {
+  EXPECT_EQ(open(at("a")), PF_NEWFILE);
+  ASSERT_EQ(TEV8R1_PF_create_elem("L", "", PF_ELEM_LIST), PF_NORMAL);
+  EXPECT_EQ(TEV8R1_PF_save(at("copy").c_str()), PF_NORMAL);
+  EXPECT_EQ(read_file(at("copy")).size(), 120u);
+  EXPECT_EQ(read_file(at("a")), "");
+  for (const std::string& path : {at("no/folder"), dir_.path()}) {
+    EXPECT_EQ(TEV8R1_PF_save(path.c_str()), PF_OPENFAIL);
+    EXPECT_EQ(error_texts(), (ErrorTexts{path, ""}));
+  }
+  EXPECT_EQ(TEV8R1_PF_close(0), PF_NORMAL);
+  EXPECT_EQ(dir_.entries(), std::set<std::string>{"copy"});
+  EXPECT_EQ(open(at("copy")), PF_NORMAL);
+}
+
+TEST_F(FilesTest, AReadOnlyFileStaysOpenRatherThanBeSaved) {
+  make(at("a"), "L");
+  chmod(dir_.path().c_str(), 0777);
+  chmod(at("a").c_str(), 0444);
+  const auto body = [&] {
+    std::int32_t access = 7;
+    ASSERT_EQ(open(at("a")), PF_NORMAL);
+    EXPECT_EQ(TEV8R1_PF_inq_file_access(&access), PF_NORMAL);
+    EXPECT_EQ(access, 0);
+    const std::function<TEVPF_STATUS()> saves[] = {
+        [] { return TEV8R1_PF_save(nullptr); },
+        [&] { return TEV8R1_PF_save(at("a").c_str()); },
+        [] { return TEV8R1_PF_close(1); },
+    };
+    for (const auto& save : saves) {
+      set_error_texts();
+      EXPECT_EQ(save(), PF_NOPRIV);
+      EXPECT_EQ(error_texts(), (ErrorTexts{at("a"), ""}));
+      EXPECT_EQ(current(), "a");
+    }
+    EXPECT_EQ(TEV8R1_PF_save(at("copy").c_str()), PF_NORMAL);
+    chmod(at("copy").c_str(), 0444);
+    EXPECT_EQ(TEV8R1_PF_save(at("copy").c_str()), PF_NOPRIV);
+    EXPECT_EQ(error_texts(), (ErrorTexts{at("copy"), ""}));
+    EXPECT_EQ(TEV8R1_PF_close(0), PF_NORMAL);
+  };
+  EXPECT_EQ(in_child(body, true), 0);
+  EXPECT_EQ(read_file(at("copy")), read_file(at("a")));
+}
+
+TEST_F(FilesTest, ReplacingKeepsModeOwnerAndLinks) {
+  make(at("a"), "L");
+  chmod(at("a").c_str(), 04640);
+  const bool given_away = chown(at("a").c_str(), 12, 34) == 0;
+  EXPECT_EQ(given_away, getuid() == 0);
+  chmod(at("a").c_str(), 04640);
+  fs::create_symlink("a", at("link"));
+  struct stat before, after;
+  stat(at("a").c_str(), &before);
+  ASSERT_EQ(open(at("link")), PF_NORMAL);
+  ASSERT_EQ(TEV8R1_PF_create_elem("L2", "", PF_ELEM_LIST), PF_NORMAL);
+  EXPECT_EQ(TEV8R1_PF_save(nullptr), PF_NORMAL);
+  stat(at("a").c_str(), &after);
+  EXPECT_NE(after.st_ino, before.st_ino);
+  EXPECT_EQ(after.st_mode, before.st_mode);
+  EXPECT_EQ(after.st_uid, before.st_uid);
+  EXPECT_EQ(after.st_gid, before.st_gid);
+  EXPECT_TRUE(fs::is_symlink(at("link")));
+  EXPECT_EQ(after.st_size, 240);
+  // A file of two names is written where it stands.
+  fs::create_hard_link(at("a"), at("second"));
+  ASSERT_EQ(TEV8R1_PF_create_elem("L3", "", PF_ELEM_LIST), PF_NORMAL);
+  EXPECT_EQ(TEV8R1_PF_save(nullptr), PF_NORMAL);
+  EXPECT_EQ(read_file(at("second")).size(), 360u);
+  EXPECT_EQ(dir_.entries(), (std::set<std::string>{"a", "link", "second"}));
+}
+
+TEST_F(FilesTest, AFileThatMayNotBeWrittenIsNotReplaced) {
+  make(at("a"), "L");
+  chmod(dir_.path().c_str(), 0777);
+  chmod(at("a").c_str(), 0666);
+  const auto body = [&] {
+    ASSERT_EQ(open(at("a")), PF_NORMAL);
+    ASSERT_EQ(TEV8R1_PF_create_elem("L2", "", PF_ELEM_LIST), PF_NORMAL);
+    EXPECT_EQ(TEV8R1_PF_save(nullptr), PF_NORMAL);  // another's file, in a folder for all
+    EXPECT_EQ(read_file(at("a")).size(), 240u);
+  };
+  EXPECT_EQ(in_child(body, true), 0);
+
+  const auto locked = [&] {
+    ASSERT_EQ(open(at("mine")), PF_NEWFILE);
+    ASSERT_EQ(TEV8R1_PF_create_elem("L", "", PF_ELEM_LIST), PF_NORMAL);
+    chmod(at("mine").c_str(), 0444);
+    for (int i = 0; i < 2; ++i) {
+      EXPECT_EQ(TEV8R1_PF_save(nullptr), PF_OPENFAIL);
+      EXPECT_EQ(error_texts(), (ErrorTexts{at("mine"), ""}));
+      EXPECT_EQ(read_file(at("mine")), "");
+    }
+    chmod(at("mine").c_str(), 0644);
+    EXPECT_EQ(TEV8R1_PF_save(nullptr), PF_NORMAL);
+    EXPECT_EQ(read_file(at("mine")).size(), 120u);
+    chmod(at("mine").c_str(), 0444);
+    ASSERT_EQ(TEV8R1_PF_create_elem("L2", "", PF_ELEM_LIST), PF_NORMAL);
+    EXPECT_EQ(TEV8R1_PF_close(1), PF_OPENFAIL);
+    EXPECT_EQ(current(), "");
+    EXPECT_EQ(read_file(at("mine")).size(), 120u);
+  };
+  EXPECT_EQ(in_child(locked, true), 0);
+  EXPECT_EQ(dir_.entries(), (std::set<std::string>{"a", "mine"}));
+}
+
+TEST_F(FilesTest, AFolderThatMayNotBeWrittenIsNoObstacle) {
+  make(at("a"), "L");
+  chmod(at("a").c_str(), 0666);
+  chmod(dir_.path().c_str(), 0555);
+  const auto body = [&] {
+    ASSERT_EQ(open(at("a")), PF_NORMAL);
+    ASSERT_EQ(TEV8R1_PF_create_elem("L2", "", PF_ELEM_LIST), PF_NORMAL);
+    EXPECT_EQ(TEV8R1_PF_close(1), PF_NORMAL);
+    EXPECT_EQ(read_file(at("a")).size(), 240u);
+  };
+  EXPECT_EQ(in_child(body, true), 0);
+  chmod(dir_.path().c_str(), 0755);
+}
+
+TEST_F(FilesTest, AFailedWriteIsReportedAndDestroysNothing) {
+  make(at("a"), "L");
+  const std::string old = read_file(at("a"));
+  const auto body = [&] {
+    ASSERT_EQ(open(at("a")), PF_NORMAL);
+    for (int i = 0; i < 20; ++i) {
+      ASSERT_EQ(TEV8R1_PF_create_elem(("T" + std::to_string(i)).c_str(), "", PF_ELEM_TABLE),
+                PF_NORMAL);
+    }
+    signal(SIGXFSZ, SIG_IGN);
+    const rlimit small{1000, RLIM_INFINITY}, none{RLIM_INFINITY, RLIM_INFINITY};
+    setrlimit(RLIMIT_FSIZE, &small);
+    EXPECT_EQ(TEV8R1_PF_save(nullptr), PF_OPENFAIL);
+    EXPECT_EQ(error_texts(), (ErrorTexts{at("a"), ""}));
+    EXPECT_EQ(read_file(at("a")), old);
+    EXPECT_EQ(TEV8R1_PF_save(at("copy").c_str()), PF_OPENFAIL);
+    EXPECT_EQ(error_texts(), (ErrorTexts{at("copy"), ""}));
+    EXPECT_EQ(TEV8R1_PF_save("/dev/full"), PF_OPENFAIL);
+    EXPECT_EQ(error_texts(), (ErrorTexts{"/dev/full", ""}));
+    setrlimit(RLIMIT_FSIZE, &none);
+    EXPECT_EQ(TEV8R1_PF_save(at("copy").c_str()), PF_NORMAL);
+    EXPECT_EQ(read_file(at("copy")).size(), 120u + 20 * 132);
+    setrlimit(RLIMIT_FSIZE, &small);
+    EXPECT_EQ(TEV8R1_PF_close(1), PF_OPENFAIL);
+    EXPECT_EQ(current(), "");
+  };
+  EXPECT_EQ(in_child(body, false), 0);
+  EXPECT_EQ(read_file(at("a")), old);
+  EXPECT_EQ(dir_.entries(), (std::set<std::string>{"a", "copy"}));
+}
+
+TEST_F(FilesTest, AFileRemovedUnderneathIsWrittenAgain) {
+  make(at("a"), "L");
+  ASSERT_EQ(open(at("a")), PF_NORMAL);
+  fs::remove(at("a"));
+  EXPECT_EQ(TEV8R1_PF_save(nullptr), PF_NORMAL);
+  EXPECT_EQ(read_file(at("a")).size(), 120u);
+  const std::string away = at("folder");
+  fs::create_directory(away);
+  ASSERT_EQ(open(away + "/b"), PF_NEWFILE);
+  fs::remove_all(away);
+  EXPECT_EQ(TEV8R1_PF_save(nullptr), PF_OPENFAIL);
+  EXPECT_EQ(tevpf::library.current_file->new_file, 0);
+  EXPECT_EQ(TEV8R1_PF_close(0), PF_NORMAL);
+}
+
+TEST_F(FilesTest, ElementsAreHandedOutInOrder) {
+  char file[TEVPF_FILE_NAME_SIZE];
+  std::int32_t lists = 7, tables = 7;
+  char(*names)[TEVPF_NAME_SIZE] = nullptr;
+  char(*descs)[TEVPF_DESC_SIZE] = nullptr;
+  char(*no_names)[TEVPF_NAME_SIZE] = nullptr;
+  char(*no_descs)[TEVPF_DESC_SIZE] = nullptr;
+  ASSERT_EQ(open(at("a")), PF_NEWFILE);
+  ASSERT_EQ(TEV8R1_PF_create_elem("B", "second letter", PF_ELEM_TABLE), PF_NORMAL);
+  ASSERT_EQ(TEV8R1_PF_create_elem("A", "", PF_ELEM_TABLE), PF_NORMAL);
+  ASSERT_EQ(
+      TEV8R1_PF_inq_file_elements(file, &lists, &no_names, &no_descs, &tables, &names, &descs),
+      PF_NORMAL);
+  EXPECT_EQ(file, at("a"));
+  EXPECT_EQ(std::pair(lists, tables), std::pair(0, 2));
+  EXPECT_EQ(no_names, nullptr);
+  EXPECT_STREQ(names[0], "B");
+  EXPECT_STREQ(descs[0], "second letter");
+  EXPECT_STREQ(names[1], "A");
+  std::free(names);
+  std::free(descs);
+}
+
+}  // namespace
