@@ -11,7 +11,7 @@
 #include <optional>
 #include <random>
 #include <set>
-#include <variant>
+#include <utility>
 
 #include "core/directory.h"
 #include "core/error_context.h"
@@ -21,111 +21,61 @@ namespace {
 
 using tevpf_test::broken_rule;
 
-// In the order of the type codes, so that the index of the alternative tells the type.
-using Value = std::variant<std::int32_t, float, std::string, double, std::int16_t>;
+// Every number of the five types is a double; the column tells which of the two counts.
+struct Value {
+  double number = 0;
+  std::string text;
+  bool operator==(const Value&) const = default;
+};
 using Row = std::vector<Value>;
+
+bool is_real(int type) { return type == PF_TYPE_REAL || type == PF_TYPE_DOUBLE; }
 
 struct Column {
   TEVPF_COL_DEF def{};  // its description is desc
   std::optional<std::string> desc;
-  double tolerance = 0;
+  double max = 0, min = 0, tolerance = 0;
+  int precision = 1;
   std::vector<int> index;
+
+  bool is_text() const { return def.type == PF_TYPE_STRING; }
+  bool is_unique() const { return def.idx_flag && def.unq_flag; }
 };
+
+// A number as the type has it.
+double rounded(int type, double x) { return type == PF_TYPE_REAL ? double{float(x)} : x; }
+
+void set_limits(Column& c, double max, double min, int precision) {
+  c.max = c.is_text() ? 0 : rounded(c.def.type, max);
+  c.min = c.is_text() ? 0 : rounded(c.def.type, min);
+  c.precision = is_real(c.def.type) ? precision : 1;
+  c.tolerance = is_real(c.def.type) ? std::pow(10.0, -(precision + 1)) : 0;
+  auto& l = c.def.limits;
+  std::memset(&l, 0, sizeof l);
+  if (c.def.type == PF_TYPE_INT) l.i32 = {int(max), int(min)};
+  if (c.def.type == PF_TYPE_SHORT) l.i16 = {std::int16_t(max), std::int16_t(min)};
+  if (c.def.type == PF_TYPE_REAL) l.f32 = {float(max), float(min), precision};
+  if (c.def.type == PF_TYPE_DOUBLE) l.f64 = {max, min, precision};
+}
 
 struct Result {
   TEVPF_STATUS status = PF_NORMAL;
   std::string item = "was", value = "here";  // what the context holds before each step
+  bool failed() const { return status != PF_NORMAL; }
 };
 
 Result empty_texts(TEVPF_STATUS status) { return {status, "", ""}; }
 
-std::string text_of(const Value& value) {
+std::string text_of(const Column& c, const Value& v) {
   char buffer[64];
-  if (const auto* text = std::get_if<std::string>(&value)) return *text;
-  std::visit(
-      [&](const auto& v) {
-        using T = std::decay_t<decltype(v)>;
-        if constexpr (std::is_floating_point_v<T>) {
-          std::snprintf(buffer, sizeof buffer, "%g", static_cast<double>(v));
-        } else if constexpr (std::is_integral_v<T>) {
-          std::snprintf(buffer, sizeof buffer, "%d", v);
-        }
-      },
-      value);
+  if (c.is_text()) return v.text;
+  std::snprintf(buffer, sizeof buffer, is_real(c.def.type) ? "%g" : "%.0f", v.number);
   return buffer;
 }
 
-double number(const Value& value) {
-  return std::visit(
-      [](const auto& v) -> double {
-        if constexpr (std::is_arithmetic_v<std::decay_t<decltype(v)>>) return v;
-        return 0;
-      },
-      value);
-}
-
-Value make_value(int type, double x) {
-  switch (type) {
-    case PF_TYPE_INT:
-      return static_cast<std::int32_t>(x);
-    case PF_TYPE_REAL:
-      return static_cast<float>(x);
-    case PF_TYPE_DOUBLE:
-      return x;
-    case PF_TYPE_SHORT:
-      return static_cast<std::int16_t>(x);
-    default:
-      return std::string();
-  }
-}
-
-bool is_real(int type) { return type == PF_TYPE_REAL || type == PF_TYPE_DOUBLE; }
-
-struct Limits {
-  double max = 0, min = 0;
-  int precision = 1;
-};
-
-Limits limits(const TEVPF_COL_DEF& def) {
-  switch (def.type) {
-    case PF_TYPE_INT:
-      return {double(def.limits.i32.max), double(def.limits.i32.min)};
-    case PF_TYPE_SHORT:
-      return {double(def.limits.i16.max), double(def.limits.i16.min)};
-    case PF_TYPE_REAL:
-      return {def.limits.f32.max, def.limits.f32.min, def.limits.f32.precision};
-    case PF_TYPE_DOUBLE:
-      return {def.limits.f64.max, def.limits.f64.min, def.limits.f64.precision};
-    default:
-      return {};
-  }
-}
-
-void set_limits(TEVPF_COL_DEF& def, const Limits& l) {
-  std::memset(&def.limits, 0, sizeof def.limits);
-  switch (def.type) {
-    case PF_TYPE_INT:
-      def.limits.i32 = {int(l.max), int(l.min)};
-      break;
-    case PF_TYPE_SHORT:
-      def.limits.i16 = {static_cast<std::int16_t>(l.max), static_cast<std::int16_t>(l.min)};
-      break;
-    case PF_TYPE_REAL:
-      def.limits.f32 = {float(l.max), float(l.min), l.precision};
-      break;
-    case PF_TYPE_DOUBLE:
-      def.limits.f64 = {l.max, l.min, l.precision};
-      break;
-    default:
-      break;
-  }
-}
-
-Value least(const TEVPF_COL_DEF& def) { return make_value(def.type, limits(def).min); }
-
-int compare_values(const Value& a, const Value& b, double tolerance) {
-  if (const auto* text = std::get_if<std::string>(&a)) {
-    std::string left = *text, right = std::get<std::string>(b);
+int compare_values(const Column& c, const Value& a, const Value& b, double tolerance) {
+  if (c.is_text()) {
+    std::string left = a.text, right = b.text;
     const auto star = right.find('*');
     if (star != std::string::npos && star + 1 == right.size()) {
       right.resize(star);
@@ -134,10 +84,18 @@ int compare_values(const Value& a, const Value& b, double tolerance) {
     const int order = left.compare(right);
     return order < 0 ? -1 : order > 0;
   }
-  const double x = number(a), y = number(b);
-  const double slack = is_real(int(a.index()) + PF_TYPE_INT) ? tolerance : 0;
-  if (x > y) return x - slack > y;
-  return x < y && x + slack < y ? -1 : 0;
+  if (a.number > b.number) return a.number - tolerance > b.number;
+  return a.number < b.number && a.number + tolerance < b.number ? -1 : 0;
+}
+int compare_values(const Column& c, const Value& a, const Value& b) {
+  return compare_values(c, a, b, c.tolerance);
+}
+
+Value least(const Column& c) { return {c.is_text() ? 0 : c.min, ""}; }
+
+bool in_range(const Column& c, const Value& v, double tolerance) {
+  return c.is_text() || (compare_values(c, v, {c.max, ""}, tolerance) <= 0 &&
+                         compare_values(c, v, {c.min, ""}, tolerance) >= 0);
 }
 
 // ---- The model -----------------------------------------------------------------------------------
@@ -164,7 +122,7 @@ struct Model {
   // The documented probes.
   bool find(int column, const std::vector<int>& index, int first, const Value& key, int& pos) {
     const auto order = [&](int p) {
-      return compare_values(at(index[size_t(p)], column), key, col(column).tolerance);
+      return compare_values(col(column), at(index[size_t(p)], column), key);
     };
     int low = first, high = int(index.size()) - 1;
     while (low <= high) {
@@ -185,23 +143,18 @@ struct Model {
     std::vector<int> index;
     for (int i = 0; i < count(); ++i) index.push_back(i);
     std::stable_sort(index.begin(), index.end(), [&](int a, int b) {
-      return compare_values(at(a, column), at(b, column), 0) < 0;
+      return compare_values(col(column), at(a, column), at(b, column), 0) < 0;
     });
     return index;
   }
 
   Result check_value(int column, const Value& value, int* holder = nullptr) {
     const Column& c = col(column);
-    const Limits l = limits(c.def);
-    if (c.def.type != PF_TYPE_STRING &&
-        (compare_values(value, make_value(c.def.type, l.max), c.tolerance) > 0 ||
-         compare_values(value, make_value(c.def.type, l.min), c.tolerance) < 0)) {
-      return {PF_RANGE, text_of(value), ""};
-    }
+    if (!in_range(c, value, c.tolerance)) return {PF_RANGE, text_of(c, value), ""};
     int pos = 0;
-    if (!c.def.idx_flag || !c.def.unq_flag || !find(column, c.index, 0, value, pos)) return {};
+    if (!c.is_unique() || !find(column, c.index, 0, value, pos)) return {};
     if (holder != nullptr) *holder = c.index[size_t(pos)];
-    return {PF_DUPLICATE, "value " + text_of(value), std::string("column ") + c.def.name};
+    return {PF_DUPLICATE, "value " + text_of(c, value), std::string("column ") + c.def.name};
   }
 
   // owner: a row that may hold the values already; -2: any row may.
@@ -210,7 +163,7 @@ struct Model {
       int holder = -1;
       const Result r = check_value(int(i), row[i], &holder);
       if (r.status == PF_DUPLICATE && (owner == -2 || holder == owner)) continue;
-      if (r.status != PF_NORMAL) return r;
+      if (r.failed()) return r;
     }
     return {};
   }
@@ -227,7 +180,7 @@ struct Model {
   Result add(const Row& row, int place) {
     if (free_rows == 0) free_rows = rows.empty() ? kInitial : kIncrement;
     if (!interactive) {
-      if (const Result r = check_row(row, -1); r.status != PF_NORMAL) return r;
+      if (const Result r = check_row(row, -1); r.failed()) return r;
     }
     place = std::clamp(place, 0, count());
     for (Column& c : columns) {
@@ -251,10 +204,10 @@ struct Model {
   Result replace(const Row& row) {
     if (cur < 0) return empty_texts(PF_NOCURROW);
     const int n = row_at(cur);
-    if (const Result r = check_row(row, n); r.status != PF_NORMAL) return r;
+    if (const Result r = check_row(row, n); r.failed()) return r;
     for (int c = 0; c < int(columns.size()); ++c) {
       if (!col(c).def.idx_flag) continue;
-      if (compare_values(at(n, c), row[size_t(c)], col(c).tolerance) == 0) continue;
+      if (compare_values(col(c), at(n, c), row[size_t(c)]) == 0) continue;
       std::erase(col(c).index, n);
       int pos = 0;
       find(c, col(c).index, 0, row[size_t(c)], pos);
@@ -273,7 +226,7 @@ struct Model {
     const Row row = rows[size_t(from)];
     erase(from);
     const Result r = add(row, to);
-    if (r.status != PF_NORMAL) *this = before;
+    if (r.failed()) *this = before;
     return r;
   }
 
@@ -288,7 +241,7 @@ struct Model {
   }
 
   Result by_value(int mode, int column, const Value& key) {
-    const Result missing = {PF_NOTFOUND, text_of(key), ""};
+    const Result missing = {PF_NOTFOUND, text_of(col(column), key), ""};
     if (rows.empty()) return empty_texts(PF_NOTFOUND);
     if (column == search) {
       int pos = 0;
@@ -297,17 +250,16 @@ struct Model {
       return at_position(pos, PF_BADPOS);
     }
     for (int p = next; p < count(); ++p) {
-      if (compare_values(at(row_at(p), column), key, col(column).tolerance) == 0) {
+      if (compare_values(col(column), at(row_at(p), column), key) == 0) {
         return at_position(p, PF_BADPOS);
       }
     }
     return missing;
   }
 
-  static Result check_definition(const TEVPF_COL_DEF& def) {
-    const Limits l = limits(def);
-    if (l.max < l.min) return {PF_BADRANGE, text_of(make_value(def.type, l.min)), ""};
-    if (l.precision < 1) return {PF_BADPREC, std::to_string(l.precision), def.name};
+  static Result check_definition(const Column& c) {
+    if (c.max < c.min) return {PF_BADRANGE, text_of(c, {c.min, ""}), ""};
+    if (c.precision < 1) return {PF_BADPREC, std::to_string(c.precision), c.def.name};
     return {};
   }
 
@@ -319,15 +271,15 @@ struct Model {
 
   Result define(const Column& column) {
     const TEVPF_COL_DEF& def = column.def;
-    if (const Result r = check_name(def.name); r.status != PF_NORMAL) return r;
+    if (const Result r = check_name(def.name); r.failed()) return r;
     if (def.idx_flag && def.unq_flag && !rows.empty()) return empty_texts(PF_BADUNIQUE);
-    if (const Result r = check_definition(def); r.status != PF_NORMAL) return r;
+    if (const Result r = check_definition(column); r.failed()) return r;
     if (def.width < 1) return {PF_BADWIDTH, std::to_string(def.width), def.name};
     columns.push_back(column);
     Column& added = columns.back();
     if (!def.idx_flag) added.def.unq_flag = 0;
-    for (Row& row : rows) row.push_back(least(def));
-    defaults.push_back(least(def));
+    for (Row& row : rows) row.push_back(least(added));
+    defaults.push_back(least(added));
     if (def.idx_flag) added.index = sorted(int(columns.size()) - 1);
     free_rows = 0;
     if (free_cols == 0) free_cols = 3;
@@ -335,21 +287,10 @@ struct Model {
     return {};
   }
 
-  Result check_values(const Column& column, int place, const TEVPF_COL_DEF& def) {
-    const Limits l = limits(def);
-    for (int i = 0; i < count(); ++i) {
-      const Value& v = at(i, place);
-      if (compare_values(v, make_value(def.type, l.max), column.tolerance) > 0 ||
-          compare_values(v, make_value(def.type, l.min), column.tolerance) < 0) {
-        return {PF_RANGE, text_of(v), ""};
-      }
-    }
-    return {};
-  }
-
   bool any_neighbours(int column, const std::vector<int>& index, double tolerance, int order) {
     for (size_t i = 0; i + 1 < index.size(); ++i) {
-      const int answer = compare_values(at(index[i], column), at(index[i + 1], column), tolerance);
+      const int answer =
+          compare_values(col(column), at(index[i], column), at(index[i + 1], column), tolerance);
       if (answer == order) return true;
     }
     return false;
@@ -359,14 +300,18 @@ struct Model {
     Column& old = col(place);
     const TEVPF_COL_DEF& def = changed.def;
     if (std::strcmp(def.name, old.def.name) != 0) {
-      if (const Result r = check_name(def.name); r.status != PF_NORMAL) return r;
+      if (const Result r = check_name(def.name); r.failed()) return r;
     }
     if (def.type != old.def.type && !rows.empty()) return {PF_TYPECHG};
-    if (const Result r = check_definition(def); r.status != PF_NORMAL) return r;
+    if (const Result r = check_definition(changed); r.failed()) return r;
     if (def.type != PF_TYPE_STRING) {
-      Result r = check_values(old, place, def);
+      Result r;
+      for (int i = count() - 1; i >= 0; --i) {  // the first row counts
+        if (in_range(changed, at(i, place), old.tolerance)) continue;
+        r = {PF_RANGE, text_of(old, at(i, place)), ""};
+      }
       if (def.width < 1) r.status = PF_BADWIDTH;
-      if (r.status != PF_NORMAL) return r;
+      if (r.failed()) return r;
     } else {
       if (def.width != old.def.width && !rows.empty()) return empty_texts(PF_BADCOLCHG);
       if (def.width < 1) return {PF_BADWIDTH};
@@ -382,7 +327,7 @@ struct Model {
     old = changed;
     if (finer && any_neighbours(place, index, old.tolerance, 1)) index = sorted(place);
     old.index = index;
-    for (size_t i = 0; i < columns.size(); ++i) defaults[i] = least(columns[i].def);
+    for (size_t i = 0; i < columns.size(); ++i) defaults[i] = least(columns[i]);
     return {};
   }
 
@@ -423,24 +368,19 @@ TEVPF_TABLE* table_named(const char* name) {
 }
 
 Value load_value(const TEVPF_COL_DEF& def, const unsigned char* place) {
-  if (def.type == PF_TYPE_STRING) return std::string(reinterpret_cast<const char*>(place));
-  return tevpf::with_number(def.type,
-                            [&](auto tag) -> Value { return tevpf::load<decltype(tag)>(place); });
+  if (def.type == PF_TYPE_STRING) return {0, reinterpret_cast<const char*>(place)};
+  return tevpf::with_number(def.type, [&](auto tag) -> Value {
+    return {static_cast<double>(tevpf::load<decltype(tag)>(place)), ""};
+  });
 }
 
-// A value as callers hand it in: a text in its own block.
-std::vector<unsigned char> bytes_of(const Value& value) {
-  std::vector<unsigned char> bytes(8);
-  std::visit(
-      [&](const auto& v) {
-        using T = std::decay_t<decltype(v)>;
-        if constexpr (std::is_same_v<T, std::string>) {
-          bytes.assign(v.c_str(), v.c_str() + v.size() + 1);
-        } else {
-          tevpf::store(bytes.data(), v);
-        }
-      },
-      value);
+// A value as callers hand it in; texts with their terminator.
+std::vector<unsigned char> bytes_of(const TEVPF_COL_DEF& def, const Value& v) {
+  if (def.type == PF_TYPE_STRING) return {v.text.c_str(), v.text.c_str() + v.text.size() + 1};
+  std::vector<unsigned char> bytes(size_t(tevpf::value_size(def.type, 0)));
+  tevpf::with_number(def.type, [&](auto tag) {
+    tevpf::store(bytes.data(), static_cast<decltype(tag)>(v.number));
+  });
   return bytes;
 }
 
@@ -450,11 +390,9 @@ std::vector<unsigned char> image(const TEVPF_TABLE& table, const Row& row) {
   std::vector<unsigned char> bytes(size_t(table.row_wid), 0xEE);
   for (size_t i = 0; i < row.size(); ++i) {
     const TEVPF_COLUMN& column = table.col_array[i];
-    const auto value = bytes_of(row[i]);
-    const bool text = column.def.type == PF_TYPE_STRING;
-    const size_t size = text && int(value.size()) > column.def.width ? value.size() - 1
-                        : text                                       ? value.size()
-                               : size_t(tevpf_test::size_of(column));
+    const auto value = bytes_of(column.def, row[i]);
+    const size_t size = std::min(value.size(), size_t(tevpf_test::size_of(column) - 1) +
+                                                   (column.def.type != PF_TYPE_STRING));
     std::copy_n(value.begin(), size, bytes.begin() + column.offset);
   }
   return bytes;
@@ -470,7 +408,7 @@ Row decode(const TEVPF_TABLE& table, const unsigned char* bytes) {
 
 std::string text(const Row& row) {
   std::string all;
-  for (const Value& v : row) all += text_of(v) + "|";
+  for (const Value& v : row) all += std::to_string(v.number) + v.text + "|";
   return all;
 }
 
@@ -562,15 +500,12 @@ class Pair {
   const char* column_difference(const TEVPF_TABLE& t, int i) {
     const TEVPF_COLUMN& column = t.col_array[i];
     const Column& expected = model_.col(i);
-    const TEVPF_COL_DEF &a = column.def, &b = expected.def;
-    const Limits la = limits(a), lb = limits(b);
-    if (std::strcmp(a.name, b.name) != 0 || std::strcmp(a.units, b.units) != 0) return "texts";
-    if (a.type != b.type || a.width != b.width) return "type or width";
-    if (a.idx_flag != b.idx_flag || a.unq_flag != b.unq_flag) return "flags";
-    if (la.max != lb.max || la.min != lb.min || la.precision != lb.precision) return "limits";
-    if ((a.description != nullptr) != expected.desc.has_value()) return "description";
-    if (a.description != nullptr && *expected.desc != a.description) return "description";
-    if (!a.idx_flag) return nullptr;
+    TEVPF_COL_DEF def = column.def;
+    const char* const desc = std::exchange(def.description, nullptr);
+    if (std::memcmp(&def, &expected.def, sizeof def) != 0) return "definition";
+    if ((desc != nullptr) != expected.desc.has_value()) return "description";
+    if (desc != nullptr && *expected.desc != desc) return "description";
+    if (!def.idx_flag) return nullptr;
     const std::vector<int> entries(column.idx_ptr, column.idx_ptr + t.num_rows);
     return entries == expected.index ? nullptr : "index";
   }
@@ -588,16 +523,15 @@ class Pair {
   }
 
   Value random_value(const Column& c) {
-    const Limits l = limits(c.def);
-    if (c.def.type == PF_TYPE_STRING) {
-      std::string v;
-      for (int n = below(c.def.width + 1); n > 0; --n) v += "aab\xC3"[below(4)];
+    if (c.is_text()) {
+      Value v;
+      for (int n = below(c.def.width + 1); n > 0; --n) v.text += "aab\xC3"[below(4)];
       return v;
     }
-    if (chance(2)) return make_value(c.def.type, chance(50) ? l.max + 1 : l.min - 1);
-    const double few = l.min + below(chance(70) ? 4 : int(l.max - l.min) + 1);
+    if (chance(2)) return {chance(50) ? c.max + 1 : c.min - 1, ""};
     // Some reals differ by less than the tolerance, in chains.
-    return make_value(c.def.type, is_real(c.def.type) ? few + below(4) * 0.7 * c.tolerance : few);
+    const int steps = chance(70) ? 4 : int(c.max - c.min) + 1;
+    return {rounded(c.def.type, c.min + below(steps) + below(4) * 0.7 * c.tolerance), ""};
   }
 
   Row random_row() {
@@ -610,9 +544,8 @@ class Pair {
   Value random_key(int column) {
     if (model_.rows.empty() || chance(30)) return random_value(model_.col(column));
     Value key = model_.at(below(model_.count()), column);
-    if (auto* t = std::get_if<std::string>(&key); t != nullptr && chance(40)) {
-      t->resize(size_t(below(int(t->size()) + 1)));
-      *t += "*";
+    if (model_.col(column).is_text() && chance(40)) {
+      key.text = key.text.substr(0, size_t(below(int(key.text.size()) + 1))) + "*";
     }
     return key;
   }
@@ -721,9 +654,9 @@ class Pair {
     const Value key = random_key(column);
     auto out = row_buffer();
     const Result expected = model_.by_value(mode, column, key);
-    delivered("row by value " + text_of(key), expected,
+    delivered("row by value " + text_of(model_.col(column), key), expected,
               TEV8R1_PF_get_row_by_value("t", std::int8_t(mode), model_.col(column).def.name,
-                                         bytes_of(key).data(), out.data()),
+                                         bytes_of(model_.col(column).def, key).data(), out.data()),
               out);
   }
   void get_value() {
@@ -737,8 +670,9 @@ class Pair {
     model_.cur = cur;
     model_.next = next;
     std::vector<unsigned char> out(size_t(model_.col(column).def.width) + 9);
-    expect("get value for " + text_of(key), expected,
-           TEV8R1_PF_get_value("t", model_.col(column).def.name, bytes_of(key).data(), out.data()));
+    expect("get value for " + text_of(model_.col(0), key), expected,
+           TEV8R1_PF_get_value("t", model_.col(column).def.name,
+                               bytes_of(model_.col(0).def, key).data(), out.data()));
     if (expected.status == PF_NORMAL &&
         load_value(model_.col(column).def, out.data()) != model_.at(found, column)) {
       complaint_ = "value found";
@@ -783,16 +717,11 @@ class Pair {
     def.width = chance(4) ? 0 : 1 + below(12);
     def.idx_flag = std::int8_t(chance(60));
     def.unq_flag = std::int8_t(chance(30));
-    Limits l{double(below(3) - 1 + (chance(80) ? 200 : 5)), double(below(3)), 1 + below(4)};
-    if (chance(3)) l.max = l.min - 1;
-    if (chance(3)) l.precision = 0;
-    finish(c, l);
+    const double min = below(3);
+    const double max = chance(3) ? min - 1 : below(3) - 1 + (chance(80) ? 200 : 5);
+    set_limits(c, max, min, chance(3) ? 0 : 1 + below(4));
     if (chance(50)) c.desc = std::string(size_t(below(6)), 'd');
     return c;
-  }
-  void finish(Column& c, const Limits& l) {
-    set_limits(c.def, l);
-    c.tolerance = is_real(c.def.type) ? std::pow(10.0, -(l.precision + 1)) : 0;
   }
   TEVPF_COL_DEF handed_in(Column& c) {
     TEVPF_COL_DEF def = c.def;
@@ -815,9 +744,8 @@ class Pair {
     if (chance(90)) c.def.width = old.width;
     if (chance(60)) c.def.idx_flag = old.idx_flag;
     if (chance(60) && c.def.type == old.type) {
-      Limits l = limits(old);
-      if (chance(40)) l.precision = 1 + below(4);
-      finish(c, l);
+      const Column& o = model_.col(place);
+      set_limits(c, o.max, o.min, chance(40) ? 1 + below(4) : o.precision);
     }
     const TEVPF_COL_DEF def = handed_in(c);
     expect("redefine " + name, model_.redefine(place, c),
@@ -855,7 +783,7 @@ class Pair {
     model_.cur = model_.search = -1;
     model_.next = model_.free_rows = model_.free_cols = 0;
     for (size_t i = 0; i < model_.columns.size(); ++i) {
-      model_.defaults[i] = least(model_.columns[i].def);
+      model_.defaults[i] = least(model_.columns[i]);
     }
   }
   void column_values() {
@@ -876,8 +804,9 @@ class Pair {
     if (no_columns()) return;
     const int column = any_column();
     const Value value = random_key(column);
-    expect("check " + text_of(value), model_.check_value(column, value),
-           TEV8R1_validate_row_value("t", model_.col(column).def.name, bytes_of(value).data()));
+    const Column& c = model_.col(column);
+    expect("check " + text_of(c, value), model_.check_value(column, value),
+           TEV8R1_validate_row_value("t", c.def.name, bytes_of(c.def, value).data()));
   }
 
   std::mt19937 random_;
