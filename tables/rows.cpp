@@ -97,9 +97,9 @@ void count_row(TEVPF_TABLE& table) noexcept {
 
 // The numbers of rows run from 0 to num_rows: PF_END_POS and beyond append.
 TEVPF_STATUS insert_row(TEVPF_TABLE& table, const void* row, std::int32_t row_number) noexcept {
-  if (table.free_rows <= 0) PF_TRY(TEV8R1_get_space(&table));
   const GivenRow given(table, row);
   if (given.get() == nullptr) return fail_empty(PF_NOMEM);
+  if (table.free_rows <= 0) PF_TRY(TEV8R1_get_space(&table));
   InsertionPoints points;
   if (library.interactive == 0) PF_TRY(check_row(table, given.get(), kNobody, points));
 

@@ -14,7 +14,7 @@
 #include <utility>
 
 #include "core/directory.h"
-#include "core/error_context.h"
+#include "support/error_texts.h"
 #include "support/table_check.h"
 
 namespace {
@@ -60,11 +60,11 @@ void set_limits(Column& c, double max, double min, int precision) {
 
 struct Result {
   TEVPF_STATUS status = PF_NORMAL;
-  std::string item = "was", value = "here";  // what the context holds before each step
+  ErrorTexts texts = kUntouched;
   bool failed() const { return status != PF_NORMAL; }
 };
 
-Result empty_texts(TEVPF_STATUS status) { return {status, "", ""}; }
+Result empty_texts(TEVPF_STATUS status) { return {status, kEmpty}; }
 
 std::string text_of(const Column& c, const Value& v) {
   char buffer[64];
@@ -150,11 +150,11 @@ struct Model {
 
   Result check_value(int column, const Value& value, int* holder = nullptr) {
     const Column& c = col(column);
-    if (!in_range(c, value, c.tolerance)) return {PF_RANGE, text_of(c, value), ""};
+    if (!in_range(c, value, c.tolerance)) return {PF_RANGE, {text_of(c, value), ""}};
     int pos = 0;
     if (!c.is_unique() || !find(column, c.index, 0, value, pos)) return {};
     if (holder != nullptr) *holder = c.index[size_t(pos)];
-    return {PF_DUPLICATE, "value " + text_of(c, value), std::string("column ") + c.def.name};
+    return {PF_DUPLICATE, {"value " + text_of(c, value), std::string("column ") + c.def.name}};
   }
 
   // owner: a row that may hold the values already; -2: any row may.
@@ -220,7 +220,7 @@ struct Model {
   Result move(int from, int to) {
     if (search >= 0) return {PF_SEARCHSET};
     if (from < 0 || from >= count() || count() < 2) {
-      return {PF_BADPOS, std::to_string(from), std::to_string(count())};
+      return {PF_BADPOS, {std::to_string(from), std::to_string(count())}};
     }
     const Model before = *this;
     const Row row = rows[size_t(from)];
@@ -258,15 +258,15 @@ struct Model {
   }
 
   static Result check_definition(const Column& c) {
-    if (c.max < c.min) return {PF_BADRANGE, text_of(c, {c.min, ""}), ""};
-    if (c.precision < 1) return {PF_BADPREC, std::to_string(c.precision), c.def.name};
+    if (c.max < c.min) return {PF_BADRANGE, {text_of(c, {c.min, ""}), ""}};
+    if (c.precision < 1) return {PF_BADPREC, {std::to_string(c.precision), c.def.name}};
     return {};
   }
 
   Result check_name(const char* name) const {
     if (name[0] == ' ') return empty_texts(PF_BADNAME);
     if (column_named(name) < 0) return {};
-    return {PF_DUPLICATE, std::string("column ") + name, "table t"};
+    return {PF_DUPLICATE, {std::string("column ") + name, "table t"}};
   }
 
   Result define(const Column& column) {
@@ -274,7 +274,7 @@ struct Model {
     if (const Result r = check_name(def.name); r.failed()) return r;
     if (def.idx_flag && def.unq_flag && !rows.empty()) return empty_texts(PF_BADUNIQUE);
     if (const Result r = check_definition(column); r.failed()) return r;
-    if (def.width < 1) return {PF_BADWIDTH, std::to_string(def.width), def.name};
+    if (def.width < 1) return {PF_BADWIDTH, {std::to_string(def.width), def.name}};
     columns.push_back(column);
     Column& added = columns.back();
     if (!def.idx_flag) added.def.unq_flag = 0;
@@ -430,8 +430,7 @@ class Pair {
   }
 
   void step() {
-    std::strcpy(tevpf::err_item, "was");
-    std::strcpy(tevpf::err_value, "here");
+    set_error_texts();
     static constexpr struct {
       int weight;
       void (Pair::*run)();
@@ -517,9 +516,8 @@ class Pair {
     std::snprintf(code, sizeof code, ": status %08x, not %08x", status, expected.status);
     if (status != expected.status) complaint_ = operation + code;
     if (status == PF_NORMAL || !complaint_.empty()) return;
-    if (expected.item != tevpf::err_item || expected.value != tevpf::err_value) {
-      complaint_ = operation + ": texts " + tevpf::err_item + ", " + tevpf::err_value;
-    }
+    if (error_texts() == expected.texts) return;
+    complaint_ = operation + ": " + testing::PrintToString(error_texts());
   }
 
   Value random_value(const Column& c) {
