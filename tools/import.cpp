@@ -1,0 +1,58 @@
+// tevpf import: the rows of a CSV file into a table, all of them or none.
+#include <cerrno>
+#include <cstdio>
+#include <cstring>
+#include <memory>
+
+#include "commands.h"
+#include "output.h"
+#include "table_import.h"
+#include "text.h"
+
+namespace tool {
+namespace {
+
+struct CloseFile {
+  void operator()(std::FILE* stream) const {
+    if (stream != stdin) std::fclose(stream);
+  }
+};
+
+std::string read_whole(const std::string& path) {
+  const std::unique_ptr<std::FILE, CloseFile> stream{path == "-" ? stdin
+                                                                 : std::fopen(path.c_str(), "rb")};
+  std::string text;
+  std::size_t size = 0;
+  while (stream) {
+    text.resize(size + 65536);
+    const std::size_t count = std::fread(text.data() + size, 1, 65536, stream.get());
+    size += count;
+    if (count == 0) break;
+    if (text.capacity() < size + 65536) text.reserve(size * 2);
+  }
+  if (!stream || std::ferror(stream.get()) != 0) {
+    throw Failure(kUnreadable, visible(path) + ": it cannot be read: " + std::strerror(errno) +
+                                   "; name a CSV file, or - for standard input");
+  }
+  text.resize(size);
+  return text;
+}
+
+}  // namespace
+
+ExitStatus run_import(const Arguments& arguments) {
+  check_new_name(arguments.element, "the table's name");
+  const std::string text = read_whole(arguments.csv);
+  const std::string name = arguments.csv == "-" ? "standard input" : arguments.csv;
+  PfFile file = PfFile::open_or_create(arguments.file);
+  if (!file.has(Kind::kTable, arguments.element) && file.has(Kind::kList, arguments.element)) {
+    throw Failure(kRefused, visible(file.path()) + ": " + in_quotes(arguments.element) +
+                                " is a list; rows go into tables, so choose another name");
+  }
+  const std::size_t rows = import_csv(file, arguments.element, {text, name});
+  file.save();
+  print(counted(rows, "row") + " added to table " + in_quotes(arguments.element) + "\n");
+  return kDone;
+}
+
+}  // namespace tool

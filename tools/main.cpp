@@ -1,0 +1,82 @@
+// tevpf: looks at parameter files, checks and changes them.
+#include <algorithm>
+#include <cstdio>
+#include <exception>
+#include <new>
+#include <string>
+
+#include "arguments.h"
+#include "commands.h"
+#include "failure.h"
+#include "output.h"
+#include "platform.h"
+#include "tevpf.h"
+#include "text.h"
+
+namespace {
+
+using tool::Command;
+
+std::string version() {
+  return "tevpf " + std::to_string(TEVPF_VERSION_MAJOR) + "." +
+         std::to_string(TEVPF_VERSION_MINOR) + "." + std::to_string(TEVPF_VERSION_PATCH) + "\n";
+}
+
+std::string overview() {
+  std::string text =
+      "Look at parameter files, check and change them.\n"
+      "Usage: tevpf COMMAND FILE ...\n\nCommands:\n";
+  for (const Command& command : tool::commands()) {
+    std::string line = "  " + std::string(command.name);
+    line.resize(10, ' ');
+    text += line + command.help + "\n";
+  }
+  return text +
+         "\n'tevpf COMMAND --help' describes a command, 'tevpf --version' prints the version.\n"
+         "Exit status: 0 done, 1 refused or not found, 2 wrong command line,\n"
+         "3 a file is missing, damaged or unreadable, 4 a file cannot be written.\n";
+}
+
+int run(int argc, char** argv) {
+  const std::string name = argc > 1 ? argv[1] : "";
+  if (name == "--help" || name == "-h" || name == "help") {
+    tool::print(overview());
+    return tool::kDone;
+  }
+  if (name == "--version") {
+    tool::print(version());
+    return tool::kDone;
+  }
+  const auto all = tool::commands();
+  const auto command =
+      std::find_if(all.begin(), all.end(), [&](const Command& c) { return name == c.name; });
+  if (command == all.end()) {
+    std::fprintf(stderr, "tevpf: %s; 'tevpf --help' lists the commands\n",
+                 name.empty() ? "no command is given"
+                              : ("there is no command " + tool::in_quotes(name)).c_str());
+    return tool::kUsage;
+  }
+  tool::Arguments arguments;
+  auto status = tool::kDone;
+  if (!tool::read_arguments(*command, argc - 1, argv + 1, arguments, status)) return status;
+  return command->run(arguments);
+}
+
+}  // namespace
+
+int main(int argc, char** argv) {
+  try {
+    tool::prepare_standard_output();
+    return run(argc, argv);
+  } catch (const tool::ClosedPipe&) {
+    return tool::kDone;
+  } catch (const tool::Failure& failure) {
+    std::fprintf(stderr, "tevpf: %s\n", failure.what());
+    return failure.status();
+  } catch (const std::bad_alloc&) {
+    std::fprintf(stderr, "tevpf: memory ran out; nothing was changed\n");
+  } catch (const std::exception& error) {
+    std::fprintf(stderr, "tevpf: %s\n", error.what());
+  }
+  return tool::kRefused;
+}

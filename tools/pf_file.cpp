@@ -1,0 +1,237 @@
+#include "pf_file.h"
+
+#include <algorithm>
+#include <cerrno>
+#include <cstdio>
+#include <cstdlib>
+#include <cstring>
+#include <memory>
+#include <system_error>
+#include <utility>
+
+#include "failure.h"
+#include "messages.h"
+#include "temp_file.h"
+#include "text.h"
+
+namespace fs = std::filesystem;
+
+namespace tool {
+namespace {
+
+struct FreeBlock {
+  void operator()(void* block) const { std::free(block); }
+};
+template <class T>
+using Block = std::unique_ptr<T[], FreeBlock>;
+
+// The library would take a leading "$" for the name of an environment variable; the shell has expanded
+// those already.
+std::string library_name(const std::string& path) {
+  return path.starts_with('$') ? "./" + path : path;
+}
+
+// Opening with the library creates a file that is not there, and empties one that it may write but not
+// read. Neither may happen by looking at it.
+void check_readable(const std::string& path) {
+  std::error_code error;
+  const fs::file_status status = fs::status(path, error);
+  if (status.type() == fs::file_type::not_found) {
+    throw Failure(kUnreadable, visible(path) + ": there is no such file; 'tevpf new' makes one");
+  }
+  if (!error && status.type() != fs::file_type::regular) {
+    throw Failure(kUnreadable, visible(path) + ": it is not a regular file; name a parameter file");
+  }
+  std::FILE* stream = error ? nullptr : std::fopen(path.c_str(), "rb");
+  if (stream == nullptr) {
+    throw Failure(kUnreadable, visible(path) + ": it cannot be read: " +
+                                   (error ? error.message() : std::strerror(errno)) +
+                                   "; check its permissions");
+  }
+  std::fclose(stream);
+}
+
+void check_length(const std::string& path) {
+  if (library_name(path).size() < TEVPF_FILE_NAME_SIZE) return;
+  throw Failure(kRefused, visible(path) + ": the path has more than " +
+                              std::to_string(TEVPF_FILE_NAME_SIZE - 1) +
+                              " characters; go to its folder and use the short name");
+}
+
+void append(std::vector<Element>& elements, Kind kind, std::int32_t count,
+            const char (*names)[TEVPF_NAME_SIZE], const char (*descriptions)[TEVPF_DESC_SIZE]) {
+  for (std::int32_t i = 0; i < count; ++i) elements.push_back({kind, names[i], descriptions[i]});
+}
+
+}  // namespace
+
+const char* kind_word(Kind kind) {
+  return kind == Kind::kList ? "list" : kind == Kind::kTable ? "table" : "list or table";
+}
+
+PfFile::PfFile(std::string path, Use use) : path_(std::move(path)) {
+  check_length(path_);
+  TEV8R1_PF_init();
+  const TEVPF_STATUS status = TEV8R1_PF_open(library_name(path_).c_str());
+  switch (status) {
+    case PF_NEWFILE:
+      is_new_ = true;
+      break;
+    case PF_NORMAL:
+      break;
+    case PF_BADFORMAT:
+    case PF_BADTYPE:
+    case PF_DUPLICATE:
+      damage_ = find_damage(status);
+      break;
+    case PF_BADFILE:
+      throw Failure(kUnreadable, visible(path_) + ": " + reason(status));
+    default: {
+      const Failure failure = library_failure(status, path_, "open it");
+      if (status == PF_NOMEM) TEV8R1_PF_close(0);
+      throw failure;
+    }
+  }
+  open_ = true;
+  if (use == Use::kRead) return;
+  try {
+    refuse_changes();
+  } catch (...) {
+    close();
+    throw;
+  }
+}
+
+std::string PfFile::find_damage(TEVPF_STATUS status) const {
+  std::string last_list, last_table;
+  for (const Element& element : elements()) {
+    (element.kind == Kind::kList ? last_list : last_table) = element.name;
+  }
+  return tool::damage(status, last_list, last_table);
+}
+
+void PfFile::refuse_changes() const {
+  if (!damage_.empty()) {
+    throw Failure(kUnreadable,
+                  visible(path_) + ": it is damaged: " + damage_ +
+                      "; it was not changed, because what cannot be read would be lost");
+  }
+  std::int32_t writable = 0;
+  require(TEV8R1_PF_inq_file_access(&writable), path_, "change it");
+  if (writable == 0) {
+    throw Failure(kCannotWrite, visible(path_) +
+                                    ": it may only be read; change its permissions or "
+                                    "work on a copy");
+  }
+}
+
+PfFile::~PfFile() { close(); }
+
+void PfFile::close() {
+  if (open_) TEV8R1_PF_close(0);
+  open_ = false;
+}
+
+PfFile PfFile::open_to_read(const std::string& path) {
+  check_readable(path);
+  return {path, Use::kRead};
+}
+
+PfFile PfFile::open_to_change(const std::string& path) {
+  check_readable(path);
+  return {path, Use::kChange};
+}
+
+PfFile PfFile::create(const std::string& path) {
+  std::error_code error;
+  const fs::file_type type = fs::symlink_status(path, error).type();
+  if (type != fs::file_type::not_found) {
+    throw Failure(kRefused, visible(path) + ": it " +
+                                (error ? "cannot be looked at: " + error.message()
+                                       : "exists already; choose another name or remove it first"));
+  }
+  return {path, Use::kChange};
+}
+
+PfFile PfFile::open_or_create(const std::string& path) {
+  std::error_code ignored;
+  const bool is_there = fs::symlink_status(path, ignored).type() != fs::file_type::not_found;
+  return is_there ? open_to_change(path) : create(path);
+}
+
+std::vector<Element> PfFile::elements() const {
+  std::int32_t num_lists = 0, num_tables = 0;
+  char file_name[TEVPF_FILE_NAME_SIZE];
+  char(*list_names)[TEVPF_NAME_SIZE] = nullptr, (*table_names)[TEVPF_NAME_SIZE] = nullptr;
+  char(*list_descs)[TEVPF_DESC_SIZE] = nullptr, (*table_descs)[TEVPF_DESC_SIZE] = nullptr;
+  const TEVPF_STATUS status = TEV8R1_PF_inq_file_elements(
+      file_name, &num_lists, &list_names, &list_descs, &num_tables, &table_names, &table_descs);
+  const Block<char[TEVPF_NAME_SIZE]> names{list_names}, more_names{table_names};
+  const Block<char[TEVPF_DESC_SIZE]> descs{list_descs}, more_descs{table_descs};
+  require(status, path_, "read its directory");
+  std::vector<Element> result;
+  append(result, Kind::kList, num_lists, list_names, list_descs);
+  append(result, Kind::kTable, num_tables, table_names, table_descs);
+  return result;
+}
+
+bool PfFile::has(Kind kind, const std::string& name) const {
+  const std::vector<Element> all = elements();
+  return std::any_of(all.begin(), all.end(), [&](const Element& element) {
+    return element.kind == kind && element.name == name;
+  });
+}
+
+Element PfFile::find(const std::string& name, Kind kind) const {
+  std::vector<Element> found = elements();
+  std::erase_if(found, [&](const Element& element) { return element.name != name; });
+  const bool other_kind = std::erase_if(found, [&](const Element& element) {
+                            return kind != Kind::kAny && element.kind != kind;
+                          }) > 0;
+  if (found.empty()) {
+    throw Failure(
+        kRefused,
+        visible(path_) + ": there is no " + kind_word(kind) + " " + in_quotes(name) +
+            (other_kind
+                 ? std::string(", only a ") +
+                       kind_word(kind == Kind::kList ? Kind::kTable : Kind::kList) + " of that name"
+                 : "") +
+            "; 'tevpf info' shows what there is");
+  }
+  if (found.size() > 1 && kind == Kind::kAny) {
+    throw Failure(kRefused, visible(path_) + ": both a list and a table are named " +
+                                in_quotes(name) + "; say which with --list or --table");
+  }
+  return found.front();
+}
+
+void PfFile::save() {
+  std::error_code error;
+  const fs::path resolved = fs::canonical(path_, error);  // a link stays a link
+  const fs::path target = error ? fs::path(path_) : resolved;
+  TempFile whole = TempFile::beside(target);
+  const TEVPF_STATUS status = TEV8R1_PF_save(whole.path().string().c_str());
+  if (status != PF_NORMAL) {
+    throw Failure(kCannotWrite,
+                  visible(path_) + ": it cannot be saved: " +
+                      (status == PF_OPENFAIL ? "its new content found no room beside it; make room"
+                                             : reason(status)) +
+                      "; the file is as it was before");
+  }
+  close();
+  whole.replace(target);
+}
+
+void check_new_name(const std::string& name, const std::string& what) {
+  if (name.empty()) throw Failure(kRefused, what + " is empty; give it at least one character");
+  if (name.size() >= TEVPF_NAME_SIZE) {
+    throw Failure(kRefused, what + " " + in_quotes(name) + " has " + std::to_string(name.size()) +
+                                " characters; names have at most " +
+                                std::to_string(TEVPF_NAME_SIZE - 1));
+  }
+  if (name.front() == ' ') {
+    throw Failure(kRefused, what + " " + in_quotes(name) + " starts with a blank; take it away");
+  }
+}
+
+}  // namespace tool

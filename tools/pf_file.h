@@ -1,0 +1,60 @@
+// FILE, opened with the library: never created or emptied by reading, replaced whole by saving.
+#pragma once
+
+#include <filesystem>
+#include <string>
+#include <vector>
+
+#include "tevpf.h"
+
+namespace tool {
+
+enum class Kind { kAny, kList, kTable };
+
+struct Element {
+  Kind kind;  // kList or kTable
+  std::string name, description;
+};
+
+const char* kind_word(Kind kind);
+
+class PfFile {
+ public:
+  // To look at: a damaged file is opened as far as it can be read, and `damage` says what is wrong.
+  static PfFile open_to_read(const std::string& path);
+  // To change: a damaged file is refused, because saving it would drop what could not be read.
+  static PfFile open_to_change(const std::string& path);
+  static PfFile create(const std::string& path);  // refuses an existing file
+  static PfFile open_or_create(const std::string& path);
+
+  PfFile(const PfFile&) = delete;
+  PfFile& operator=(const PfFile&) = delete;
+  ~PfFile();  // changes that were not saved are dropped, and so is a created file
+
+  const std::string& path() const { return path_; }
+  const std::string& damage() const { return damage_; }  // empty: none
+  bool is_new() const { return is_new_; }
+
+  std::vector<Element> elements() const;  // lists first, each kind in directory order
+  bool has(Kind kind, const std::string& name) const;
+  // The element of that name, or a Failure that says what to do: none, or both kinds.
+  Element find(const std::string& name, Kind kind) const;
+
+  // Writes a new file beside it and puts that in its place; closes.
+  void save();
+
+ private:
+  enum class Use { kRead, kChange };
+  PfFile(std::string path, Use use);
+  std::string find_damage(TEVPF_STATUS status) const;
+  void refuse_changes() const;  // throws when it may not be written, or is damaged
+  void close();
+
+  std::string path_, damage_;
+  bool open_ = false, is_new_ = false;
+};
+
+// Refuses a name that the library would cut or refuse; `what`: "the new name".
+void check_new_name(const std::string& name, const std::string& what);
+
+}  // namespace tool

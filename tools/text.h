@@ -1,0 +1,24 @@
+// Texts as people see them: bytes that a terminal would act upon are shown as escapes.
+#pragma once
+
+#include <cstddef>
+#include <string>
+#include <string_view>
+
+namespace tool {
+
+// Control characters as \n, \t, \r or \xNN, and so every byte that is not well-formed UTF-8.
+std::string visible(std::string_view text);
+
+// 'text', made visible.
+std::string in_quotes(std::string_view text);
+
+// Characters of a visible text: its bytes without UTF-8 continuations.
+std::size_t display_width(std::string_view text);
+
+std::string_view trimmed(std::string_view text);  // without blanks and tabs at both ends
+
+// "1 row", "2 rows".
+std::string counted(std::size_t count, std::string_view noun);
+
+}  // namespace tool
