@@ -1,0 +1,57 @@
+#include "core/number_text.h"
+
+#include <gtest/gtest.h>
+
+#include <bit>
+#include <cmath>
+#include <cstdio>
+#include <random>
+#include <string>
+
+namespace tevpf {
+namespace {
+
+// Numbers of all sizes, ties between two roundings, and neighbours of powers of ten.
+double any_number(std::mt19937_64& random) {
+  const auto whole = static_cast<double>(random() % 2000000);
+  const double power = std::pow(10, static_cast<int>(random() % 60) - 30);
+  switch (random() % 6) {
+    case 0:
+      return std::bit_cast<double>(random());
+    case 1:
+      return std::ldexp(whole + 0.5, static_cast<int>(random() % 60) - 30);
+    case 2:
+      return -whole * power;
+    case 3:
+      return std::nextafter(power, random() % 2 == 0 ? 0 : 1e300);
+    case 4:
+      return static_cast<float>(whole / 1000);
+    default:
+      return std::ldexp(static_cast<double>(random() >> 11),
+                        static_cast<int>(random() % 220) - 163);
+  }
+}
+
+TEST(NumberText, GeneralGivesTheBytesOfPrintf) {
+  std::mt19937_64 random(7);
+  for (int round = 0; round < 300000; ++round) {
+    const double number = any_number(random);
+    const int precision = static_cast<int>(random() % 20) - 1;
+    char ours[kMaxNumberText], expected[64];
+    *write_general(ours, number, precision) = '\0';
+    std::snprintf(expected, sizeof expected, "%.*g", precision, number);
+    ASSERT_STREQ(ours, expected) << "precision " << precision << ", round " << round;
+  }
+}
+
+TEST(NumberText, DecimalAtTheEndsOfTheTypes) {
+  for (const std::int64_t number :
+       {INT64_MIN, INT64_MAX, std::int64_t{INT32_MIN} - 1, std::int64_t{INT32_MIN},
+        std::int64_t{INT32_MAX} + 1, std::int64_t{0}, std::int64_t{-7}}) {
+    char text[21];
+    EXPECT_EQ(std::string(text, write_decimal(text, number)), std::to_string(number));
+  }
+}
+
+}  // namespace
+}  // namespace tevpf
