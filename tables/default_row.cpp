@@ -23,9 +23,16 @@ void put_min(unsigned char* place, const TEVPF_COL_DEF& definition) noexcept {
 bool make_default_row(TEVPF_TABLE& table) noexcept {
   auto row = new_zeroed<unsigned char>(static_cast<std::uint64_t>(table.row_wid));
   if (!row) return false;
-  adopt_default_row(table, std::move(row));
-  (void)TEV8R1_init_row_defaults(&table);  // the types of columns that stand are known
+  adopt_minimums(table, std::move(row));
   return true;
+}
+
+void adopt_minimums(TEVPF_TABLE& table, Owned<unsigned char> zeroed) noexcept {
+  adopt_default_row(table, std::move(zeroed));
+  for (std::int32_t i = 0; i < table.num_cols; ++i) {
+    const TEVPF_COLUMN& column = table.col_array[i];
+    put_min(table.dft_row + column.offset, column.def);
+  }
 }
 
 void adopt_default_row(TEVPF_TABLE& table, Owned<unsigned char> row) noexcept {

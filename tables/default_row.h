@@ -21,6 +21,9 @@ void put_min(unsigned char* place, const TEVPF_COL_DEF& definition) noexcept;
 // when memory runs out, and then it keeps that.
 [[nodiscard]] bool make_default_row(TEVPF_TABLE& table) noexcept;
 
+// The same with a block of row_wid zeros that is already there.
+void adopt_minimums(TEVPF_TABLE& table, Owned<unsigned char> zeroed) noexcept;
+
 // Replaces the default row by another block, or by none.
 void adopt_default_row(TEVPF_TABLE& table, Owned<unsigned char> row) noexcept;
 

@@ -134,8 +134,7 @@ void apply(TEVPF_TABLE& table, TEVPF_COLUMN& column, Redefinition next) noexcept
 
   // With rows every offset comes out as before.
   if (lay_out_columns(table)) give_up_spare_rows(table);
-  adopt_default_row(table, std::move(next.default_row));
-  (void)TEV8R1_init_row_defaults(&table);
+  adopt_minimums(table, std::move(next.default_row));
   if (width_changed && library.interactive != 0) (void)TEV8R1_make_table_format(&table);
 }
 

@@ -1,0 +1,150 @@
+// A table "t" in a new file, filled and read as text, its invariants checked with each look at it.
+#pragma once
+
+#include <gtest/gtest.h>
+#include <unistd.h>
+
+#include <cstdlib>
+#include <cstring>
+#include <string>
+#include <vector>
+
+#include "core/directory.h"
+#include "core/library.h"
+#include "support/error_texts.h"
+#include "support/table_check.h"
+#include "tables/column_index.h"
+#include "tables/row_store.h"
+
+#define ASSERT_OK(expr) ASSERT_EQ(expr, PF_NORMAL)
+
+namespace tevpf {
+
+inline constexpr std::int32_t kInt = PF_TYPE_INT, kReal = PF_TYPE_REAL, kText = PF_TYPE_STRING,
+                              kDouble = PF_TYPE_DOUBLE, kShort = PF_TYPE_SHORT;
+
+struct Bounds {
+  double min = -1000, max = 1000;
+  std::int32_t precision = 6;
+};
+
+inline TEVPF_COL_DEF col(const char* name, std::int32_t type, std::int32_t width = 6,
+                         Bounds bounds = {}) {
+  TEVPF_COL_DEF def{};
+  def.type = type;
+  std::strncpy(def.name, name, sizeof def.name - 1);
+  def.width = width;
+  if (!is_number_type(type)) return def;
+  with_number(type, [&](auto tag) {
+    using T = decltype(tag);
+    limits_of<T>(def).min = static_cast<T>(bounds.min);
+    limits_of<T>(def).max = static_cast<T>(bounds.max);
+    if constexpr (kIsFloating<T>) limits_of<T>(def).precision = bounds.precision;
+  });
+  return def;
+}
+
+inline TEVPF_COL_DEF indexed(TEVPF_COL_DEF def, bool unique = false) {
+  def.idx_flag = 1;
+  def.unq_flag = unique;
+  return def;
+}
+
+inline TEVPF_COL_DEF described(TEVPF_COL_DEF def, const char* text) {
+  def.description = const_cast<char*>(text);
+  return def;
+}
+
+class TableTest : public testing::Test {
+ protected:
+  TableTest() {
+    TEV8R1_PF_init();
+    const std::string path = testing::TempDir() + "table_test_" + std::to_string(getpid());
+    EXPECT_EQ(TEV8R1_PF_open(path.c_str()), PF_NEWFILE);
+    new_table();
+  }
+  ~TableTest() override {
+    TEV8R1_turn_off_interactive();
+    TEV8R1_PF_close(0);
+  }
+
+  // An empty table "t" in place of the one that there is.
+  static void new_table() {
+    TEV8R1_PF_delete_table("t");
+    EXPECT_EQ(TEV8R1_PF_create_elem("t", "", PF_ELEM_TABLE), PF_NORMAL);
+  }
+  static TEVPF_TABLE& table(const char* name = "t") {
+    TEVPF_TABLE* found = nullptr;
+    EXPECT_EQ(TEV8R1_get_table_ptr(name, &found), PF_NORMAL);
+    EXPECT_STREQ(tevpf_test::broken_rule(*found), nullptr);
+    return *found;
+  }
+  static TEVPF_COLUMN& column(int i) { return table().col_array[i]; }
+  static std::vector<int> order(int i) {
+    const std::int32_t* entries = index_entries(column(i));
+    return {entries, entries + table().num_rows};
+  }
+
+  static void define(std::initializer_list<TEVPF_COL_DEF> defs) {
+    for (const TEVPF_COL_DEF& def : defs) ASSERT_OK(TEV8R1_PF_def_column("t", def)) << def.name;
+  }
+  static TEVPF_STATUS redefine(const char* name, const TEVPF_COL_DEF& def) {
+    return TEV8R1_PF_modify_col_def("t", name, def);
+  }
+
+  static void add_rows(std::initializer_list<std::vector<const char*>> rows) {
+    for (const auto& values : rows) {
+      std::string row(static_cast<std::size_t>(table().row_wid), '\x55');
+      for (int i = 0; i < table().num_cols; ++i) {
+        char* place = &row[static_cast<std::size_t>(column(i).offset)];
+        ASSERT_OK(TEV8R1_from_char(column(i).def.type, values[static_cast<std::size_t>(i)], place));
+      }
+      ASSERT_OK(TEV8R1_PF_add_row("t", row.data()));
+    }
+  }
+
+  // The values of a row, separated by blanks; all rows in storage order, separated by slashes.
+  static std::string text_of(const TEVPF_TABLE& t, const void* row) {
+    std::string text;
+    for (int i = 0; i < t.num_cols; ++i) {
+      const TEVPF_COLUMN& c = t.col_array[i];
+      char value[500];
+      std::int32_t length = 0;
+      TEV8R1_to_char(c.def.type, nullptr, static_cast<const char*>(row) + c.offset, value, &length);
+      text += (i > 0 ? " " : "") + std::string(value);
+    }
+    return text;
+  }
+  static std::string rows_text(const char* name = "t") {
+    const TEVPF_TABLE& t = table(name);
+    std::string text;
+    for (int i = 0; i < t.num_rows; ++i) text += (i > 0 ? "/" : "") + text_of(t, row_at(t, i));
+    return text;
+  }
+  static std::string default_text() { return text_of(table(), table().dft_row); }
+
+  // Everything that can be seen of the table, as bytes.
+  static std::string snapshot() {
+    const TEVPF_TABLE& t = table();
+    std::string bytes;
+    const auto add = [&](const void* from, std::size_t size) {
+      if (size > 0) bytes.append(static_cast<const char*>(from), size);
+    };
+    const auto rows = static_cast<std::size_t>(t.num_rows);
+    add(&t, offsetof(TEVPF_TABLE, cur_col));
+    bytes += std::to_string(t.cur_col == nullptr ? -1 : t.cur_col - t.col_array);
+    for (int i = 0; i < t.num_cols; ++i) {
+      TEVPF_COLUMN copy = t.col_array[i];
+      bytes += copy.def.description == nullptr ? "-" : copy.def.description;
+      copy.def.description = nullptr;
+      add(&copy, offsetof(TEVPF_COLUMN, idx_ptr));
+      add(&copy.desc_flag, 1);
+      if (copy.def.idx_flag != 0) add(index_entries(t.col_array[i]), rows * 4);
+    }
+    add(t.row_data, rows * static_cast<std::size_t>(t.row_wid));
+    add(t.dft_row, static_cast<std::size_t>(t.row_wid));
+    return bytes;
+  }
+};
+
+}  // namespace tevpf
