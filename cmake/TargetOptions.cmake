@@ -14,6 +14,10 @@ function(tevpf_target_options target)
     # Counts are signed and sizes are not; compilers disagree whether -Wconversion includes that.
     target_compile_options(${target} PRIVATE
       -Wall -Wextra -Wpedantic -Wconversion -Wno-sign-conversion -Wshadow -Werror)
+    if(CMAKE_CXX_COMPILER_ID STREQUAL "GNU" AND CMAKE_CXX_COMPILER_VERSION VERSION_LESS 13)
+      # False alarms of gcc 12 in the standard library's string concatenation.
+      target_compile_options(${target} PRIVATE -Wno-restrict)
+    endif()
   endif()
 endfunction()
 

@@ -9,7 +9,7 @@ exported() {
   case $library in
     *.dll) i686-w64-mingw32-objdump -p "$library" | awk '
              /\[Ordinal\/Name Pointer\] Table/ { names = 1; next }
-             names && NF == 0 { exit }
+             names && NF == 0 { names = 0 }
              names { print $NF }' ;;
     *) nm -D --defined-only --format=posix "$library" | awk '{ sub(/@.*/, "", $1); print $1 }' ;;
   esac | sort -u

@@ -153,8 +153,8 @@ class ReportTest : public ::testing::Test {
                    const char* description) {
     Def def{};
     def.type = type;
-    std::strncpy(def.name, name, sizeof def.name);
-    std::strncpy(def.units, units, sizeof def.units);
+    std::strncpy(def.name, name, sizeof def.name - 1);
+    std::strncpy(def.units, units, sizeof def.units - 1);
     def.description = const_cast<char*>(description);
     return def;
   }
