@@ -168,7 +168,8 @@ std::size_t Table::column_position(const std::string& name) const {
   std::string all;
   for (std::size_t i = 0; i < columns_.size(); ++i) {
     if (columns_[i].name == name) return i;
-    all += (i == 0 ? "" : ", ") + visible(columns_[i].name);
+    if (i > 0) all += ", ";
+    all += visible(columns_[i].name);
   }
   throw Failure(kRefused, visible(file_) + ": table " + in_quotes(name_) + " has no column " +
                               in_quotes(name) + "; it has " + (all.empty() ? "none" : all));
