@@ -57,6 +57,7 @@ Parsed parse_param(ByteReader& body, TEVPF_PARAM& param) noexcept {
 
 // Whether the parameters fill the body, up to the first one of an unknown type, whose size nobody knows.
 bool is_well_formed(ByteReader body, std::int32_t num_params) noexcept {
+  if (num_params > body.left() / kParamHead) return false;  // whatever their types
   TEVPF_PARAM param;
   for (std::int32_t i = 0; i < num_params; ++i) {
     switch (parse_param(body, param)) {

@@ -55,6 +55,7 @@ bool lies_as_stated(Layout& layout, const TEVPF_COLUMN& column) noexcept {
 // Whether the columns fill the body and the row, up to the first one of an unknown type, whose sizes
 // nobody knows.
 bool is_well_formed(ByteReader body, std::int32_t num_cols, std::int32_t row_wid) noexcept {
+  if (num_cols > body.left() / stored_size(kColumnFields)) return false;  // whatever their types
   Layout layout;
   TEVPF_COLUMN column;
   for (std::int32_t i = 0; i < num_cols; ++i) {
