@@ -1,19 +1,58 @@
 #include "lists/name_index.h"
 
 #include <algorithm>
+#include <bit>
 #include <cstring>
 #include <numeric>
 
 #include "core/status.h"
 #include "values/text_compare.h"
+#include "values/value_type.h"
 
 namespace tevpf {
 namespace {
 
+// A name to search for. Plain ones are compared eight bytes at a time, which takes them as a field of
+// their own, zero behind the end; of a name too long for a field, as much as one holds.
+struct Wanted {
+  explicit Wanted(const char* name) noexcept : pattern(make_pattern(name)) {
+    std::memcpy(field, name, std::min(std::strlen(name), sizeof field));
+  }
+
+  TextPattern pattern;
+  char field[TEVPF_NAME_SIZE] = {};
+};
+
+int first_bit(std::uint64_t word) noexcept { return word == 0 ? 64 : std::countr_zero(word); }
+
+// The order of a record's name and a wanted one, as strcmp gives it. Reads whole fields: what stands
+// behind a terminator does not count, because the lowest byte that differs or ends decides.
+int compare_fields(const char (&name)[TEVPF_NAME_SIZE],
+                   const char (&wanted)[TEVPF_NAME_SIZE]) noexcept {
+  for (const std::size_t offset : {std::size_t{0}, std::size_t{8}, sizeof name - 8}) {
+    const auto a = load<std::uint64_t>(name + offset);
+    const auto b = load<std::uint64_t>(wanted + offset);
+    const std::uint64_t ends = (b - 0x0101010101010101u) & ~b & 0x8080808080808080u;
+    const int difference = first_bit(a ^ b) & ~7;
+    const int end = first_bit(ends) & ~7;
+    if (difference <= end && difference < 64) {
+      return static_cast<int>((a >> difference) & 0xFF) -
+             static_cast<int>((b >> difference) & 0xFF);
+    }
+    if (end < 64) return 0;
+  }
+  return -1;  // the wanted name goes on beyond any field
+}
+
+int order_of(const TEVPF_PARAM& param, const Wanted& wanted) noexcept {
+  return wanted.pattern.prefix ? compare_text(param.def.name, wanted.pattern)
+                               : compare_fields(param.def.name, wanted.field);
+}
+
 // Searches `count` entries; entry(place) gives the position there. Several names can match: once one
 // has been met, the search goes on among those before it, for the first one.
 template <class Entry>
-NamePlace search(const TEVPF_PARAM* params, std::int32_t count, const TextPattern& wanted,
+NamePlace search(const TEVPF_PARAM* params, std::int32_t count, const Wanted& wanted,
                  Entry entry) noexcept {
   std::int32_t low = 0;
   std::int32_t high = count - 1;
@@ -21,7 +60,7 @@ NamePlace search(const TEVPF_PARAM* params, std::int32_t count, const TextPatter
   std::int32_t match = 0;
   while (low <= high) {
     const std::int32_t middle = low + (high - low) / 2;
-    const int order = compare_text(params[entry(middle)].def.name, wanted);
+    const int order = order_of(params[entry(middle)], wanted);
     if (order < 0) {
       low = middle + 1;
       continue;
@@ -36,18 +75,19 @@ NamePlace search(const TEVPF_PARAM* params, std::int32_t count, const TextPatter
 }
 
 NamePlace search_index(const TEVPF_PARAM* params, std::int32_t count, const std::int32_t* index,
-                       const TextPattern& wanted) noexcept {
+                       const Wanted& wanted) noexcept {
   return search(params, count, wanted, [=](std::int32_t place) { return index[place]; });
 }
 
 }  // namespace
 
 TEVPF_STATUS find_param(TEVPF_LIST& list, const char* name, std::int32_t& position) noexcept {
-  const TextPattern wanted = make_pattern(name);
+  const TextPattern pattern = make_pattern(name);
   std::int32_t found = -1;
-  if (!wanted.prefix && table_answers(list)) {
-    found = look_up(list, wanted);
+  if (!pattern.prefix && table_answers(list)) {
+    found = look_up(list, pattern);
   } else {
+    const Wanted wanted(name);
     const NamePlace at = search_index(list.param_ptr, list.num_params, list.index_ptr, wanted);
     if (at.found) found = list.index_ptr[at.place];
   }
@@ -58,7 +98,7 @@ TEVPF_STATUS find_param(TEVPF_LIST& list, const char* name, std::int32_t& positi
 
 NamePlace search_others(const TEVPF_LIST& list, std::int32_t without, const char* name) noexcept {
   const std::int32_t* const index = list.index_ptr;
-  return search(list.param_ptr, list.num_params - 1, make_pattern(name),
+  return search(list.param_ptr, list.num_params - 1, Wanted(name),
                 [=](std::int32_t place) { return index[place < without ? place : place + 1]; });
 }
 
@@ -113,7 +153,7 @@ using namespace tevpf;
 TEVPF_STATUS TEV8R1_list_binary_search(const TEVPF_PARAM* params, std::int32_t count,
                                        const std::int32_t* index, const char* name,
                                        std::int32_t* place_out) noexcept {
-  const NamePlace at = search_index(params, count, index, make_pattern(name));
+  const NamePlace at = search_index(params, count, index, Wanted(name));
   *place_out = at.place;
   return at.found ? TEVPF_STATUS{PF_NORMAL} : fail(PF_NOPARAM, name);
 }

@@ -3,9 +3,11 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <cstring>
 
 #include "core/heap.h"
 #include "lists/list.h"
+#include "values/value_type.h"
 
 extern "C" {
 
@@ -33,6 +35,18 @@ bool btf_can_change(const TEVPF_LIST& list, std::int64_t bytes) noexcept;
 // value an empty text, length that of the value. The texts still are the caller's.
 //   PF_NOMEM  the value is longer than 31 bits can say
 [[nodiscard]] TEVPF_STATUS normalise(TEVPF_PARAM_DEF& definition) noexcept;
+
+// Copies the value of a definition that is in order, strings with their terminator.
+inline void copy_value(const TEVPF_PARAM_DEF& definition, void* value_out) noexcept {
+  if (definition.type == PF_TYPE_STRING) {
+    const auto length = static_cast<std::size_t>(definition.part.str.length);
+    std::memcpy(value_out, definition.part.str.value, length + 1);
+    return;
+  }
+  with_number(definition.type, [&](auto tag) {
+    store<decltype(tag)>(value_out, number_part<decltype(tag)>(definition).value);
+  });
+}
 
 // Releases the texts that the definition owns and leaves null pointers.
 void release_texts(TEVPF_PARAM_DEF& definition) noexcept;

@@ -7,6 +7,7 @@
 #include "core/status.h"
 #include "lists/list.h"
 #include "lists/name_index.h"
+#include "lists/param_record.h"
 
 namespace tevpf {
 namespace {
@@ -42,8 +43,9 @@ TEVPF_STATUS TEV8R1_PF_get_next_param(const char* list_name, char* name_out,
   if (list->cur_param < std::numeric_limits<std::int32_t>::max()) ++list->cur_param;
   if (list->cur_param >= list->num_params) return PF_NOMORE;
   const TEVPF_PARAM_DEF& definition = list->param_ptr[list->cur_param].def;
-  copy_text(name_out, definition.name);
-  return TEV8R1_load_param_value(&definition, value_out);
+  std::memcpy(name_out, definition.name, sizeof definition.name);
+  copy_value(definition, value_out);
+  return PF_NORMAL;
 }
 
 TEVPF_STATUS TEV8R1_PF_get_next_param_def(const char* list_name,

@@ -82,19 +82,15 @@ TEVPF_STATUS TEV8R1_PF_get_param_value(const char* list_name, const char* param_
   PF_TRY(TEV8R1_get_list_ptr(list_name, &list));
   PF_TRY(find_param(*list, param_name, position));
   list->cur_param = position;
-  return TEV8R1_load_param_value(&list->param_ptr[position].def, value_out);
+  copy_value(list->param_ptr[position].def, value_out);
+  return PF_NORMAL;
 }
 
 TEVPF_STATUS TEV8R1_load_param_value(const TEVPF_PARAM_DEF* definition, void* value_out) noexcept {
   if (!is_value_type(definition->type)) return bad_type(definition->type);
-  if (definition->type == PF_TYPE_STRING) {
-    const char* const text = definition->part.str.value;
-    std::memcpy(value_out, text, std::strlen(text) + 1);
-  } else {
-    with_number(definition->type, [&](auto tag) {
-      store<decltype(tag)>(value_out, number_part<decltype(tag)>(*definition).value);
-    });
-  }
+  TEVPF_PARAM_DEF measured = *definition;
+  PF_TRY(normalise(measured));
+  copy_value(measured, value_out);
   return PF_NORMAL;
 }
 
