@@ -106,11 +106,10 @@ TEVPF_STATUS ListWriter::write_string_value(const TEVPF_PARAM_DEF& def,
                                             FirstLine& description) noexcept {
   const char* const value = def.part.str.value == nullptr ? "" : def.part.str.value;
   const std::string_view text = value;
-  if (!escaped_.reserve(text.size())) return fail_empty(PF_NOMEM);
-  const std::string_view escaped = escaped_.escape(text);
-
   write_no_bounds(out_, 10);
   out_.print("  ");
+  if (!escaped_.reserve(text.size())) return fail_empty(PF_NOMEM);
+  const std::string_view escaped = escaped_.escape(text);
   write_wrapped(out_, FirstLine::kGoesOn, kStringWidth, escaped, kStringIndent);
   if (has_descriptions_ || (!escaped.empty() && escaped.back() == ' ')) out_.print("\\0 ");
   if (def.description == nullptr) return PF_NORMAL;

@@ -20,11 +20,9 @@ std::int64_t fill_segment(const RowText& rows, std::int32_t& next, std::int32_t 
   std::int64_t length = 0;
   while (next < rows.count()) {
     const std::int64_t width = display_width(rows.column(next));
-    const bool fits = width + length + kColumnGap < limit;
-    if (!fits && next > first) break;
+    if (next > first && width + length + kColumnGap >= limit) break;
     ++next;
     length += width + (next < rows.count() ? kColumnGap : 0);
-    if (!fits) break;
   }
   return length;
 }

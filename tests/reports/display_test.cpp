@@ -18,6 +18,7 @@ TEST_F(Display, LinesBreakBehindWhiteSpaceOrWithinWords) {
       {"indented at once", 0, 10, "0123456789", ">>0123456789", PF_NORMAL},
       {"hard break", 1, 10, "0123456789a", "01234567\\\n>>89a", PF_NOMORE},
       {"blank at the last place", 1, 10, "0123456 89a", "0123456 \\\n>>89a", PF_NOMORE},
+      {"blanks across the end", 1, 10, "01 4567   b", "01 \\\n>>4567   b", PF_NOMORE},
       {"blank one too late", 1, 10, "01234567 9a", "01234567\\\n>> 9a", PF_NOMORE},
       {"behind several blanks", 1, 10, "01   56789a", "01   \\\n>>56789a", PF_NOMORE},
       {"form feed, vertical tab", 1, 10, "01\v\f4567\xFF\xA0z", "01\v\f\\\n>>4567\xFF\xA0z",

@@ -84,5 +84,16 @@ TEST_F(Memory, NumbersOfAnyPrecisionFitTheirLines) {
   EXPECT_EQ(data_of(dump_table()), ".a  b\n.----\n\n" + expected);
 }
 
+// Every character doubled, in the widest text that its column takes.
+TEST_F(Memory, EscapedTextsFitTheirLines) {
+  table("T", "");
+  text_column("a", 100);
+  row({std::string(100, '\t')});
+  std::string doubled;
+  for (int n = 0; n < 100; ++n) doubled += "\\t";
+  EXPECT_TRUE(dump_table().ends_with("\n\n " + doubled + "\n"));
+  EXPECT_TRUE(listing({"a"}).ends_with("\n\n " + doubled + "\n"));
+}
+
 }  // namespace
 }  // namespace tevpf

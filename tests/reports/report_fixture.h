@@ -170,8 +170,7 @@ class ReportTest : public ::testing::Test {
 };
 
 inline void ReportTest::fill_lists() {
-  const std::string notes =
-      std::string(40, 'a') + ' ' + std::string(46, 'b') + ' ' + std::string(10, 'c');
+  const std::string notes(91, 'a');
   list("TEVPF_FILE_HEADER", "about the file");
   text("Author", "100% engineered");
   text("Notes", notes.c_str());
@@ -189,7 +188,7 @@ inline void ReportTest::fill_lists() {
   text("blank", "ends ");
   text("empty", "");
 
-  const std::string value = std::string(50, 'v') + ' ' + std::string(20, 'w');
+  const std::string value(66, 'v');
   list("Described", "");
   text("eleven", "12345678901", "fits");
   text("twelve", "123456789012", "moves");
@@ -200,7 +199,7 @@ inline void ReportTest::fill_lists() {
 }
 
 inline void ReportTest::fill_mixed_table() {
-  const std::string wide = std::string(30, 'a') + ' ' + std::string(20, 'b') + " ccccc";
+  const std::string wide(55, 'a');
   table("Mixed", "stored 30, 10, 20");
   number_column("id", PF_TYPE_INT, 5, 9999, -9999, kUnique, "identifier");
   text_column("a_rather_long_name", 4, "m/s");

@@ -60,6 +60,18 @@ TEST_F(Segments, WideColumnsStandAloneAndTabsStopAtTwo) {
                 "\\\n \t\t4" + blanks(111) + "\\\n \t\t5" + blanks(112) + "\\\n \t\t\\0 \n");
 }
 
+// Columns go together while their widths, with the gaps, stay below 129, 121, 113, 113.
+TEST_F(Segments, ColumnsShareASegmentBelowItsLimit) {
+  columns({60, 64, 60, 57, 51, 60, 48, 60, 49, 2});
+  row(std::vector<Value>(10, "x"));
+  std::string rules;
+  std::istringstream lines(data_of(dump_table()));
+  for (std::string line; std::getline(lines, line);) {
+    if (line.starts_with(".-")) rules += std::to_string(line.size()) + " ";
+  }
+  EXPECT_EQ(rules, "128 62 112 112 62 53 ");
+}
+
 // Widths as they are declared, lines that are cut exactly, and other limits.
 TEST_F(Segments, AListingIsOneLineUpTo132Characters) {
   columns({60, 68, 69});
