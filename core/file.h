@@ -20,7 +20,7 @@ struct TEVPF_FILE {
   TEVPF_FILE* next_file;
   TEVPF_LIST* last_list;  // the last one found by name, or null
   TEVPF_TABLE* last_table;
-  std::FILE* fp;           // open as long as the record is in the chain
+  std::FILE* fp;           // null once a save could not open the file again
   std::uint8_t new_file;   // created by this open and not saved since: deleted when closed unsaved
   std::uint8_t read_only;  // could only be opened for reading
   char file_name[TEVPF_FILE_NAME_SIZE];

@@ -19,12 +19,12 @@ void adopt_stream(TEVPF_FILE& file, std::FILE* stream) noexcept {
   file.fp = stream;
 }
 
-// Empties the file on the disk and writes it again. Not by freopen, which would leave no stream when it
-// fails.
+// Empties the file on the disk and writes it again. The old stream goes first: what a failed write has
+// left in its buffer must not end up in the new file.
 TEVPF_STATUS overwrite(TEVPF_FILE& file) noexcept {
-  std::FILE* stream = std::fopen(file.file_name, "wb");
-  if (stream == nullptr) return fail(PF_OPENFAIL, file.file_name);
-  adopt_stream(file, stream);
+  adopt_stream(file, nullptr);
+  adopt_stream(file, std::fopen(file.file_name, "wb"));
+  if (file.fp == nullptr) return fail(PF_OPENFAIL, file.file_name);
   return write_elements(file, file.fp, file.file_name);
 }
 

@@ -1,0 +1,269 @@
+// The directory: random operations against a plain model, and the statuses of each.
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <cstdlib>
+#include <functional>
+#include <random>
+#include <vector>
+
+#include "core/directory.h"
+#include "core/file.h"
+#include "core/library.h"
+#include "support/error_texts.h"
+#include "support/list_check.h"
+#include "support/table_check.h"
+#include "support/temp_dir.h"
+
+namespace {
+
+struct Element {
+  std::string name, desc;
+  bool operator==(const Element&) const = default;
+};
+
+class DirectoryTest : public testing::Test {
+ protected:
+  DirectoryTest() {
+    TEV8R1_PF_init();
+    EXPECT_EQ(TEV8R1_PF_open((dir_ / "file").c_str()), PF_NEWFILE);
+    set_error_texts();
+  }
+  ~DirectoryTest() override { TEV8R1_PF_close(0); }
+
+  static TEVPF_FILE& file() { return *tevpf::library.current_file; }
+
+  TempDir dir_;
+};
+
+// The two kinds of elements through one set of operations.
+struct Kind {
+  std::int32_t type;
+  const char* word;
+  TEVPF_STATUS (*copy)(const char*, const char*);
+  TEVPF_STATUS (*remove)(const char*);
+  TEVPF_STATUS (*check_unique)(const char*);
+
+  TEVPF_STATUS create(const std::string& name, const std::string& desc = "") const {
+    return TEV8R1_PF_create_elem(name.c_str(), desc.c_str(), type);
+  }
+  // The element's position in the directory, through both lookups; -1 when there is none.
+  std::int32_t find(const std::string& name) const {
+    std::int32_t pos = -1;
+    TEVPF_LIST* list = nullptr;
+    TEVPF_TABLE* table = nullptr;
+    if (type == PF_ELEM_LIST) {
+      if (TEV8R1_get_list_ptr(name.c_str(), &list) == PF_NORMAL)
+        EXPECT_EQ(TEV8R1_get_list_array_pos(list, &pos), PF_NORMAL);
+    } else if (TEV8R1_get_table_ptr(name.c_str(), &table) == PF_NORMAL) {
+      EXPECT_EQ(TEV8R1_get_table_array_pos(table, &pos), PF_NORMAL);
+    }
+    return pos;
+  }
+};
+const Kind kKinds[] = {
+    {PF_ELEM_LIST, "list", TEV8R1_PF_copy_list, TEV8R1_PF_delete_list, TEV8R1_check_list_unique},
+    {PF_ELEM_TABLE, "table", TEV8R1_PF_copy_table, TEV8R1_PF_delete_table,
+     TEV8R1_check_table_unique}};
+
+// The directory as the file's record has it; checks every record on the way.
+template <class Record>
+std::vector<Element> elements(Record* const* records, std::int32_t count) {
+  using tevpf_test::broken_rule;
+  std::vector<Element> found;
+  for (std::int32_t i = 0; i < count; ++i) {
+    EXPECT_STREQ(broken_rule(*records[i]), nullptr);
+    found.push_back({records[i]->header.elem_name, records[i]->header.elem_desc});
+  }
+  return found;
+}
+
+// One random operation on the model and on the library: they must agree on whether it is done.
+class Model {
+ public:
+  explicit Model(unsigned seed) : random_(seed) {}
+
+  void step() {
+    const std::size_t k = pick(2);
+    const Kind& kind = kKinds[k];
+    std::vector<Element>& model = elements_[k];
+    const std::string name = some_name(), other = some_name();
+    const auto at = find(model, name), at_other = find(model, other);
+    const bool known = at != model.end(), taken = at_other != model.end();
+    switch (pick(8)) {
+      case 0:
+      case 1:
+      case 2:
+        EXPECT_EQ(kind.create(name, "first"), known ? PF_DUPLICATE : PF_NORMAL);
+        if (!known) model.push_back({name, "first"});
+        break;
+      case 3:
+        EXPECT_EQ(kind.remove(name.c_str()), known ? PF_NORMAL : PF_NOELEM);
+        if (known) model.erase(at);
+        break;
+      case 4:
+        EXPECT_EQ(TEV8R1_modify_elem_name(kind.type, name.c_str(), other.c_str()),
+                  name == other ? PF_NORMAL
+                  : taken       ? PF_DUPLICATE
+                  : known       ? PF_NORMAL
+                                : PF_NOELEM);
+        if (known && !taken) at->name = other;
+        break;
+      case 5:
+        EXPECT_EQ(TEV8R1_modify_elem_desc(kind.type, name.c_str(), other.c_str()),
+                  known ? PF_NORMAL : PF_NOELEM);
+        if (known) at->desc = other;
+        break;
+      case 6:
+        EXPECT_EQ(kind.copy(name.c_str(), other.c_str()), !known  ? PF_NOELEM
+                                                          : taken ? PF_DUPLICATE
+                                                                  : PF_NORMAL);
+        if (known && !taken) model.push_back({other, Element(*at).desc});
+        break;
+      default:
+        EXPECT_EQ(kind.find(name), known ? at - model.begin() : -1);
+    }
+  }
+
+  void compare(const TEVPF_FILE& file) const {
+    ASSERT_EQ(elements(file.list_ptr, file.num_lists), elements_[0]);
+    ASSERT_EQ(elements(file.table_ptr, file.num_tables), elements_[1]);
+    EXPECT_LE(file.num_lists + file.free_lists, file.list_room);
+    EXPECT_LE(file.num_tables + file.free_tables, file.table_room);
+  }
+
+ private:
+  std::size_t pick(std::size_t n) { return random_() % n; }
+  // From few names, so that they meet; now some, now so many that they are hashed.
+  std::string some_name() { return "N" + std::to_string(pick(pick(3) == 0 ? 10 : 300)); }
+  static std::vector<Element>::iterator find(std::vector<Element>& model, const std::string& name) {
+    return std::find_if(model.begin(), model.end(),
+                        [&](const Element& e) { return e.name == name; });
+  }
+
+  std::mt19937 random_;
+  std::vector<Element> elements_[2];
+};
+
+TEST_F(DirectoryTest, AgreesWithAPlainModel) {
+  constexpr unsigned kSeed = 20260;
+  SCOPED_TRACE(kSeed);
+  Model model(kSeed);
+  for (int i = 0; i < 6000 && !HasFailure(); ++i) {
+    model.step();
+    if (i % 7 == 0) model.compare(file());
+    if (i % 1500 != 1499) continue;
+    ASSERT_EQ(TEV8R1_PF_close(1), PF_NORMAL);
+    ASSERT_EQ(TEV8R1_PF_open((dir_ / "file").c_str()), PF_NORMAL);
+    model.compare(file());
+  }
+  EXPECT_GT(file().num_lists, 16);  // names were hashed
+}
+
+TEST_F(DirectoryTest, NamesAreCutAndComparedAsTheyAreKept) {
+  const std::string kept(19, 'k'), longer = kept + "more", alike = kept + "other";
+  for (const Kind& kind : kKinds) {
+    const std::string word = kind.word;
+    EXPECT_EQ(kind.create(longer, std::string(90, 'd')), PF_NORMAL);
+    EXPECT_EQ(kind.find(kept), 0);
+    EXPECT_EQ(kind.find(longer), -1);
+    EXPECT_EQ(error_texts(), (ErrorTexts{word, longer}));
+    EXPECT_EQ(kind.create(alike), PF_DUPLICATE);
+    EXPECT_EQ(error_texts(), (ErrorTexts{word + " " + kept, "the file"}));
+    EXPECT_EQ(kind.check_unique(alike.c_str()), PF_DUPLICATE);
+    EXPECT_EQ(error_texts(), (ErrorTexts{word + " " + alike, "the file"}));
+    EXPECT_EQ(kind.copy(kept.c_str(), alike.c_str()), PF_DUPLICATE);
+    EXPECT_EQ(error_texts(), (ErrorTexts{word + " " + alike, "the file"}));
+    EXPECT_EQ(TEV8R1_modify_elem_name(kind.type, "nobody", alike.c_str()), PF_DUPLICATE);
+    set_error_texts();
+    EXPECT_EQ(TEV8R1_modify_elem_name(kind.type, longer.c_str(), alike.c_str()), PF_NORMAL);
+    EXPECT_EQ(TEV8R1_modify_elem_name(7, longer.c_str(), alike.c_str()), PF_NORMAL);
+    EXPECT_EQ(error_texts(), kUntouched);
+    EXPECT_EQ(kind.create(""), PF_NORMAL);
+    EXPECT_EQ(kind.find(""), 1);
+  }
+  EXPECT_EQ(file().list_ptr[0]->header.elem_desc, std::string(79, 'd'));
+  // What stands behind a terminator is zero.
+  EXPECT_EQ(TEV8R1_modify_elem_name(PF_ELEM_LIST, kept.c_str(), "x"), PF_NORMAL);
+  const char* name = file().list_ptr[0]->header.elem_name;
+  EXPECT_EQ(std::string(name, TEVPF_NAME_SIZE), "x" + std::string(19, '\0'));
+}
+
+TEST_F(DirectoryTest, RefusalsSayWhyAndChangeNothing) {
+  ASSERT_EQ(TEV8R1_PF_create_elem("A", "a", PF_ELEM_LIST), PF_NORMAL);
+  struct Case {
+    const char* label;
+    std::function<TEVPF_STATUS()> call;
+    TEVPF_STATUS status;
+    ErrorTexts texts;
+  };
+  TEVPF_LIST* list = nullptr;
+  std::int32_t pos = 7;
+  const Case cases[] = {
+      {"blank", [] { return TEV8R1_PF_create_elem(" x", "", 3); }, PF_BADNAME, kEmpty},
+      {"type",
+       [] { return TEV8R1_PF_create_elem("x", "", 3); },
+       PF_BADTYPE,
+       {"function call ", "3"}},
+      {"rename blank", [] { return TEV8R1_modify_elem_name(3, "x", " y"); }, PF_BADNAME, kEmpty},
+      {"rename type",
+       [] { return TEV8R1_modify_elem_name(-1, "x", "y"); },
+       PF_BADTYPE,
+       {"function call", "-1"}},
+      {"rename",
+       [] { return TEV8R1_modify_elem_name(PF_ELEM_TABLE, "A", "B"); },
+       PF_NOELEM,
+       {"table", "A"}},
+      {"describe type",
+       [] { return TEV8R1_modify_elem_desc(0, "A", "B"); },
+       PF_BADTYPE,
+       {"function call", "0"}},
+      {"describe",
+       [] { return TEV8R1_modify_elem_desc(PF_ELEM_LIST, "a", "B"); },
+       PF_NOELEM,
+       {"list", "a"}},
+      {"copy blank", [] { return TEV8R1_PF_copy_list("A", " x"); }, PF_BADNAME, kUntouched},
+      {"copy", [] { return TEV8R1_PF_copy_list("B", " x"); }, PF_NOELEM, {"list", "B"}},
+      {"delete", [] { return TEV8R1_PF_delete_table("A"); }, PF_NOELEM, {"table", "A"}},
+      {"find", [&] { return TEV8R1_get_list_ptr("A ", &list); }, PF_NOELEM, {"list", "A "}},
+      {"position", [&] { return TEV8R1_get_list_array_pos(nullptr, &pos); }, PF_NOELEM, kUntouched},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.label);
+    set_error_texts();
+    EXPECT_EQ(c.call(), c.status);
+    EXPECT_EQ(error_texts(), c.texts);
+    EXPECT_EQ(elements(file().list_ptr, file().num_lists), (std::vector<Element>{{"A", "a"}}));
+    EXPECT_EQ(file().num_tables, 0);
+  }
+  EXPECT_EQ(list, nullptr);
+  EXPECT_EQ(pos, 7);
+}
+
+TEST_F(DirectoryTest, SlotsAreCountedInHundreds) {
+  for (int i = 0; i < 201; ++i) {
+    EXPECT_EQ(file().free_lists, i == 0 ? 0 : (100 - i % 100) % 100);
+    ASSERT_EQ(kKinds[0].create("L" + std::to_string(i)), PF_NORMAL);
+  }
+  EXPECT_EQ(file().free_lists, 99);
+}
+
+// Lookups remember the last element found, but only in their own file and as long as it lives.
+TEST_F(DirectoryTest, AnAnswerIsNeverStale) {
+  ASSERT_EQ(kKinds[0].create("A", "mine"), PF_NORMAL);
+  EXPECT_EQ(kKinds[0].find("A"), 0);
+  EXPECT_EQ(file().last_list, file().list_ptr[0]);
+  ASSERT_EQ(TEV8R1_PF_open((dir_ / "other").c_str()), PF_NEWFILE);
+  EXPECT_EQ(kKinds[0].find("A"), -1);
+  ASSERT_EQ(TEV8R1_PF_close(0), PF_NORMAL);
+  EXPECT_EQ(kKinds[0].find("A"), 0);
+  ASSERT_EQ(kKinds[0].create("B"), PF_NORMAL);
+  ASSERT_EQ(TEV8R1_PF_delete_list("B"), PF_NORMAL);
+  EXPECT_EQ(file().last_list, nullptr);
+  EXPECT_EQ(kKinds[0].find("A"), 0);
+  ASSERT_EQ(TEV8R1_modify_elem_name(PF_ELEM_LIST, "A", "C"), PF_NORMAL);
+  EXPECT_EQ(kKinds[0].find("A"), -1);
+  EXPECT_EQ(kKinds[0].find("C"), 0);
+}
+
+}  // namespace
