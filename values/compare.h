@@ -38,11 +38,15 @@ class NumberKey {
     return compare_numbers(load<T>(place), key_, tolerance_);
   }
   bool is_above(const unsigned char* place) const noexcept { return load<T>(place) < key_; }
+  // compare() == 0 in fewer steps.
   bool equals(const unsigned char* place) const noexcept {
+    const T value = load<T>(place);
     if constexpr (kIsFloating<T>) {
-      return compare(place) == 0;
+      if (!(tolerance_ >= 0)) return compare(place) == 0;
+      const double x = value, y = key_;
+      return !((x - tolerance_ > y) | (x + tolerance_ < y));
     } else {
-      return load<T>(place) == key_;
+      return value == key_;
     }
   }
 
@@ -80,10 +84,10 @@ class TextKey {
   explicit TextKey(const void* key) noexcept
       : pattern_(make_pattern(static_cast<const char*>(key))) {
     // Of a prefix only its own bytes are compared, of a text the terminator too.
-    const bool short_prefix = pattern_.prefix && pattern_.length < kHeadSize;
-    if (short_prefix) head_mask_ = ~(~std::uint64_t{0} >> (8 * pattern_.length));
+    const std::size_t compared = pattern_.length + (pattern_.prefix ? 0 : 1);
+    if (compared < kHeadSize) head_mask_ = ~(~std::uint64_t{0} >> (8 * compared));
     head_ = text_head(static_cast<const unsigned char*>(key)) & head_mask_;
-    has_rest_ = !short_prefix && pattern_.length >= kHeadSize;
+    has_rest_ = compared > kHeadSize;
     if (!has_rest_) return;
     pattern_.text += kHeadSize;
     pattern_.length -= kHeadSize;
@@ -93,11 +97,23 @@ class TextKey {
     const std::uint64_t head = (kWide ? wide_text_head(place) : text_head(place)) & head_mask_;
     if (head != head_) return head < head_ ? -1 : 1;
     if (!has_rest_) return 0;
-    return compare_text(reinterpret_cast<const char*>(place) + kHeadSize, pattern_);
+    return compare_rest(place);
   }
-  bool equals(const unsigned char* place) const noexcept { return compare(place) == 0; }
+  // compare() == 0: without the order, what stands behind a terminator need not be cut off.
+  bool equals(const unsigned char* place) const noexcept {
+    if constexpr (kWide) {
+      if (((__builtin_bswap64(load<std::uint64_t>(place)) ^ head_) & head_mask_) != 0) return false;
+      return !has_rest_ || compare_rest(place) == 0;
+    } else {
+      return compare(place) == 0;
+    }
+  }
 
  private:
+  int compare_rest(const unsigned char* place) const noexcept {
+    return compare_text(reinterpret_cast<const char*>(place) + kHeadSize, pattern_);
+  }
+
   TextPattern pattern_;  // what follows the head
   bool has_rest_;        // false: the head says it all
   std::uint64_t head_;
