@@ -8,7 +8,7 @@ namespace bench {
 
 namespace {
 
-void write_all(const std::string& path, const std::vector<char>& bytes, bool sync) {
+void write_all(const std::string& path, std::span<const char> bytes, bool sync) {
   const int fd = open(path.c_str(), O_WRONLY | O_CREAT | O_TRUNC, 0644);
   std::size_t done = 0;
   while (done < bytes.size()) {
@@ -22,11 +22,11 @@ void write_all(const std::string& path, const std::vector<char>& bytes, bool syn
 
 }  // namespace
 
-void write_plainly(const std::string& path, const std::vector<char>& bytes) {
+void write_plainly(const std::string& path, std::span<const char> bytes) {
   write_all(path, bytes, false);
 }
 
-void write_and_sync(const std::string& path, const std::vector<char>& bytes) {
+void write_and_sync(const std::string& path, std::span<const char> bytes) {
   write_all(path, bytes, true);
 }
 

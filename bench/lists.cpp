@@ -428,16 +428,40 @@ void open_one(benchmark::State& state) {
 
 template <int Params>
 void save_many_ours(benchmark::State& state) {
-  OpenFile file;
-  const std::vector<std::string> all = names(Params);
-  for (std::int64_t list = 0; list < state.range(0); ++list) {
-    fill_list(("list_" + std::to_string(list)).c_str(), all);
-  }
+  const std::string source = saved_lists(state.range(0), Params);
   const std::string path = folder().file("saved.pf");
+  MUST(TEV8R1_PF_open(source.c_str()));
   for (auto _ : state) {
     std::filesystem::remove(path);
     const Timer timer;
     MUST(TEV8R1_PF_save(path.c_str()));
+    timer.stop(state, state.range(0));
+  }
+  MUST(TEV8R1_PF_close(0));
+}
+
+template <int Params>
+void save_many_sqlite(benchmark::State& state) {
+  Database db;
+  fill_database(db, names(Params), state.range(0));
+  const std::string path = folder().file("saved.db");
+  for (auto _ : state) {
+    std::filesystem::remove(path);
+    const Timer timer;
+    const Database to(path);
+    backup(db, to);
+    timer.stop(state, state.range(0));
+  }
+}
+
+template <int Params>
+void save_many_limit(benchmark::State& state) {
+  const std::vector<char> bytes = contents(saved_lists(state.range(0), Params));
+  const std::string path = folder().file("saved.pf");
+  for (auto _ : state) {
+    std::filesystem::remove(path);
+    const Timer timer;
+    write_plainly(path, bytes);
     timer.stop(state, state.range(0));
   }
 }
@@ -469,7 +493,11 @@ const int registered = [] {
   add("open lists of 50", "sqlite", open_many<open_sqlite, 50>, {10'000});
   add("open lists of 50", "limit: read", open_many<open_limit, 50>, {10'000});
   add("save lists of 5", "tevpf", save_many_ours<5>, {100'000});
+  add("save lists of 5", "sqlite", save_many_sqlite<5>, {100'000});
+  add("save lists of 5", "limit: write", save_many_limit<5>, {100'000});
   add("save lists of 50", "tevpf", save_many_ours<50>, {10'000});
+  add("save lists of 50", "sqlite", save_many_sqlite<50>, {10'000});
+  add("save lists of 50", "limit: write", save_many_limit<50>, {10'000});
   return 0;
 }();
 

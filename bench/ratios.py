@@ -4,7 +4,7 @@
     ratios.py RESULT.json            the table, as Markdown, on standard output
     ratios.py RESULT.json --plots D  SVG plots of time per operation against n, one a workload, in D
 
-A ratio above 1 against a peer: the library is faster by that factor. Against a limit (the plain thing
+A factor above 1 against a peer: the library is faster by it. Against a limit (the plain thing
 without a library) the figure is how many times the limit's time the library takes.
 """
 import json
@@ -40,22 +40,79 @@ def nice(ns):
     return f"{ns:.3g} ns" if ns < 1e3 else f"{ns / 1e3:.3g} us" if ns < 1e6 else f"{ns / 1e6:.3g} ms"
 
 
+# What is wanted: the factor against each peer and the multiple of the limit's time, by n; a key of 0
+# holds for every n that is not named, and nothing is wanted where neither is there.
+PEER = {
+    "list add": {1_000: 4, 10_000: 3},
+    "list look up": {0: 3},
+    "list change": {0: 3},
+    "list walk": {0: 15},
+    "list save": {0: {"json": 4, "sqlite": 2}},
+    "list open": {0: 15},
+    "open lists of 5": {0: 4},
+    "open lists of 50": {0: 4},
+    "table append in order": {1_000: 6, 10_000: 6},
+    "table append at random": {1_000: 4, 10_000: 2.5},
+    "table append few values": {1_000: 5, 10_000: 5},
+    "table read in index order": {0: 30},
+    "table find indexed": {1_000: 8, 0: 4},
+    "table find unindexed": {0: 30},
+    "table save": {100_000: 1.5, 1_000_000: 1.5},
+    "table open": {0: 15},
+    "table dump": {0: 3},
+    "table listing": {0: 3},
+}
+LIMIT = {
+    "list look up": {0: 1},
+    "list change": {0: 1},
+    "list walk": {0: 2},
+    "list save": {100_000: 2, 1_000_000: 2},
+    "list open": {0: 5},
+    "open lists of 5": {0: 5},
+    "open lists of 50": {0: 5},
+    "table read in index order": {0: 3},
+    "table find indexed": {10_000: 2.5, 100_000: 2.5, 1_000_000: 2.5},
+    "table find unindexed": {0: 1.5},
+    "table save": {0: 1.4},
+    "table save in place": {0: 1.4},
+    "table open": {0: 1.5},
+    "table dump": {0: 0.5},
+    "table listing": {0: 0.5},
+}
+
+
+def target(table, workload, n, contestant):
+    wanted = table.get(workload, {})
+    wanted = wanted.get(n, wanted.get(0))
+    return wanted.get(contestant) if isinstance(wanted, dict) else wanted
+
+
+def judged(ratio, text, wanted, met):
+    if wanted is None:
+        return f"{ratio:.2f}x {text}"
+    figure = f"{ratio:.2f}x {text}" if met else f"**{ratio:.2f}x** {text}"
+    return f"{figure} (wanted {wanted:g})"
+
+
 def print_table(context, table):
-    print(f"{context['date'][:10]}, {context['num_cpus']} x {context['mhz_per_cpu']} MHz, "
-          f"benchmark library built as {context['library_build_type']}\n")
-    print("| workload | n | per operation | against the peers | against the limit |")
+    print(f"{context['date'][:10]}, {context['num_cpus']} x {context['mhz_per_cpu']} MHz. Bold: short of what is wanted.\n")
+    print("| workload | n | per operation | times as fast as | times the time of |")
     print("|---|---|---|---|---|")
-    for workload, contestants in table.items():
+    for workload in sorted(table):
+        contestants = table[workload]
         for n in sorted(contestants["tevpf"]):
             ours = contestants["tevpf"][n]
             peers, limits = [], []
-            for name, times in contestants.items():
-                if name == "tevpf" or n not in times:
+            for name in sorted(contestants):
+                if name == "tevpf" or n not in contestants[name]:
                     continue
+                theirs = contestants[name][n]
                 if name.startswith("limit: "):
-                    limits.append(f"{ours / times[n]:.2f}x the time of {name[7:]}")
+                    wanted = target(LIMIT, workload, n, name)
+                    limits.append(judged(ours / theirs, name[7:], wanted, wanted is None or ours / theirs <= wanted))
                 else:
-                    peers.append(f"{times[n] / ours:.2f}x {name}")
+                    wanted = target(PEER, workload, n, name)
+                    peers.append(judged(theirs / ours, name, wanted, wanted is None or theirs / ours >= wanted))
             print(f"| {workload} | {short(n)} | {nice(ours)} | {', '.join(peers)} | {', '.join(limits)} |")
 
 
