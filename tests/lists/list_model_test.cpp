@@ -50,6 +50,33 @@ bool matches(const std::string& name, const std::string& wanted) {
 class ListModel : public TempFileTest {
  protected:
   void run(unsigned seed, int steps) {
+    using M = ListModel;
+    static constexpr void (M::*operations[])() = {&M::add,
+                                                  &M::add,
+                                                  &M::add,
+                                                  &M::add,
+                                                  &M::add,
+                                                  &M::remove,
+                                                  &M::redefine,
+                                                  &M::redefine,
+                                                  &M::rename,
+                                                  &M::move,
+                                                  &M::change_value,
+                                                  &M::change_value,
+                                                  &M::get_value,
+                                                  &M::next_value,
+                                                  &M::next_def,
+                                                  &M::previous_def,
+                                                  &M::def_by_name,
+                                                  &M::def_by_position,
+                                                  &M::sizes,
+                                                  &M::inquire,
+                                                  &M::set_cursor,
+                                                  &M::reset,
+                                                  &M::inquire_default,
+                                                  &M::set_default,
+                                                  &M::replace_by_copy,
+                                                  &M::reopen};
     random_.seed(seed);
     lists_.clear();
     for (const char* name : {"alpha", "beta"}) {
@@ -60,10 +87,10 @@ class ListModel : public TempFileTest {
     for (int step = 0; step < steps; ++step) {
       name_ = chance(2) ? "alpha" : "beta";
       model_ = &lists_[name_];
-      const Operation& operation = kOperations[below(std::size(kOperations))];
-      SCOPED_TRACE("seed " + std::to_string(seed) + ", step " + std::to_string(step) + ": " +
-                   operation.name + " in " + name_);
-      (this->*operation.run)();
+      const std::size_t operation = below(std::size(operations));
+      SCOPED_TRACE("seed " + std::to_string(seed) + ", step " + std::to_string(step) +
+                   ", operation " + std::to_string(operation) + " in " + name_);
+      (this->*operations[operation])();
       for (auto& [name, model] : lists_) compare(name, model);
       if (HasFailure()) return;
     }
@@ -72,12 +99,6 @@ class ListModel : public TempFileTest {
   int tables_seen_ = 0;
 
  private:
-  struct Operation {
-    const char* name;
-    void (ListModel::*run)();
-  };
-  static const Operation kOperations[26];
-
   // ---- chance
 
   std::size_t below(std::size_t n) {
@@ -197,6 +218,10 @@ class ListModel : public TempFileTest {
     std::vector<char> wanted(value.size());
     TEV8R1_load_param_value(&c, wanted.data());
     EXPECT_EQ(value, wanted);
+  }
+  std::vector<char> buffer_for_value(std::int32_t position) {
+    return std::vector<char>(
+        static_cast<std::size_t>(position < 0 ? 1 : value_size(model_->at(position))));
   }
   DefBuffers buffers_for(std::int32_t position) {
     const Def def = position >= 0 && position < model_->count() ? model_->at(position) : Def{};
@@ -348,28 +373,19 @@ class ListModel : public TempFileTest {
     std::int32_t type = -1, value = -1, description = -1;
     const std::string name = known_name();
     std::int32_t position = any_position();
-    switch (below(3)) {
-      case 0:
-        position = find(name);
-        expect(TEV8R1_PF_inq_param_size(list_name(), name.c_str(), &type, &value, &description),
-               position < 0 ? PF_NOPARAM : PF_NORMAL);
-        break;
-      case 1:
-        if (check_position(position) != PF_NORMAL) {
-          expect(
-              TEV8R1_PF_inq_param_size_by_pos(list_name(), position, &type, &value, &description),
-              PF_BADPOS);
-          position = -1;
-        } else {
-          expect(
-              TEV8R1_PF_inq_param_size_by_pos(list_name(), position, &type, &value, &description),
-              PF_NORMAL);
-        }
-        break;
-      default:
-        position = next();
-        expect(TEV8R1_PF_inq_next_param_size(list_name(), &type, &value, &description),
-               position < 0 ? PF_NOMORE : PF_NORMAL);
+    if (chance(3)) {
+      position = find(name);
+      expect(TEV8R1_PF_inq_param_size(list_name(), name.c_str(), &type, &value, &description),
+             position < 0 ? PF_NOPARAM : PF_NORMAL);
+    } else if (chance(2)) {
+      const TEVPF_STATUS expected = check_position(position);
+      expect(TEV8R1_PF_inq_param_size_by_pos(list_name(), position, &type, &value, &description),
+             expected);
+      if (expected != PF_NORMAL) position = -1;
+    } else {
+      position = next();
+      expect(TEV8R1_PF_inq_next_param_size(list_name(), &type, &value, &description),
+             position < 0 ? PF_NOMORE : PF_NORMAL);
     }
     EXPECT_EQ(type, position < 0 ? -1 : model_->at(position).type);
     EXPECT_EQ(value, position < 0 ? -1 : value_size(model_->at(position)));
@@ -447,35 +463,6 @@ class ListModel : public TempFileTest {
   std::string name_;
   ModelList* model_ = nullptr;
   ErrorTexts texts_;
-};
-
-const ListModel::Operation ListModel::kOperations[26] = {
-    {"add", &ListModel::add},
-    {"add", &ListModel::add},
-    {"add", &ListModel::add},
-    {"add", &ListModel::add},
-    {"add", &ListModel::add},
-    {"delete", &ListModel::remove},
-    {"redefine", &ListModel::redefine},
-    {"redefine", &ListModel::redefine},
-    {"rename", &ListModel::rename},
-    {"move", &ListModel::move},
-    {"change value", &ListModel::change_value},
-    {"change value", &ListModel::change_value},
-    {"get value", &ListModel::get_value},
-    {"next value", &ListModel::next_value},
-    {"next definition", &ListModel::next_def},
-    {"previous definition", &ListModel::previous_def},
-    {"definition by name", &ListModel::def_by_name},
-    {"definition by position", &ListModel::def_by_position},
-    {"sizes", &ListModel::sizes},
-    {"inquiries", &ListModel::inquire},
-    {"set cursor", &ListModel::set_cursor},
-    {"reset cursor", &ListModel::reset},
-    {"inquire default", &ListModel::inquire_default},
-    {"set default", &ListModel::set_default},
-    {"replace by copy", &ListModel::replace_by_copy},
-    {"save and reopen", &ListModel::reopen},
 };
 
 TEST_F(ListModel, RandomSequences) {

@@ -3,6 +3,7 @@
 #include <cfloat>
 #include <climits>
 #include <cstring>
+#include <map>
 #include <string>
 #include <vector>
 
@@ -15,101 +16,94 @@ namespace {
 constexpr TEVPF_STATUS kLess = static_cast<TEVPF_STATUS>(-1);
 constexpr double kBefore = -7;  // what stands in the destination before a conversion
 
-struct Conversion {
-  std::int32_t type;
-  std::string text;
-  TEVPF_STATUS status;
-  double value;        // on success
-  std::string word{};  // on failure: err_value
-};
-
 // Converts at an odd address, as in a row, and gives back what stands there afterwards.
-double convert(const Conversion& c, TEVPF_STATUS& status) {
-  return tevpf::with_number(c.type, [&](auto tag) {
+double convert(std::int32_t type, const std::string& text, TEVPF_STATUS& status) {
+  return tevpf::with_number(type, [&](auto tag) {
     using T = decltype(tag);
     char place[sizeof(T) + 1];
     tevpf::store(place + 1, static_cast<T>(kBefore));
-    status = TEV8R1_from_char(c.type, c.text.c_str(), place + 1);
+    status = TEV8R1_from_char(type, text.c_str(), place + 1);
     return static_cast<double>(tevpf::load<T>(place + 1));
   });
 }
 
-TEST(Convert, TextToNumbers) {
-  const std::string digits300(300, '9');
-  const std::vector<Conversion> cases = {
-      {PF_TYPE_INT, "2147483647", PF_NORMAL, 2147483647},
-      {PF_TYPE_INT, "-2147483648", PF_NORMAL, -2147483648.0},
-      {PF_TYPE_INT, "+2147483647", PF_NORMAL, 2147483647},
-      {PF_TYPE_INT, "2147483648", PF_RANGE, 0},
-      {PF_TYPE_INT, "+2147483648", PF_RANGE, 0},
-      {PF_TYPE_INT, "-2147483649", PF_RANGE, 0},
-      {PF_TYPE_INT, "00000000001", PF_RANGE, 0},
-      {PF_TYPE_INT, "0000000001", PF_NORMAL, 1},
-      {PF_TYPE_INT, "-0000000001", PF_NORMAL, -1},
-      {PF_TYPE_INT, "-00000000001", PF_RANGE, 0},
-      {PF_TYPE_INT, " -123456789", PF_RANGE, 0},
-      {PF_TYPE_INT, " \t123", PF_NORMAL, 123},
-      {PF_TYPE_INT, "", PF_NORMAL, 0},
-      {PF_TYPE_INT, " ", PF_BADARG, 0, "integer"},
-      {PF_TYPE_INT, "-", PF_BADARG, 0, "integer"},
-      {PF_TYPE_INT, "12 ", PF_BADARG, 0, "integer"},
-      {PF_TYPE_INT, "12a", PF_BADARG, 0, "integer"},
-      {PF_TYPE_INT, "999999999999999999999x", PF_BADARG, 0, "integer"},
-      {PF_TYPE_INT, digits300, PF_RANGE, 0},
-      {PF_TYPE_SHORT, "32767", PF_NORMAL, 32767},
-      {PF_TYPE_SHORT, "-32768", PF_NORMAL, -32768},
-      {PF_TYPE_SHORT, "00000000000012", PF_NORMAL, 12},
-      {PF_TYPE_SHORT, "32768", PF_RANGE, 0},
-      {PF_TYPE_SHORT, "-99999999999999999999", PF_RANGE, 0},
-      {PF_TYPE_SHORT, "1.5", PF_BADARG, 0, "short"},
-      {PF_TYPE_SHORT, "", PF_NORMAL, 0},
-      {PF_TYPE_DOUBLE, " \v2.5", PF_NORMAL, 2.5},
-      {PF_TYPE_DOUBLE, "-.5e+1", PF_NORMAL, -5},
-      {PF_TYPE_DOUBLE, "+5.", PF_NORMAL, 5},
-      {PF_TYPE_DOUBLE, "0.1", PF_NORMAL, 0.1},
-      {PF_TYPE_DOUBLE, "1.7976931348623157e308", PF_NORMAL, DBL_MAX},
-      {PF_TYPE_DOUBLE, "2.2250738585072014e-308", PF_NORMAL, DBL_MIN},
-      {PF_TYPE_DOUBLE, "2.2250738585072011e-308", PF_RANGE, 0},
-      {PF_TYPE_DOUBLE, "0e-99999999999", PF_NORMAL, 0},
-      {PF_TYPE_DOUBLE, "", PF_NORMAL, kBefore},
-      {PF_TYPE_DOUBLE, "1e309", PF_RANGE, 0},
-      {PF_TYPE_DOUBLE, "-1e309x", PF_RANGE, 0},
-      {PF_TYPE_DOUBLE, "1e-400", PF_RANGE, 0},
-      {PF_TYPE_DOUBLE, "-1e-310 ", PF_RANGE, 0},
-      {PF_TYPE_DOUBLE, "1.5x", PF_BADARG, 0, "double"},
-      {PF_TYPE_DOUBLE, "1.5 ", PF_BADARG, 0, "double"},
-      {PF_TYPE_DOUBLE, "1e", PF_BADARG, 0, "double"},
-      {PF_TYPE_DOUBLE, "+-1", PF_BADARG, 0, "double"},
-      {PF_TYPE_DOUBLE, "- 1", PF_BADARG, 0, "double"},
-      {PF_TYPE_DOUBLE, ".", PF_BADARG, 0, "double"},
-      {PF_TYPE_DOUBLE, "   ", PF_BADARG, 0, "double"},
-      {PF_TYPE_DOUBLE, "inf", PF_BADARG, 0, "double"},
-      {PF_TYPE_DOUBLE, "-nan", PF_BADARG, 0, "double"},
-      {PF_TYPE_DOUBLE, "0x1p3", PF_BADARG, 0, "double"},
-      {PF_TYPE_DOUBLE, "1,5", PF_BADARG, 0, "double"},
-      {PF_TYPE_REAL, "3.4028234663852886e38", PF_NORMAL, FLT_MAX},
-      {PF_TYPE_REAL, "-3.4028234663852887e38", PF_NORMAL, -FLT_MAX},
-      {PF_TYPE_REAL, "3.5e38", PF_RANGE, 0},
-      {PF_TYPE_REAL, "1e309", PF_RANGE, 0},
-      {PF_TYPE_REAL, "1e-50", PF_NORMAL, 0},
-      {PF_TYPE_REAL, "0.1", PF_NORMAL, 0.1F},
-      {PF_TYPE_REAL, "", PF_NORMAL, 0},
-      {PF_TYPE_REAL, "abc", PF_BADARG, 0, "real"},
-      {PF_TYPE_REAL, "-3.5e38x", PF_BADARG, 0, "real"},
-      {PF_TYPE_DOUBLE, digits300 + digits300 + "x", PF_RANGE, 0},
+TEST(Convert, TextsThatAreNumbers) {
+  struct Number {
+    const char* text;
+    double value;
   };
-  for (const Conversion& c : cases) {
-    SCOPED_TRACE("type " + std::to_string(c.type) + ", text '" + c.text + "'");
-    set_error_texts();
-    TEVPF_STATUS status;
-    const double value = convert(c, status);
-    EXPECT_EQ(status, c.status);
-    if (c.status == PF_NORMAL) {
-      EXPECT_EQ(value, c.value);
+  const std::map<std::int32_t, std::vector<Number>> numbers = {
+      {PF_TYPE_INT,
+       {{"2147483647", INT_MAX},
+        {"-2147483648", INT_MIN},
+        {"+2147483647", INT_MAX},
+        {"0000000001", 1},
+        {"-0000000001", -1},
+        {" \t123", 123},
+        {"", 0}}},
+      {PF_TYPE_SHORT, {{"32767", 32767}, {"-32768", -32768}, {"00000000000012", 12}, {"", 0}}},
+      {PF_TYPE_DOUBLE,
+       {{" \v2.5", 2.5},
+        {"-.5e+1", -5},
+        {"+5.", 5},
+        {"0.1", 0.1},
+        {"1.7976931348623157e308", DBL_MAX},
+        {"2.2250738585072014e-308", DBL_MIN},
+        {"0e-99999999999", 0},
+        {"", kBefore}}},
+      {PF_TYPE_REAL,
+       {{"3.4028234663852886e38", FLT_MAX},
+        {"-3.4028234663852887e38", -FLT_MAX},
+        {"1e-50", 0},
+        {"0.1", 0.1F},
+        {"", 0}}},
+  };
+  for (const auto& [type, texts] : numbers) {
+    for (const Number& number : texts) {
+      set_error_texts();
+      TEVPF_STATUS status;
+      EXPECT_EQ(convert(type, number.text, status), number.value) << type << ' ' << number.text;
+      EXPECT_EQ(status, PF_NORMAL) << type << ' ' << number.text;
       EXPECT_EQ(error_texts(), kUntouched);
-    } else {
-      EXPECT_EQ(value, kBefore) << "a refused text leaves the destination as it was";
-      EXPECT_EQ(error_texts(), (ErrorTexts{c.text.substr(0, 256), c.word}));
+    }
+  }
+}
+
+TEST(Convert, TextsThatAreRefused) {
+  const std::string nines(300, '9');
+  const struct {
+    std::int32_t type;
+    TEVPF_STATUS status;
+    const char* err_value;
+    std::vector<std::string> texts;
+  } refusals[] = {
+      {PF_TYPE_INT,
+       PF_RANGE,
+       "",
+       {"2147483648", "+2147483648", "-2147483649", "00000000001", "-00000000001", " -123456789",
+        nines}},
+      {PF_TYPE_INT, PF_BADARG, "integer", {" ", "-", "12 ", "12a", "999999999999999999999x"}},
+      {PF_TYPE_SHORT, PF_RANGE, "", {"32768", "-32769", "-99999999999999999999"}},
+      {PF_TYPE_SHORT, PF_BADARG, "short", {"1.5", "32768x"}},
+      {PF_TYPE_DOUBLE,
+       PF_RANGE,
+       "",
+       {"1e309", "-1e309x", "1e-400", "-1e-310 ", "2.2250738585072011e-308", nines + nines + "x"}},
+      {PF_TYPE_DOUBLE,
+       PF_BADARG,
+       "double",
+       {"1.5x", "1.5 ", "1e", "+-1", "- 1", ".", "   ", "inf", "-nan", "0x1p3", "1,5"}},
+      {PF_TYPE_REAL, PF_RANGE, "", {"3.5e38", "-3.5e38", "1e309"}},
+      {PF_TYPE_REAL, PF_BADARG, "real", {"abc", "-3.5e38x", nines + "x"}},
+  };
+  for (const auto& refusal : refusals) {
+    for (const std::string& text : refusal.texts) {
+      SCOPED_TRACE("type " + std::to_string(refusal.type) + ", text '" + text + "'");
+      set_error_texts();
+      TEVPF_STATUS status;
+      EXPECT_EQ(convert(refusal.type, text, status), kBefore) << "the destination is as it was";
+      EXPECT_EQ(status, refusal.status);
+      EXPECT_EQ(error_texts(), (ErrorTexts{text.substr(0, 256), refusal.err_value}));
     }
   }
 }
