@@ -22,7 +22,7 @@ struct ValueType {
 
 // In the order of the type codes, from PF_TYPE_INT on.
 inline constexpr ValueType kValueTypes[] = {
-    {4, 4, 12, 8, "integer"}, {4, 4, 16, 12, "real"},  {0, 1, 4, 0, ""},
+    {4, 4, 12, 8, "integer"}, {4, 4, 16, 12, "real"}, {0, 1, 4, 0, ""},
     {8, 8, 28, 20, "double"}, {2, 2, 6, 4, "short"},
 };
 
