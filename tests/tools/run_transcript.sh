@@ -1,16 +1,22 @@
 #!/usr/bin/env bash
-# run_transcript.sh TRANSCRIPT TEVPF MAKE_PLANT: runs the lines of a transcript that start with "$ " in
-# an empty folder, and compares what they print, errors included, and their exit status with what
-# stands behind them. Lines that start with "# " are comments.
+# run_transcript.sh TRANSCRIPT PROGRAM...: runs the lines of a transcript that start with "$ " in an
+# empty folder, and compares what they print, errors included, and their exit status with what stands
+# behind them. Lines that start with "# " are comments. The programs are called by their file names.
+# Of a Markdown text the console blocks are run; they find the folder of examples beside the text.
 set -uo pipefail
 export LC_ALL=C.UTF-8
-transcript=$(realpath "$1") tevpf=$(realpath "$2") make_plant=$(realpath "$3")
+transcript=$(realpath "$1")
+for program in "${@:2}"; do PATH=$(dirname "$(realpath "$program")"):$PATH; done
 folder=$(mktemp -d)
-trap 'rm -rf "$folder" "$folder.actual"' EXIT
+trap 'rm -rf "$folder" "$folder".{expected,actual}' EXIT
 cd "$folder" || exit 1
 
-tevpf() { "$tevpf" "$@"; }
-make_plant() { "$make_plant" "$@"; }
+if [[ $transcript == *.md ]]; then
+  ln -s "$(dirname "$transcript")/examples" .
+  awk '/^```/ { inside = $0 == "```console"; next } inside' "$transcript"
+else
+  cat "$transcript"
+fi >"$folder.expected"
 
 while IFS= read -r line; do
   [[ $line == "# "* ]] && printf '%s\n' "$line"
@@ -19,5 +25,5 @@ while IFS= read -r line; do
   eval "${line#"$ "}" </dev/null 2>&1
   status=$?
   ((status == 0)) || echo "[exit $status]"
-done <"$transcript" >"$folder.actual"
-diff -u "$transcript" "$folder.actual"
+done <"$folder.expected" >"$folder.actual"
+diff -u "$folder.expected" "$folder.actual"
