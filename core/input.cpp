@@ -76,13 +76,6 @@ Input::Got Input::read_block(std::uint64_t bytes, Owned<unsigned char>& out) noe
   return Got::kAll;
 }
 
-const unsigned char* ByteReader::take(std::int64_t count) noexcept {
-  if (count < 0 || count > left()) return nullptr;
-  const unsigned char* part = next_;
-  next_ += count;
-  return part;
-}
-
 const char* ByteReader::take_text() noexcept {
   const void* terminator = std::memchr(next_, '\0', static_cast<std::size_t>(left()));
   if (terminator == nullptr) return nullptr;

@@ -56,7 +56,12 @@ class ByteReader {
   std::int64_t left() const noexcept { return end_ - next_; }
 
   // The next `count` bytes; null when there are not so many.
-  [[nodiscard]] const unsigned char* take(std::int64_t count) noexcept;
+  [[nodiscard]] const unsigned char* take(std::int64_t count) noexcept {
+    if (count < 0 || count > left()) return nullptr;
+    const unsigned char* part = next_;
+    next_ += count;
+    return part;
+  }
 
   // A text with its terminator; null when there is none before the end.
   [[nodiscard]] const char* take_text() noexcept;

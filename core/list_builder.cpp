@@ -55,12 +55,19 @@ Parsed parse_param(ByteReader& body, TEVPF_PARAM& param) noexcept {
   return Parsed::kWhole;
 }
 
-// Whether the parameters fill the body, up to the first one of an unknown type, whose size nobody knows.
-bool is_well_formed(ByteReader body, std::int32_t num_params) noexcept {
-  if (num_params > body.left() / kParamHead) return false;  // whatever their types
-  TEVPF_PARAM param;
-  for (std::int32_t i = 0; i < num_params; ++i) {
-    switch (parse_param(body, param)) {
+// The parameters of a body, while their texts still lie in it, and room for their index.
+struct StoredParams {
+  Owned<TEVPF_PARAM> records;
+  Owned<std::int32_t> index;
+  std::int32_t count = 0;
+  std::int32_t known = 0;  // those in front of the first one of an unknown type
+};
+
+// Takes the parameters off the body, up to the first one of an unknown type, whose size nobody knows.
+// False when they do not fill the body.
+bool parse_records(ByteReader body, StoredParams& params) noexcept {
+  for (; params.known < params.count; ++params.known) {
+    switch (parse_param(body, params.records[static_cast<std::size_t>(params.known)])) {
       case Parsed::kBroken:
         return false;
       case Parsed::kUnknownType:
@@ -72,18 +79,30 @@ bool is_well_formed(ByteReader body, std::int32_t num_params) noexcept {
   return body.left() == 0;
 }
 
-TEVPF_STATUS build_params(TEVPF_LIST& list, ByteReader body, std::int32_t num_params) noexcept {
-  for (std::int32_t i = 0; i < num_params; ++i) {
-    TEVPF_PARAM& param = list.param_ptr[i];
-    if (parse_param(body, param) == Parsed::kUnknownType) {
-      return fail(PF_BADTYPE, "parameter", Text(param.def.type));
-    }
-    std::int32_t bytes = 0;
-    PF_TRY(TEV8R1_construct_param(&param, &bytes));
-    list.header.btf += bytes;
-    list.num_params = i + 1;
+TEVPF_STATUS parse_params(const char* list_name, ByteReader body, std::int32_t count,
+                          StoredParams& params) noexcept {
+  if (count > body.left() / stored_size(kParamFields)) {  // whatever their types
+    return fail(PF_BADFORMAT, list_name);
   }
-  return PF_NORMAL;
+  params.count = count;
+  if (count > 0) {
+    params.records = new_array<TEVPF_PARAM>(static_cast<std::uint64_t>(count));
+    params.index = new_array<std::int32_t>(static_cast<std::uint64_t>(count));
+    if (!params.records || !params.index) return fail_empty(PF_NOMEM);
+  }
+  return parse_records(body, params) ? PF_NORMAL : fail(PF_BADFORMAT, list_name);
+}
+
+// Gives the parameters, as they were parsed, texts of their own and counts them.
+TEVPF_STATUS own_params(TEVPF_LIST& list, std::int32_t known, std::int32_t count) noexcept {
+  while (list.num_params < known) {
+    std::int32_t bytes = 0;
+    PF_TRY(TEV8R1_construct_param(&list.param_ptr[list.num_params], &bytes));
+    list.header.btf += bytes;
+    ++list.num_params;
+  }
+  if (known == count) return PF_NORMAL;
+  return fail(PF_BADTYPE, "parameter", Text(list.param_ptr[known].def.type));
 }
 
 // Reads the name index; `usable` when it is one.
@@ -103,25 +122,19 @@ TEVPF_STATUS build_list(TEVPF_ELEM_HEADER header, const void* body_bytes, Input&
   ByteReader body(body_bytes, header.btf);
   TEVPF_LIST head;
   unpack<kListFields>(body.take(kListHead), &head);
-  const std::int32_t num_params = std::max(head.num_params, 0);
-  if (!is_well_formed(body, num_params)) return fail(PF_BADFORMAT, header.elem_name);
+  StoredParams params;
+  PF_TRY(parse_params(header.elem_name, body, std::max(head.num_params, 0), params));
 
   header.btf = kListHead;
   TEVPF_LIST* list = nullptr;
   PF_TRY(TEV8R1_create_list(header, &list));
   std::memcpy(list->RESERVED, head.RESERVED, sizeof list->RESERVED);
-  if (num_params == 0) return PF_NORMAL;
-
-  const auto slots = static_cast<std::uint64_t>(num_params);
-  Owned<TEVPF_PARAM> params = new_array<TEVPF_PARAM>(slots);
-  Owned<std::int32_t> index = new_array<std::int32_t>(slots);
-  if (!params || !index) return fail_empty(PF_NOMEM);
-  list->param_ptr = params.release();
-  list->index_ptr = index.release();
-  list->param_room = num_params;
+  list->param_ptr = params.records.release();
+  list->index_ptr = params.index.release();
+  list->param_room = params.count;
 
   bool usable_index = false;
-  TEVPF_STATUS status = build_params(*list, body, num_params);
+  TEVPF_STATUS status = own_params(*list, params.known, params.count);
   if (status == PF_NORMAL) status = read_name_index(*list, input, usable_index);
   if (!usable_index) sort_names(list->param_ptr, list->num_params, list->index_ptr);
   return status;
