@@ -210,15 +210,15 @@ TEST_F(Rows, APatternIsADuplicateOfWhatItMatches) {
   EXPECT_REFUSED(TEV8R1_PF_set_dft_row("t", row.data()), PF_NORMAL, {"value A*", "column name"});
 }
 
-// Stored patterns stand in front of what they match and can part equal texts; what is nearby is still
-// found by single steps.
-TEST_F(Rows, StoredPatternsStandInFront) {
-  define({indexed(col("name", kText, 8))});
-  for (const char* text : {"A", "A*", "A", "A", "A"}) EXPECT_EQ(add_text(text), PF_NORMAL);
-  EXPECT_EQ(order(0), (Order{4, 3, 2, 1, 0}));
+// Stored patterns stand in front of what they match and can part equal texts: the first equal one is
+// that of the run which the probes hit.
+TEST(SearchTest, AStoredPatternPartsEqualTexts) {
+  const char rows[][3] = {"A", "A", "A*", "A", "A", "A", "A", "A"};
+  const std::int32_t index[] = {0, 1, 2, 3, 4, 5, 6, 7};
   std::int32_t pos = -1;
-  const TEVPF_TABLE& t = table();
-  EXPECT_EQ(search_index(t, t.col_array[0], 0, 5, "A", pos), PF_NORMAL);
+  EXPECT_EQ(TEV8R1_binary_search(PF_TYPE_STRING, 0, 8, 3, index, rows, "A", &pos), PF_NORMAL);
+  EXPECT_EQ(pos, 3);
+  EXPECT_EQ(TEV8R1_binary_search(PF_TYPE_STRING, 0, 8, 3, index, rows, "A*", &pos), PF_NORMAL);
   EXPECT_EQ(pos, 0);
 }
 
