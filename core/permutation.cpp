@@ -1,5 +1,7 @@
 #include "core/permutation.h"
 
+#include <cstring>
+
 #include "core/heap.h"
 
 namespace tevpf {
@@ -8,31 +10,37 @@ namespace {
 
 constexpr std::uint32_t kBits = 64;
 
-// One bit for each entry that was met.
-bool meets_each_once(const std::int32_t* entries, std::uint32_t count,
-                     std::uint64_t* met) noexcept {
+// n entries below n that reach every number are a permutation. For few: one bit a number.
+bool few_reach_all(const std::int32_t* entries, std::uint32_t count) noexcept {
+  std::uint64_t reached = 0;
   for (std::uint32_t i = 0; i < count; ++i) {
     const auto entry = static_cast<std::uint32_t>(entries[i]);  // a negative one is too large
     if (entry >= count) return false;
-    std::uint64_t& word = met[entry / kBits];
-    const std::uint64_t bit = std::uint64_t{1} << (entry % kBits);
-    if ((word & bit) != 0) return false;
-    word |= bit;
+    reached |= std::uint64_t{1} << entry;
   }
-  return true;
+  return reached == ~std::uint64_t{0} >> (kBits - count);
+}
+
+// One byte a number: a plain store for each entry, none of which waits for the one before, as it would
+// where neighbours share a word.
+bool reach_all(const std::int32_t* entries, std::uint32_t count, unsigned char* reached) noexcept {
+  for (std::uint32_t i = 0; i < count; ++i) {
+    const auto entry = static_cast<std::uint32_t>(entries[i]);
+    if (entry >= count) return false;
+    reached[entry] = 1;
+  }
+  return std::memchr(reached, 0, count) == nullptr;
 }
 
 }  // namespace
 
 std::optional<bool> is_permutation(const std::int32_t* entries, std::int32_t count) noexcept {
   const auto n = static_cast<std::uint32_t>(count);
-  if (n <= kBits) {  // most lists
-    std::uint64_t met = 0;
-    return meets_each_once(entries, n, &met);
-  }
-  Owned<std::uint64_t> met = new_zeroed<std::uint64_t>((std::uint64_t{n} + kBits - 1) / kBits);
-  if (!met) return std::nullopt;
-  return meets_each_once(entries, n, met.get());
+  if (n == 0) return true;
+  if (n <= kBits) return few_reach_all(entries, n);  // most lists
+  const Owned<unsigned char> reached = new_zeroed<unsigned char>(n);
+  if (!reached) return std::nullopt;
+  return reach_all(entries, n, reached.get());
 }
 
 }  // namespace tevpf
