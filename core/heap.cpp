@@ -4,6 +4,11 @@
 #include <cstdlib>
 #include <cstring>
 
+#ifdef __linux__
+#include <sys/mman.h>
+#include <unistd.h>
+#endif
+
 #include "core/status.h"
 
 namespace tevpf {
@@ -27,6 +32,20 @@ bool must_fail(std::uint64_t bytes) noexcept {
 constexpr bool must_fail(std::uint64_t) noexcept { return false; }
 #endif
 
+// Asks for a large block in large pages: fresh memory then costs one fault for 2 MB instead of 512, and
+// rows reached at random hardly ever miss in the address cache. Only a hint.
+void* in_large_pages(void* block, [[maybe_unused]] std::size_t bytes) noexcept {
+#ifdef __linux__
+  constexpr std::size_t kLarge = std::size_t{4} << 20;
+  if (block == nullptr || bytes < kLarge) return block;
+  static const auto page = static_cast<std::uintptr_t>(sysconf(_SC_PAGESIZE));
+  const std::uintptr_t first = (reinterpret_cast<std::uintptr_t>(block) + page - 1) & ~(page - 1);
+  const std::uintptr_t end = (reinterpret_cast<std::uintptr_t>(block) + bytes) & ~(page - 1);
+  (void)madvise(reinterpret_cast<void*>(first), end - first, MADV_HUGEPAGE);
+#endif
+  return block;
+}
+
 // Bytes of a block of count * size, at least one; 0 when no block can be that large.
 std::size_t block_bytes(std::uint64_t count, std::uint64_t size) noexcept {
   if (count == 0 || size == 0) return 1;
@@ -38,17 +57,18 @@ std::size_t block_bytes(std::uint64_t count, std::uint64_t size) noexcept {
 
 void* heap_alloc(std::uint64_t count, std::uint64_t size) noexcept {
   const std::size_t bytes = block_bytes(count, size);
-  return bytes == 0 || must_fail(bytes) ? nullptr : std::malloc(bytes);
+  return bytes == 0 || must_fail(bytes) ? nullptr : in_large_pages(std::malloc(bytes), bytes);
 }
 
 void* heap_zeroed(std::uint64_t count, std::uint64_t size) noexcept {
   const std::size_t bytes = block_bytes(count, size);
-  return bytes == 0 || must_fail(bytes) ? nullptr : std::calloc(bytes, 1);
+  return bytes == 0 || must_fail(bytes) ? nullptr : in_large_pages(std::calloc(bytes, 1), bytes);
 }
 
 void* heap_resize(void* block, std::uint64_t count, std::uint64_t size) noexcept {
   const std::size_t bytes = block_bytes(count, size);
-  return bytes == 0 || must_fail(bytes) ? nullptr : std::realloc(block, bytes);
+  return bytes == 0 || must_fail(bytes) ? nullptr
+                                        : in_large_pages(std::realloc(block, bytes), bytes);
 }
 
 char* heap_copy(const char* text) noexcept {
