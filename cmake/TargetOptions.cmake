@@ -33,6 +33,7 @@ function(tevpf_library_options target)
   target_compile_options(${target} PRIVATE
     $<$<COMPILE_LANGUAGE:CXX>:-fno-exceptions> $<$<COMPILE_LANGUAGE:CXX>:-fno-rtti>)
   if(NOT WIN32)
-    target_compile_options(${target} PRIVATE -fno-semantic-interposition)
+    # Calls of the library's own functions and of the C runtime take no detour.
+    target_compile_options(${target} PRIVATE -fno-semantic-interposition -fno-plt)
   endif()
 endfunction()

@@ -5,6 +5,7 @@
 
 #include "core/directory.h"
 #include "core/status.h"
+#include "core/text_field.h"
 #include "lists/list.h"
 #include "lists/name_index.h"
 #include "lists/param_record.h"

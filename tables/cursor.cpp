@@ -1,7 +1,5 @@
 #include "tables/cursor.h"
 
-#include <cstring>
-
 #include "core/directory.h"
 #include "core/status.h"
 #include "tables/column_index.h"
@@ -27,7 +25,7 @@ void fetch_ahead(const TEVPF_TABLE& table, std::int32_t position) noexcept {
 void deliver_row(TEVPF_TABLE& table, std::int32_t position, void* row_out) noexcept {
   fetch_ahead(table, position);
   const unsigned char* const row = row_at(table, row_at_position(table, position));
-  if (table.row_wid > 0) std::memcpy(row_out, row, static_cast<std::size_t>(table.row_wid));
+  copy_row_bytes(row_out, row, table.row_wid);
   table.cur_row = position;
   table.next_row = position + 1;
 }
