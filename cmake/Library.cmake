@@ -1,10 +1,6 @@
 # The library in its three forms: shared (tevpf), static (tevpf_static), and the static form with
 # test hooks (tevpf_testing) that only tests link.
 get_property(TEVPF_SOURCES GLOBAL PROPERTY TEVPF_SOURCES)
-if(NOT TEVPF_SOURCES)
-  file(WRITE "${PROJECT_BINARY_DIR}/empty.cpp" "")
-  set(TEVPF_SOURCES "${PROJECT_BINARY_DIR}/empty.cpp")
-endif()
 
 function(tevpf_public_header target)
   target_include_directories(${target} PUBLIC
