@@ -128,6 +128,7 @@ std::vector<Parameter> read_list(const PfFile& file, const std::string& name) {
   std::int32_t count = 0;
   require(TEV8R1_PF_inq_num_params(name.c_str(), &count), file.path(), "read the list");
   std::vector<Parameter> result;
+  result.reserve(static_cast<std::size_t>(count));
   for (std::int32_t i = 0; i < count; ++i) result.push_back(read_parameter(file, name, i));
   return result;
 }

@@ -75,8 +75,6 @@ PfFile::PfFile(std::string path, Use use) : path_(std::move(path)) {
   const TEVPF_STATUS status = TEV8R1_PF_open(library_name(path_).c_str());
   switch (status) {
     case PF_NEWFILE:
-      is_new_ = true;
-      break;
     case PF_NORMAL:
       break;
     case PF_BADFORMAT:
@@ -86,11 +84,9 @@ PfFile::PfFile(std::string path, Use use) : path_(std::move(path)) {
       break;
     case PF_BADFILE:
       throw Failure(kUnreadable, visible(path_) + ": " + reason(status));
-    default: {
-      const Failure failure = library_failure(status, path_, "open it");
-      if (status == PF_NOMEM) TEV8R1_PF_close(0);
-      throw failure;
-    }
+    default:
+      if (status == PF_NOMEM) TEV8R1_PF_close(0);  // it may be open with what was loaded
+      throw library_failure(status, path_, "open it");
   }
   open_ = true;
   if (use == Use::kRead) return;

@@ -33,7 +33,6 @@ class PfFile {
 
   const std::string& path() const { return path_; }
   const std::string& damage() const { return damage_; }  // empty: none
-  bool is_new() const { return is_new_; }
 
   std::vector<Element> elements() const;  // lists first, each kind in directory order
   bool has(Kind kind, const std::string& name) const;
@@ -51,7 +50,7 @@ class PfFile {
   void close();
 
   std::string path_, damage_;
-  bool open_ = false, is_new_ = false;
+  bool open_ = false;
 };
 
 // Refuses a name that the library would cut or refuse; `what`: "the new name".

@@ -201,7 +201,7 @@ class RowLoader {
     }
     char* cell = row_.data() + column.offset;
     std::memset(cell, 0, width + 1);
-    std::memcpy(cell, field.data(), field.size());
+    std::memcpy(cell, field.c_str(), field.size() + 1);
   }
 
   // The library names the value but not the column: look for the first one that refuses its value.
