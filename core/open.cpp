@@ -18,12 +18,14 @@ struct OpenedStream {
   bool created;
 };
 
-// For update where that is allowed, else for reading; a file that gives neither is made anew.
+// For update where that is allowed, else for reading; a file that is not there, or gives neither right,
+// is made anew. Any other failure is no reason to empty a file that may be there: it may pass.
 OpenedStream open_or_create(const char* name) noexcept {
   if (std::FILE* stream = std::fopen(name, "r+b")) return {stream, false, false};
   if (access_denied(errno)) {
     if (std::FILE* stream = std::fopen(name, "rb")) return {stream, true, false};
   }
+  if (errno != ENOENT && !access_denied(errno)) return {nullptr, false, false};
   return {std::fopen(name, "wb"), false, true};
 }
 

@@ -250,9 +250,16 @@ TEST_F(FilesTest, AReadOnlyFileStaysOpenRatherThanBeSaved) {
     EXPECT_EQ(TEV8R1_PF_save(at("copy").c_str()), PF_NOPRIV);
     EXPECT_EQ(error_texts(), (ErrorTexts{at("copy"), ""}));
     EXPECT_EQ(TEV8R1_PF_close(0), PF_NORMAL);
+    // What may be written but not read is emptied and new.
+    write_file(at("blind"), "Dear reader");
+    chmod(at("blind").c_str(), 0222);
+    EXPECT_EQ(open(at("blind")), PF_NEWFILE);
+    EXPECT_EQ(TEV8R1_PF_save(nullptr), PF_NORMAL);
+    EXPECT_EQ(TEV8R1_PF_close(0), PF_NORMAL);
   };
   EXPECT_EQ(in_child(body, true), 0);
   EXPECT_EQ(read_file(at("copy")), read_file(at("a")));
+  EXPECT_EQ(fs::file_size(at("blind")), 0u);
 }
 
 TEST_F(FilesTest, ReplacingKeepsModeOwnerAndLinks) {
