@@ -92,22 +92,26 @@ template <class Record>
 [[gnu::noinline]] TEVPF_STATUS find_in_directory(const char* name, Record** element_out) noexcept {
   if (library.current_file == nullptr) return fail_empty(PF_NOFILE);
   TEVPF_FILE& file = *library.current_file;
-  Record* const found = find_kept_name<Record>(file, name);
-  // A longer name is not the one that is kept of it.
-  if (found == nullptr || !holds_text(found->header.elem_name, name)) {
-    return fail(PF_NOELEM, Kind<Record>::kWord, name);
+  Record*& last = file.*Kind<Record>::kLast;
+  if (last == nullptr || std::strcmp(last->header.elem_name, name) != 0) {
+    Record* found = find_kept_name<Record>(file, name);
+    // A longer name is not the one that is kept of it.
+    if (found == nullptr || std::strcmp(found->header.elem_name, name) != 0) {
+      return fail(PF_NOELEM, Kind<Record>::kWord, name);
+    }
+    last = found;
   }
-  *element_out = file.*Kind<Record>::kLast = found;
+  *element_out = last;
   return PF_NORMAL;
 }
 
-// Every operation starts here, and mostly with the element of the last one: that case is short and calls
-// nothing.
+// Every operation starts here, and mostly with the element of the last one and a short name: that case
+// calls nothing.
 template <class Record>
 TEVPF_STATUS find_element(const char* name, Record** element_out) noexcept {
   if (library.current_file != nullptr) {
     Record* const last = library.current_file->*Kind<Record>::kLast;
-    if (last != nullptr && holds_text(last->header.elem_name, name)) {
+    if (last != nullptr && holds_short_text(last->header.elem_name, name)) {
       *element_out = last;
       return PF_NORMAL;
     }

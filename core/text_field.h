@@ -47,15 +47,16 @@ inline void copy_name(char* out, const char (&field)[20]) noexcept {
   std::memcpy(out + end - 7, field + end - 7, 8);
 }
 
-// Whether a field holds exactly this text. Most names are short, and a call costs as much as eight steps.
+// Whether a field holds exactly this text, which has fewer than 8 characters; false when it is longer. Most
+// names are short, and a call costs as much as eight steps.
 template <std::size_t N>
-bool holds_text(const char (&field)[N], const char* text) noexcept {
-  static_assert(N > 8);
+bool holds_short_text(const char (&field)[N], const char* text) noexcept {
+  static_assert(N >= 8);
   for (std::size_t i = 0; i < 8; ++i) {
     if (field[i] != text[i]) return false;
     if (text[i] == '\0') return true;
   }
-  return std::strcmp(field + 8, text + 8) == 0;
+  return false;
 }
 
 inline bool starts_with_blank(const char* name) noexcept { return name[0] == ' '; }

@@ -32,19 +32,31 @@ std::int64_t readable_bytes(const TEVPF_TABLE& table, const TEVPF_COLUMN& column
 
 // ---- Searching -----------------------------------------------------------------------------------
 
-// Integers: the first entry that is not less, found without a branch on the values. Their order is
-// total, so the answer is that of the probes below.
+// Integers: the first entry that is not less. Their order is total, so the answer is that of the probes
+// below. Three probes a step, which wait for memory together, quarter what is left; no branch depends on
+// a value.
 template <class T>
 TEVPF_STATUS search_entries(const Values& values, const std::int32_t* entries, std::int32_t count,
                             const NumberKey<T>& key, std::int32_t& pos) noexcept
     requires(!kIsFloating<T>) {
-  const std::int32_t* first = entries;
-  for (std::int32_t length = count; length > 0;) {
-    const std::int32_t half = length / 2;
-    const bool less = key.is_above(values.of(first[half]));
-    first += less ? half + 1 : 0;
-    length = less ? length - half - 1 : half;
+  // Behind all of them: rows that come in the order of their values.
+  if (key.is_above(values.of(entries[count - 1]))) {
+    pos = count;
+    return PF_NOTFOUND;
   }
+  const std::int32_t* first = entries;  // the answer is one of `length` entries, or behind them
+  std::int32_t length = count;
+  const auto less = [&](std::int32_t place) {
+    return static_cast<std::int32_t>(key.is_above(values.of(first[place - 1])));
+  };
+  while (length >= 4) {
+    const std::int32_t quarter = length / 4;
+    first += quarter * (less(quarter) + less(2 * quarter) + less(3 * quarter));
+    length -= 3 * quarter;
+  }
+  std::int32_t behind = 0;
+  for (std::int32_t place = 1; place <= length; ++place) behind += less(place);
+  first += behind;
   pos = static_cast<std::int32_t>(first - entries);
   return pos < count && key.equals(values.of(*first)) ? PF_NORMAL : PF_NOTFOUND;
 }
