@@ -1,25 +1,27 @@
 /* libtevpf: named technical parameters and tables in binary parameter files.
  *
  * A parameter file holds lists (ordered, named, typed parameters with bounds, units, precision and
- * description) and tables (typed columns over rows of fixed width). A file is read whole into memory
- * when it is opened and written whole when it is saved; in between, all work is done in memory.
+ * description) and tables (typed columns over rows of fixed width). A file is read whole into
+ * memory when it is opened and written whole when it is saved; in between, all work is done in
+ * memory.
  *
  * Conventions
- *   Statuses   Every operation returns one TEVPF_STATUS unless its comment says otherwise. Compare it
- *              for equality with a name below: PF_NORMAL is success, PF_NEWFILE and PF_NOMORE are
+ *   Statuses   Every operation returns one TEVPF_STATUS unless its comment says otherwise. Compare
+ *              it for equality with a name below: PF_NORMAL is success, PF_NEWFILE and PF_NOMORE are
  *              results. "Not found" statuses of a group stand at the head of the group.
- *   Texts      NUL-terminated 8-bit texts; never null unless the comment says "or null". Texts handed
- *              in are copied; the library keeps no caller's pointer.
+ *   Texts      NUL-terminated 8-bit texts; never null unless the comment says "or null". Texts
+ *              handed in are copied; the library keeps no caller's pointer.
  *   Names      Elements, parameters and columns: at most 19 characters, longer names are cut.
  *              Descriptions of elements: at most 79 characters, cut likewise.
  *   Buffers    Results go to storage of the caller, sized as the comment says. Blocks that an
  *              operation hands out come from malloc and are released by the caller with free of the
- *              same C runtime. On a failure, out-arguments are untouched unless the comment says so.
+ *              same C runtime. A failure leaves out-arguments untouched unless the comment
+ *              says otherwise.
  *   Refusals   An operation checks first and changes afterwards: when it fails, its list, table or
  *              file is as before, unless the comment says what stays. PF_NOMEM can come from every
  *              operation that allocates.
- *   Threads    None: all state (open files, current file, settings) is process-wide. Use the library
- *              from one thread at a time.
+ *   Threads    None: all state (open files, current file, settings) is process-wide. Use the
+ *              library from one thread at a time.
  *   Costs      Given in n, the number of parameters, rows or elements at hand.
  *
  * C99 and C++. Little-endian hosts. */
@@ -70,7 +72,7 @@ typedef uint32_t TEVPF_STATUS;
 #define PF_NORMAL ((TEVPF_STATUS)0x09608009u)    /* success */
 #define PF_NEWFILE ((TEVPF_STATUS)0x09608013u)   /* opened; the file is new and empty */
 #define PF_NOMORE ((TEVPF_STATUS)0x0960801Bu)    /* a traversal has passed its last entry */
-#define PF_NOTEXACT ((TEVPF_STATUS)0x09608023u)  /* internal: a nearest search found a greater value */
+#define PF_NOTEXACT ((TEVPF_STATUS)0x09608023u)  /* internal: nearest found a greater value */
 #define PF_INITDONE ((TEVPF_STATUS)0x09608028u)  /* the library was already initialised */
 #define PF_NOTFOUND ((TEVPF_STATUS)0x09608030u)  /* no row holds the value */
 #define PF_FILEOPEN ((TEVPF_STATUS)0x09608038u)  /* a file of that name is already open */
@@ -86,17 +88,17 @@ typedef uint32_t TEVPF_STATUS;
 #define PF_NOELEM ((TEVPF_STATUS)0x09608092u)    /* the file has no such list or table */
 #define PF_NOPARAM ((TEVPF_STATUS)0x0960809Au)   /* the list has no such parameter */
 #define PF_NOTUNIQUE ((TEVPF_STATUS)0x096080A2u) /* two rows already hold the same value */
-#define PF_OPENFAIL ((TEVPF_STATUS)0x096080AAu)  /* a file could not be opened, created or written */
+#define PF_OPENFAIL ((TEVPF_STATUS)0x096080AAu)  /* a file cannot be opened, created or written */
 #define PF_RANGE ((TEVPF_STATUS)0x096080B2u)     /* a value lies outside its range */
-#define PF_BADFORMAT ((TEVPF_STATUS)0x096080BAu) /* the file ends inside an element, or contradicts itself */
-#define PF_BADCOLCHG ((TEVPF_STATUS)0x096080C2u) /* a string column with rows cannot change its width */
-#define PF_BADARG ((TEVPF_STATUS)0x096080D2u)    /* an invalid argument, or text that is no number */
-#define PF_BADWIDTH ((TEVPF_STATUS)0x096080DAu)  /* a column's width is less than 1, or too large */
-#define PF_BADPREC ((TEVPF_STATUS)0x096080E2u)   /* a precision is less than 1 */
-#define PF_NOPRIV ((TEVPF_STATUS)0x096080EAu)    /* the file may not be written */
-#define PF_BADNAME ((TEVPF_STATUS)0x096080F2u)   /* a name starts with a blank */
-#define PF_BADFILE ((TEVPF_STATUS)0x096080FAu)   /* not a parameter file; it was closed again */
-#define PF_BADUNIQUE ((TEVPF_STATUS)0x09608102u) /* no unique index can be added to a table with rows */
+#define PF_BADFORMAT ((TEVPF_STATUS)0x096080BAu) /* the file ends inside an element or is damaged */
+#define PF_BADCOLCHG ((TEVPF_STATUS)0x096080C2u) /* string width of a table with rows is fixed */
+#define PF_BADARG ((TEVPF_STATUS)0x096080D2u)   /* an invalid argument, or text that is no number */
+#define PF_BADWIDTH ((TEVPF_STATUS)0x096080DAu) /* a column's width is less than 1, or too large */
+#define PF_BADPREC ((TEVPF_STATUS)0x096080E2u)  /* a precision is less than 1 */
+#define PF_NOPRIV ((TEVPF_STATUS)0x096080EAu)   /* the file may not be written */
+#define PF_BADNAME ((TEVPF_STATUS)0x096080F2u)  /* a name starts with a blank */
+#define PF_BADFILE ((TEVPF_STATUS)0x096080FAu)  /* not a parameter file; it was closed again */
+#define PF_BADUNIQUE ((TEVPF_STATUS)0x09608102u) /* no unique index on a table that has rows */
 #define PF_BADRANGE ((TEVPF_STATUS)0x0960810Au)  /* a maximum is less than its minimum */
 #define PF_TYPECHG ((TEVPF_STATUS)0x09608112u)   /* a column with rows cannot change its type */
 #define PF_SEARCHSET ((TEVPF_STATUS)0x0960811Au) /* rows cannot move while a search column is set */
@@ -114,9 +116,9 @@ typedef uint32_t TEVPF_STATUS;
 
 #define PF_END_POS 0x7FFFFFFF /* position argument: at the end */
 
-#define TEVPF_NAME_SIZE 20      /* names, terminator included */
-#define TEVPF_UNITS_SIZE 8      /* units, terminator included */
-#define TEVPF_DESC_SIZE 80      /* element descriptions, terminator included */
+#define TEVPF_NAME_SIZE 20       /* names, terminator included */
+#define TEVPF_UNITS_SIZE 8       /* units, terminator included */
+#define TEVPF_DESC_SIZE 80       /* element descriptions, terminator included */
 #define TEVPF_FILE_NAME_SIZE 258 /* names of open files, terminator included */
 
 #pragma pack(push, 4)
@@ -189,7 +191,8 @@ typedef struct TEVPF_COL_DEF {
  *   PF_INITDONE  it was initialised before; only TEV8R1_debug was looked at again */
 TEVPF_API TEVPF_STATUS TEV8R1_PF_init(void) TEVPF_NOEXCEPT;
 
-/* Opens a parameter file and makes it current; creates an empty one when there is none. O(file size).
+/* Opens a parameter file and makes it current; creates an empty one when there is none. Costs
+ * O(file size).
  *   name  path; a leading "$NAME/" is replaced by the value of the environment variable "$NAME",
  *         the "$" being part of the variable's name. At most 257 characters after that.
  *   PF_NEWFILE    open, new and empty; it is deleted again if it is closed without ever being saved
@@ -216,17 +219,16 @@ TEVPF_API TEVPF_STATUS TEV8R1_PF_inq_file_access(int32_t* access_out) TEVPF_NOEX
  *   ..._out        receive new arrays of 20-byte names and 80-byte descriptions, released by the
  *                  caller with free; not written when their count is 0
  *   PF_NOMEM  arrays handed out before the failure belong to the caller */
-TEVPF_API TEVPF_STATUS TEV8R1_PF_inq_file_elements(char* file_name_out, int32_t* num_lists_out,
-                                                   char (**list_names_out)[TEVPF_NAME_SIZE],
-                                                   char (**list_descs_out)[TEVPF_DESC_SIZE],
-                                                   int32_t* num_tables_out,
-                                                   char (**table_names_out)[TEVPF_NAME_SIZE],
-                                                   char (**table_descs_out)[TEVPF_DESC_SIZE])
-    TEVPF_NOEXCEPT;
+TEVPF_API TEVPF_STATUS TEV8R1_PF_inq_file_elements(
+    char* file_name_out, int32_t* num_lists_out, char (**list_names_out)[TEVPF_NAME_SIZE],
+    char (**list_descs_out)[TEVPF_DESC_SIZE], int32_t* num_tables_out,
+    char (**table_names_out)[TEVPF_NAME_SIZE],
+    char (**table_descs_out)[TEVPF_DESC_SIZE]) TEVPF_NOEXCEPT;
 
-/* Writes the current file whole: in place (path null or its own name), or as a copy to another path.
+/* Writes the current file whole: in place (path null or its own name), or as a copy to another
+ * path.
  *   PF_NOPRIV    read-only, or the system refuses access to the path
- *   PF_OPENFAIL  cannot be opened, or not everything could be written; what is in memory is whole */
+ *   PF_OPENFAIL  cannot be opened, or not everything could be written; memory is whole */
 TEVPF_API TEVPF_STATUS TEV8R1_PF_save(const char* path) TEVPF_NOEXCEPT;
 
 /* Closes the current file, writing it first when save is not 0, and releases it. The file opened
@@ -235,11 +237,11 @@ TEVPF_API TEVPF_STATUS TEV8R1_PF_save(const char* path) TEVPF_NOEXCEPT;
  *   PF_OPENFAIL  it could not be written */
 TEVPF_API TEVPF_STATUS TEV8R1_PF_close(int32_t save) TEVPF_NOEXCEPT;
 
-/* Sets how many slots arrays of parameters and rows get at first (default 25) and each time they are
- * full (default 10); 0 restores the default.
+/* Sets how many slots arrays of parameters and rows get at first (default 25) and each time they
+ * are full (default 10); 0 restores the default.
  *   PF_BADARG  an argument is negative: that setting stays, the other one is applied */
-TEVPF_API TEVPF_STATUS TEV8R1_PF_set_memory_allocation(int32_t initial, int32_t increment)
-    TEVPF_NOEXCEPT;
+TEVPF_API TEVPF_STATUS TEV8R1_PF_set_memory_allocation(int32_t initial,
+                                                       int32_t increment) TEVPF_NOEXCEPT;
 
 /* ---- Elements of the current file -----------------------------------------------------------
  * PF_NOFILE: no file is current. PF_NOELEM: the file has no list (table) of that exact name.
@@ -259,7 +261,7 @@ TEVPF_API TEVPF_STATUS TEV8R1_check_list_unique(const char* name) TEVPF_NOEXCEPT
 TEVPF_API TEVPF_STATUS TEV8R1_check_table_unique(const char* name) TEVPF_NOEXCEPT;
 
 /* Renames an element. Equal first 19 characters: PF_NORMAL at once, nothing is checked.
- *   PF_BADNAME, PF_BADTYPE, PF_DUPLICATE as for creating; the duplicate is found before PF_NOELEM */
+ *   PF_BADNAME, PF_BADTYPE, PF_DUPLICATE as for creating; the duplicate comes before PF_NOELEM */
 TEVPF_API TEVPF_STATUS TEV8R1_modify_elem_name(int32_t elem_type, const char* old_name,
                                                const char* new_name) TEVPF_NOEXCEPT;
 
@@ -294,9 +296,9 @@ TEVPF_API TEVPF_STATUS TEV8R1_compute_size(int32_t type, int32_t width,
 TEVPF_API TEVPF_STATUS TEV8R1_from_char(int32_t type, const char* text,
                                         void* destination) TEVPF_NOEXCEPT;
 
-/* The numeric conversions on their own. An integer's range is judged by the length of its text: more
- * than 10 digits, leading zeros included, are out of range. Empty text gives 0; for doubles it leaves
- * the result as it was. Statuses as above. */
+/* The numeric conversions on their own. An integer's range is judged by the length of its text:
+ * more than 10 digits, leading zeros included, are out of range. Empty text gives 0; for doubles
+ * it leaves the result as it was. Statuses as above. */
 TEVPF_API TEVPF_STATUS TEV8R1_convert_int(const char* text, int32_t* result) TEVPF_NOEXCEPT;
 TEVPF_API TEVPF_STATUS TEV8R1_convert_short(const char* text, int16_t* result) TEVPF_NOEXCEPT;
 TEVPF_API TEVPF_STATUS TEV8R1_convert_double(const char* text, double* result) TEVPF_NOEXCEPT;
@@ -310,8 +312,8 @@ TEVPF_API TEVPF_STATUS TEV8R1_to_char(int32_t type, const char* format, const vo
                                       char* destination, int32_t* length_out) TEVPF_NOEXCEPT;
 
 /* Compares two values of a type: (TEVPF_STATUS)-1 a is smaller, 1 a is greater, PF_NORMAL equal.
- * Reals and doubles are equal within the tolerance; a string b whose first "*" is its last character
- * equals every text that starts with what stands before it. */
+ * Reals and doubles are equal within the tolerance; a string b whose first "*" is its last
+ * character equals every text that starts with what stands before it. */
 TEVPF_API TEVPF_STATUS TEV8R1_compare(int32_t type, const void* a, const void* b,
                                       double tolerance) TEVPF_NOEXCEPT;
 
@@ -319,9 +321,9 @@ TEVPF_API TEVPF_STATUS TEV8R1_compare(int32_t type, const void* a, const void* b
 TEVPF_API TEVPF_STATUS TEV8R1_string_compare(const char* text, const char* pattern) TEVPF_NOEXCEPT;
 
 /* ---- Lists: parameters ----------------------------------------------------------------------
- * Every operation: PF_NOFILE, PF_NOELEM (no such list). Where a parameter is named: PF_NOPARAM. A name
- * whose first "*" is its last character finds the first parameter, in name order, that starts with
- * what stands before it. Positions count from 0. Finding costs O(log n) or less. */
+ * Every operation: PF_NOFILE, PF_NOELEM (no such list). Where a parameter is named: PF_NOPARAM. A
+ * name whose first "*" is its last character finds the first parameter, in name order, that starts
+ * with what stands before it. Positions count from 0. Finding costs O(log n) or less. */
 
 /* Adds a parameter in front of the one at `position` (PF_END_POS, or any position behind the last:
  * at the end; negative: at the front). str.length is ignored, a null str.value is the empty text.
@@ -400,15 +402,15 @@ TEVPF_API TEVPF_STATUS TEV8R1_PF_inq_param_dft(const char* list_name, int32_t ty
 TEVPF_API TEVPF_STATUS TEV8R1_PF_set_param_dft(const char* list_name,
                                                TEVPF_PARAM_DEF definition) TEVPF_NOEXCEPT;
 
-/* A new table of the five initial default definitions, in type order. The caller owns it and the text
- * in the string definition (free both). */
+/* A new table of the five initial default definitions, in type order. The caller owns it and the
+ * text in the string definition (free both). */
 TEVPF_API TEVPF_STATUS TEV8R1_load_param_dft(TEVPF_PARAM_DEF** table_out) TEVPF_NOEXCEPT;
 
 /* ---- Lists: traversal and inquiry -----------------------------------------------------------
  * Each list has a cursor: the position of its current parameter, -1 before the first.
  * Definitions go into the caller's record: before the call, description points to a buffer of the
- * description size and, for a string parameter, part.str.value to one of the value size, both as the
- * size inquiries report them. The two pointers stay; everything else is overwritten. */
+ * description size and, for a string parameter, part.str.value to one of the value size, both as
+ * the size inquiries report them. The two pointers stay; everything else is overwritten. */
 
 /* Name (20 bytes) and value of the next parameter. The cursor advances, at the end too.
  *   PF_NOMORE  there is no next parameter */
@@ -467,8 +469,8 @@ TEVPF_API TEVPF_STATUS TEV8R1_get_param_type(const char* list_name, const char* 
 TEVPF_API TEVPF_STATUS TEV8R1_set_interactive_list(const char* list_name) TEVPF_NOEXCEPT;
 
 /* ---- Tables: columns ------------------------------------------------------------------------
- * Every operation: PF_NOFILE, PF_NOELEM (no such table). Where a column is named: PF_NOCOLUMN. Column
- * names are matched exactly. */
+ * Every operation: PF_NOFILE, PF_NOELEM (no such table). Where a column is named: PF_NOCOLUMN.
+ * Column names are matched exactly. */
 
 /* Appends a column; existing rows get its min, strings the empty text. O(rows).
  *   PF_BADNAME    the name starts with a blank
@@ -481,8 +483,8 @@ TEVPF_API TEVPF_STATUS TEV8R1_set_interactive_list(const char* list_name) TEVPF_
 TEVPF_API TEVPF_STATUS TEV8R1_PF_def_column(const char* table_name,
                                             TEVPF_COL_DEF definition) TEVPF_NOEXCEPT;
 
-/* Replaces a column's definition, its name included. The default row gets the minimums again. O(rows)
- * for the checks, O(rows log rows) when an index is switched on.
+/* Replaces a column's definition, its name included. The default row gets the minimums again.
+ * O(rows) for the checks, O(rows log rows) when an index is switched on.
  *   PF_BADNAME, PF_DUPLICATE, PF_BADTYPE, PF_BADRANGE, PF_BADPREC, PF_BADWIDTH as above
  *   PF_TYPECHG    another type, but the table has rows
  *   PF_RANGE      a row holds a value outside the new bounds
@@ -499,8 +501,8 @@ TEVPF_API TEVPF_STATUS TEV8R1_PF_delete_col(const char* table_name,
 TEVPF_API TEVPF_STATUS TEV8R1_PF_move_col(const char* table_name, const char* column_name,
                                           const char* before_name) TEVPF_NOEXCEPT;
 
-/* A column's definition, by name or by position in column order; its description, when present, is a
- * new block that the caller owns (free). On PF_NOMEM the rest of def_out is written and its
+/* A column's definition, by name or by position in column order; its description, when present, is
+ * a new block that the caller owns (free). On PF_NOMEM the rest of def_out is written and its
  * description is null.
  *   PF_BADPOS  pos outside 0..columns-1 */
 TEVPF_API TEVPF_STATUS TEV8R1_PF_inq_col_def(const char* table_name, const char* column_name,
@@ -516,10 +518,11 @@ TEVPF_API TEVPF_STATUS TEV8R1_PF_inq_col_offsets(const char* table_name, int32_t
                                                  int32_t** offsets_out) TEVPF_NOEXCEPT;
 
 /* The table's template of a value type: sensible starting definitions for callers that define
- * columns. Kept in memory only; the library does not use them. A description in def_out is a new block
- * that the caller owns (free).
+ * columns. Kept in memory only; the library does not use them. A description in def_out is a new
+ * block that the caller owns (free).
  *   PF_BADTYPE  no such value type */
-TEVPF_API TEVPF_STATUS TEV8R1_PF_set_col_dft(const char* table_name, TEVPF_COL_DEF def) TEVPF_NOEXCEPT;
+TEVPF_API TEVPF_STATUS TEV8R1_PF_set_col_dft(const char* table_name,
+                                             TEVPF_COL_DEF def) TEVPF_NOEXCEPT;
 TEVPF_API TEVPF_STATUS TEV8R1_PF_inq_col_dft(const char* table_name, int32_t type,
                                              TEVPF_COL_DEF* def_out) TEVPF_NOEXCEPT;
 
@@ -527,8 +530,8 @@ TEVPF_API TEVPF_STATUS TEV8R1_PF_inq_col_dft(const char* table_name, int32_t typ
 TEVPF_API TEVPF_STATUS TEV8R1_get_col_type(const char* table_name, const char* column_name,
                                            int32_t* type_out) TEVPF_NOEXCEPT;
 
-/* PF_NORMAL when the definition's bounds and precision are in order, else PF_BADRANGE, PF_BADPREC or
- * PF_BADTYPE. */
+/* PF_NORMAL when the definition's bounds and precision are in order, else PF_BADRANGE, PF_BADPREC
+ * or PF_BADTYPE. */
 TEVPF_API TEVPF_STATUS TEV8R1_validate_col_range(const TEVPF_COL_DEF* definition) TEVPF_NOEXCEPT;
 
 /* The bytes a column takes in the file.
@@ -541,17 +544,18 @@ TEVPF_API int32_t TEV8R1_calc_col_width(int32_t width, int32_t name_length) TEVP
 
 /* ---- Tables: rows ---------------------------------------------------------------------------
  * Every operation: PF_NOFILE, PF_NOELEM (no such table).
- * A row is row_wid bytes, each column's value at its offset. Row numbers count rows as they are stored;
- * positions count them as they are traversed: the same, unless a search column is set, whose order
- * positions then follow. The cursor (current row, next row) holds positions.
- * Value checks: PF_RANGE (a value outside its column's bounds, give or take the column's tolerance) and
- * PF_DUPLICATE (a unique column already holds it); interactive mode switches them off where said.
- * Adding and deleting cost O(log n) comparisons and O(n) moves of entries per index. */
+ * A row is row_wid bytes, each column's value at its offset. Row numbers count rows as they are
+ * stored; positions count them as they are traversed: the same, unless a search column is set,
+ * whose order positions then follow. The cursor (current row, next row) holds positions.
+ * Value checks: PF_RANGE (a value outside its column's bounds, give or take the column's
+ * tolerance) and PF_DUPLICATE (a unique column already holds it); interactive mode switches them
+ * off where said. Adding and deleting cost O(log n) comparisons and O(n) moves of entries per
+ * index. */
 
 /* Appends a row; inserts it in front of a row number (PF_END_POS or beyond the last: at the end;
  * negative: at the front); or appends it after filling every column whose entry in `supplied` is 0
- * from the default row, in the caller's buffer. The cursor stays. Refused by the value checks unless
- * interactive mode is on; spare slots that were made stay. */
+ * from the default row, in the caller's buffer. The cursor stays. Refused by the value checks
+ * unless interactive mode is on; spare slots that were made stay. */
 TEVPF_API TEVPF_STATUS TEV8R1_PF_add_row(const char* table_name, const void* row) TEVPF_NOEXCEPT;
 TEVPF_API TEVPF_STATUS TEV8R1_PF_add_row_by_pos(const char* table_name, const void* row,
                                                 int32_t row_number) TEVPF_NOEXCEPT;
@@ -560,10 +564,11 @@ TEVPF_API TEVPF_STATUS TEV8R1_PF_add_row_with_dft(const char* table_name, void* 
 
 /* Replaces the current row; values are always checked, its own unique values are no duplicates.
  *   PF_NOCURROW  no row is current */
-TEVPF_API TEVPF_STATUS TEV8R1_PF_replace_row(const char* table_name, const void* row) TEVPF_NOEXCEPT;
+TEVPF_API TEVPF_STATUS TEV8R1_PF_replace_row(const char* table_name,
+                                             const void* row) TEVPF_NOEXCEPT;
 
-/* Deletes the current row. Afterwards no row is current; the next one to be delivered is the row that
- * followed.
+/* Deletes the current row. Afterwards no row is current; the next one to be delivered is the row
+ * that followed.
  *   PF_NOCURROW  no row is current */
 TEVPF_API TEVPF_STATUS TEV8R1_PF_delete_row(const char* table_name) TEVPF_NOEXCEPT;
 
@@ -587,7 +592,8 @@ TEVPF_API TEVPF_STATUS TEV8R1_PF_reset_table(const char* table_name) TEVPF_NOEXC
 
 /* Sets and reads the default row (row_wid bytes; kept in memory only). Setting checks values unless
  * interactive mode is on; duplicates are allowed. */
-TEVPF_API TEVPF_STATUS TEV8R1_PF_set_dft_row(const char* table_name, const void* row) TEVPF_NOEXCEPT;
+TEVPF_API TEVPF_STATUS TEV8R1_PF_set_dft_row(const char* table_name,
+                                             const void* row) TEVPF_NOEXCEPT;
 TEVPF_API TEVPF_STATUS TEV8R1_PF_inq_dft_row(const char* table_name, void* row_out) TEVPF_NOEXCEPT;
 
 /* Copies one column's values of all rows, in storage order, one behind the other.
@@ -640,8 +646,8 @@ TEVPF_API TEVPF_STATUS TEV8R1_PF_get_row_by_value(const char* table_name, int8_t
 TEVPF_API TEVPF_STATUS TEV8R1_PF_get_value(const char* table_name, const char* column_name,
                                            const void* key, void* value_out) TEVPF_NOEXCEPT;
 
-/* The row number at a position; not a status. -1 when the table is not found; a position outside the
- * table gives the position. */
+/* The row number at a position; not a status. -1 when the table is not found; a position outside
+ * the table gives the position. */
 TEVPF_API int32_t TEV8R1_convert_row(const char* table_name, int32_t pos) TEVPF_NOEXCEPT;
 
 /* ---- Reports --------------------------------------------------------------------------------
@@ -684,8 +690,8 @@ TEVPF_API TEVPF_STATUS TEV8R1_insert_escape_chars(char* text, int32_t* length_ou
  *   fill_width  blanks the buffer gets first
  *   first_lead  receives the blanks in front of the first name
  *   buffer      room for fill_width and for all display widths and gaps, and a terminator */
-TEVPF_API TEVPF_STATUS TEV8R1_create_table_header(const char* table_name, int32_t first, int32_t last,
-                                                  int32_t gap, int32_t fill_width,
+TEVPF_API TEVPF_STATUS TEV8R1_create_table_header(const char* table_name, int32_t first,
+                                                  int32_t last, int32_t gap, int32_t fill_width,
                                                   int32_t* first_lead, char* buffer) TEVPF_NOEXCEPT;
 
 /* ---- Building blocks ------------------------------------------------------------------------
@@ -695,11 +701,11 @@ TEVPF_API TEVPF_STATUS TEV8R1_create_table_header(const char* table_name, int32_
 TEVPF_API TEVPF_STATUS TEV8R1_memcpy(int32_t count, const void* source,
                                      void* destination) TEVPF_NOEXCEPT;
 
-/* A new heap copy of a text that the caller owns (free), null when memory runs out. Not a status. */
+/* A new heap copy of a text that the caller owns (free), or null without memory. Not a status. */
 TEVPF_API char* TEV8R1_strdup(const char* text) TEVPF_NOEXCEPT;
 
-/* Grows an array by `increment` entries of `size` bytes. count 0: a new zeroed block (the old pointer
- * is not looked at); otherwise the block is resized, the added bytes are not zeroed.
+/* Grows an array by `increment` entries of `size` bytes. count 0: a new zeroed block (the old
+ * pointer is not looked at); otherwise the block is resized, the added bytes are not zeroed.
  *   array          in and out: the block, from malloc
  *   first_new_out  the first byte behind the count existing entries
  *   PF_NOMEM  the block stays as it was */
@@ -716,7 +722,8 @@ TEVPF_API TEVPF_STATUS TEV8R1_remove_index(int32_t* index, int32_t row_number,
                                            int32_t count) TEVPF_NOEXCEPT;
 
 /* Searches an index for a key.
- *   column_base  the column's value in row number 0; row number e has it e * row_wid bytes further on
+ *   column_base  the column's value in row number 0; row number e has it e * row_wid bytes further
+ *                on
  *   pos_out      PF_NORMAL: the first equal entry. PF_NOTFOUND: where the key would be inserted
  *   PF_CMPFAIL  no such value type; pos_out is untouched */
 TEVPF_API TEVPF_STATUS TEV8R1_binary_search(int32_t type, double tolerance, int32_t count,
@@ -724,12 +731,12 @@ TEVPF_API TEVPF_STATUS TEV8R1_binary_search(int32_t type, double tolerance, int3
                                             const void* column_base, const void* key,
                                             int32_t* pos_out) TEVPF_NOEXCEPT;
 
-/* The comparison of two index entries that the last TEV8R1_create_index used: negative, 0, positive.
- * Fit for qsort; a and b point to int32_t row numbers. */
+/* The comparison of two index entries that the last TEV8R1_create_index used: negative, 0,
+ * positive. Fit for qsort; a and b point to int32_t row numbers. */
 TEVPF_API int32_t TEV8R1_sort_comp(const void* a, const void* b) TEVPF_NOEXCEPT;
 
-/* A new index of num_rows entries 0, 1, 2 ... with room for num_rows + free_rows; the caller owns it
- * (free). Without room to make, PF_NORMAL and null. */
+/* A new index of num_rows entries 0, 1, 2 ... with room for num_rows + free_rows; the caller owns
+ * it (free). Without room to make, PF_NORMAL and null. */
 TEVPF_API TEVPF_STATUS TEV8R1_adjust_index(int32_t num_rows, int16_t free_rows,
                                            int32_t** idx_out) TEVPF_NOEXCEPT;
 
