@@ -12,26 +12,10 @@ namespace {
 
 constexpr std::int64_t kGrowth = 10;  // bytes that a block grows by, visible in the caller's size
 
-// The character that a letter stands for, or 0.
+// The character that a letter stands for; a letter without a meaning stands for itself.
 char unescape_letter(char letter) noexcept {
-  switch (letter) {
-    case 'b':
-      return '\b';
-    case 't':
-      return '\t';
-    case 'n':
-      return '\n';
-    case 'v':
-      return '\v';
-    case 'f':
-      return '\f';
-    case 'r':
-      return '\r';
-    case '\\':
-      return '\\';
-    default:
-      return 0;
-  }
+  const std::size_t place = kEscapeLetters.find(letter);
+  return place == std::string_view::npos ? letter : kEscaped[place];
 }
 
 bool is_octal(char digit) noexcept { return digit >= '0' && digit <= '7'; }
@@ -90,13 +74,7 @@ TEVPF_STATUS TEV8R1_insert_escape_chars(char* text, std::int32_t* length_out) no
       continue;
     }
     ++from;
-    if (is_octal(*from)) {
-      *to++ = read_octal(from);
-    } else {
-      const char character = unescape_letter(*from);
-      *to++ = character == 0 ? *from : character;  // of an unknown sequence the character stays
-      ++from;
-    }
+    *to++ = is_octal(*from) ? read_octal(from) : unescape_letter(*from++);
   }
   *to = '\0';
   *length_out = static_cast<std::int32_t>(to - text);

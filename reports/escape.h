@@ -2,28 +2,31 @@
 #pragma once
 
 #include <cstdint>
+#include <string_view>
 
 #include "include/tevpf.h"
 
 namespace tevpf {
 
-// What stands behind the backslash for each character that is escaped; 0 for all others.
-struct EscapeLetters {
+// The characters that are escaped, and the letters that stand for them behind a backslash.
+inline constexpr std::string_view kEscaped = "\b\t\n\v\f\r\\";
+inline constexpr std::string_view kEscapeLetters = "btnvfr\\";
+
+// By character, 0 for those that stand for themselves.
+struct LetterTable {
   char of[256];
 };
-constexpr EscapeLetters make_escape_letters() noexcept {
-  EscapeLetters letters{};
-  constexpr char kCharacters[] = "\b\t\n\v\f\r\\";
-  constexpr char kLetters[] = "btnvfr\\";
-  for (int i = 0; kLetters[i] != 0; ++i) {
-    letters.of[static_cast<unsigned char>(kCharacters[i])] = kLetters[i];
+constexpr LetterTable make_letter_table() noexcept {
+  LetterTable letters{};
+  for (std::size_t n = 0; n < kEscaped.size(); ++n) {
+    letters.of[static_cast<unsigned char>(kEscaped[n])] = kEscapeLetters[n];
   }
   return letters;
 }
-inline constexpr EscapeLetters kEscapeLetters = make_escape_letters();
+inline constexpr LetterTable kLetterTable = make_letter_table();
 
 constexpr char escape_letter(char character) noexcept {
-  return kEscapeLetters.of[static_cast<unsigned char>(character)];
+  return kLetterTable.of[static_cast<unsigned char>(character)];
 }
 
 // Writes the escaped text at `out`, which has room for twice its length; gives the end of it.
