@@ -12,7 +12,6 @@ namespace tevpf {
 
 namespace {
 
-constexpr std::int32_t kUsualPrecision = 6;
 constexpr int kMaxDecimal = 20;
 constexpr std::int32_t kLeastPlainExponent = -4;  // smaller numbers are written with an exponent
 
@@ -64,7 +63,7 @@ char* write_decimal(char* out, std::int64_t number) noexcept {
 
 char* write_general(char* out, double number, std::int32_t precision) noexcept {
   const std::int32_t digits =
-      precision < 0 ? kUsualPrecision : std::min(precision, std::int32_t{kMaxPrecision});
+      precision < 0 ? kDefaultPrecision : std::min(precision, kMaxPrecision);
   LeadingDigits leading;
   const double size = number < 0 ? -number : number;
   if (digits > 0 && digits <= kMostLeadingDigits && size > 0 &&

@@ -5,7 +5,9 @@
 
 namespace tevpf {
 
-// Largest precision that a number is written with; a negative one counts as 6, as printf has it.
+inline constexpr int kDefaultPrecision = 6;  // of "%g"; printf lets a negative one count as this
+
+// Largest precision that a number is written with.
 inline constexpr int kMaxPrecision = 1100;
 
 // Room for any number that write_general writes with that precision: sign, digits, point, exponent

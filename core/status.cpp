@@ -13,8 +13,6 @@ char err_value[kValueSize] = "";
 
 namespace {
 
-constexpr std::int32_t kTextPrecision = 6;  // of "%g"
-
 template <std::size_t N>
 char* append(char (&text)[N], char* end, const char* part) noexcept {
   while (*part != '\0' && end != text + N - 1) *end++ = *part++;
@@ -32,7 +30,7 @@ void write(char (&text)[N], const Phrase& phrase) noexcept {
 
 Text::Text(std::int32_t number) noexcept { *write_decimal(buffer_, number) = '\0'; }
 
-Text::Text(double number) noexcept { *write_general(buffer_, number, kTextPrecision) = '\0'; }
+Text::Text(double number) noexcept { *write_general(buffer_, number, kDefaultPrecision) = '\0'; }
 
 TEVPF_STATUS fail(TEVPF_STATUS status, Phrase item, Phrase value) noexcept {
   write(err_item, item);

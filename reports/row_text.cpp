@@ -36,7 +36,7 @@ struct Format {
 // The width and the precision of a made format, which may be older than the column's definition:
 // "%12d", "%12.4g" or "%-12s". A column without one gets what its definition says.
 Format read_format(const TEVPF_COLUMN& column) noexcept {
-  Format format = {display_width(column), 6};
+  Format format = {display_width(column), kDefaultPrecision};
   if (column.def.type == PF_TYPE_REAL) format.precision = column.def.limits.f32.precision;
   if (column.def.type == PF_TYPE_DOUBLE) format.precision = column.def.limits.f64.precision;
   if (column.format[0] != '%') return format;
@@ -59,7 +59,7 @@ char* align_right(char* begin, char* end, std::int32_t width) noexcept {
   return end + blanks;
 }
 
-char* pad_left(char* begin, char* end, std::int32_t width) noexcept {
+char* align_left(char* begin, char* end, std::int32_t width) noexcept {
   const std::int64_t blanks = width - (end - begin);
   if (blanks <= 0) return end;
   std::memset(end, ' ', static_cast<std::size_t>(blanks));
@@ -86,10 +86,10 @@ char* write_number_cell(char* out, const char* value, const Cell& cell) noexcept
 // An empty text shows a marker; one that ends in white space gets it behind, so that it can be seen.
 char* write_string_cell(char* out, const char* value, const Cell& cell) noexcept {
   const std::size_t length = strnlen(value, static_cast<std::size_t>(cell.length));
-  if (length == 0) return pad_left(out, write_marker(out), cell.empty_width);
+  if (length == 0) return align_left(out, write_marker(out), cell.empty_width);
   char* end = write_escaped(out, value, static_cast<std::int64_t>(length));
   if (is_white(end[-1])) end = write_marker(end);
-  return pad_left(out, end, cell.width);
+  return align_left(out, end, cell.width);
 }
 
 char* write_nothing(char* out, const char*, const Cell&) noexcept { return out; }

@@ -36,7 +36,7 @@ void write_debug_column(TextOut& out, const TEVPF_TABLE& table,
   out.print("desc flag = ", column.desc_flag, '\n');
   out.print("format = ", column.format, '\n');
   if (is_floating_type(column.def.type)) {
-    out.print("tolerance = ", General{column.tolerance, 0, 6}, '\n');
+    out.print("tolerance = ", General{column.tolerance, 0, kDefaultPrecision}, '\n');
   }
   const std::int32_t* const entries = index_entries(column);
   out.print("idx_ptr = ", address_of(entries), '\n');

@@ -19,18 +19,26 @@
 namespace tevpf {
 namespace {
 
-constexpr int kDefaultPrecision = 6;  // of "%g"
-
 TEVPF_STATUS bad_type(std::int32_t type) noexcept { return fail(PF_BADTYPE, "value", Text(type)); }
 
 bool is_space(char c) noexcept { return std::isspace(static_cast<unsigned char>(c)) != 0; }
 bool is_digit(char c) noexcept { return c >= '0' && c <= '9'; }
 
-// A whole text as an integer, limited to 64 bits; false when it is none. Empty text is 0.
-bool parse_integer(const char* text, long long& value) noexcept {
+// A whole text as an integer; empty text is 0. A text longer than `longest` is out of range, leading
+// zeros and blanks included.
+template <class T>
+TEVPF_STATUS convert_integer(const char* text, std::int32_t type, std::size_t longest,
+                             T& result) noexcept {
   char* end;
-  value = std::strtoll(text, &end, 10);
-  return *end == '\0' && (end != text || *text == '\0');
+  const long long number = std::strtoll(text, &end, 10);
+  const bool whole = *end == '\0' && (end != text || *text == '\0');
+  if (!whole) return fail(PF_BADARG, text, value_type(type).word);
+  using Limits = std::numeric_limits<T>;
+  if (std::strlen(text) > longest || number < Limits::min() || number > Limits::max()) {
+    return fail(PF_RANGE, text);
+  }
+  result = static_cast<T>(number);
+  return PF_NORMAL;
 }
 
 enum class Number { kNone, kOutOfRange, kEmpty, kValue };
@@ -138,25 +146,12 @@ TEVPF_STATUS TEV8R1_compute_size(std::int32_t type, std::int32_t width,
 }
 
 TEVPF_STATUS TEV8R1_convert_int(const char* text, std::int32_t* result) noexcept {
-  long long number;
-  if (!parse_integer(text, number)) return fail(PF_BADARG, text, "integer");
-  // The length decides, leading zeros and blanks included; only the longest texts need the value.
   const std::size_t longest = *text == '-' || *text == '+' ? 11 : 10;
-  using Limits = std::numeric_limits<std::int32_t>;
-  if (std::strlen(text) > longest || number < Limits::min() || number > Limits::max()) {
-    return fail(PF_RANGE, text);
-  }
-  *result = static_cast<std::int32_t>(number);
-  return PF_NORMAL;
+  return convert_integer(text, PF_TYPE_INT, longest, *result);
 }
 
 TEVPF_STATUS TEV8R1_convert_short(const char* text, std::int16_t* result) noexcept {
-  long long number;
-  if (!parse_integer(text, number)) return fail(PF_BADARG, text, "short");
-  using Limits = std::numeric_limits<std::int16_t>;
-  if (number < Limits::min() || number > Limits::max()) return fail(PF_RANGE, text);
-  *result = static_cast<std::int16_t>(number);
-  return PF_NORMAL;
+  return convert_integer(text, PF_TYPE_SHORT, SIZE_MAX, *result);
 }
 
 TEVPF_STATUS TEV8R1_convert_double(const char* text, double* result) noexcept {
