@@ -8,7 +8,6 @@ namespace tevpf {
 namespace {
 
 constexpr std::int32_t kDescriptionWidth = 54;
-constexpr char kDescriptionIndent[] = "\t\t\t\t\t\t\t\t\t      ";  // to where descriptions start
 
 }  // namespace
 

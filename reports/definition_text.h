@@ -19,6 +19,8 @@ TEVPF_API TEVPF_STATUS TEV8R1_print_col_def(std::FILE* stream, const TEVPF_COLUM
 namespace tevpf {
 
 inline constexpr char kNoValue[] = "@";  // stands for a field without a value
+inline constexpr char kDescriptionIndent[] =
+    "\t\t\t\t\t\t\t\t\t      ";  // to where descriptions start
 
 // How definitions show a value type.
 struct TypeText {

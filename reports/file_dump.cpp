@@ -22,12 +22,11 @@ constexpr char kElementEnd[] = "!\n\f\n";
 void write_header_value(TextOut& out, const TEVPF_PARAM_DEF& def) noexcept {
   out.print("*\t\t", LeftText{field_text(def.name), 20}, ": ");
   if (def.type == PF_TYPE_STRING) {
-    const char* const value = def.part.str.value == nullptr ? "" : def.part.str.value;
-    write_wrapped(out, FirstLine::kGoesOn, kHeaderWidth, value, kHeaderIndent);
+    write_wrapped(out, FirstLine::kGoesOn, kHeaderWidth, def.part.str.value, kHeaderIndent);
   } else if (is_number_type(def.type)) {
     with_number(def.type, [&](auto tag) {
       using T = decltype(tag);
-      write_number<T>(out, number_part<T>(def).value, 0, 6);
+      write_number<T>(out, number_part<T>(def).value, 0, kDefaultPrecision);
     });
   }
   out.print("\n\n");

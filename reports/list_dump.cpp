@@ -18,7 +18,6 @@ constexpr std::int32_t kValueField = 14;  // characters that numbers are right-a
 constexpr std::int32_t kStringWidth = 65;
 constexpr char kStringIndent[] = "\t\t\t\t\t\t\t       ";  // to where values start
 constexpr std::int32_t kDescriptionWidth = 53;
-constexpr char kDescriptionIndent[] = "\t\t\t\t\t\t\t\t\t      ";  // to where descriptions start
 
 // Texts in their escaped form, in a block that grows with the longest of them.
 class EscapedText {
@@ -94,18 +93,16 @@ void ListWriter::write_number_value(const TEVPF_PARAM_DEF& def) noexcept {
   const auto& part = number_part<T>(def);
   write_bounds<T>(out_, def.type, part, 10);
   out_.print(' ');
-  if constexpr (kIsFloating<T>) {
-    out_.print(General{part.value, kValueField, part.precision}, "  ");
-  } else {
-    out_.print(Right{part.value, kValueField}, "  ");
-  }
+  std::int32_t digits = 0;
+  if constexpr (kIsFloating<T>) digits = part.precision;
+  write_number<T>(out_, part.value, kValueField, digits);
+  out_.print("  ");
 }
 
 // Behind the value, in front of a description: blanks up to its field, or the start of a line.
 TEVPF_STATUS ListWriter::write_string_value(const TEVPF_PARAM_DEF& def,
                                             FirstLine& description) noexcept {
-  const char* const value = def.part.str.value == nullptr ? "" : def.part.str.value;
-  const std::string_view text = value;
+  const std::string_view text = def.part.str.value;
   write_no_bounds(out_, 10);
   out_.print("  ");
   if (!escaped_.reserve(text.size())) return fail_empty(PF_NOMEM);

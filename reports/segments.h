@@ -14,9 +14,10 @@ namespace tevpf {
 // How wide the pages of dumps and of listings are.
 struct PageRules {
   std::int32_t one_line;  // widest row that is not cut
-  std::int32_t
-      first_limit;  // that the first segment stays below, with its gap; each further one 8 less
-  std::int32_t least_limit;  // but not less than this
+  // Segments stay below a limit, with their gap: the first below this one, each further one below 8
+  // less, but never less than the least.
+  std::int32_t first_limit;
+  std::int32_t least_limit;
   std::int64_t most_dashes;  // of the rule under a segment's heading
   bool keep_words;  // pieces of rows take in blanks and backslashes that stand at their end
 };
