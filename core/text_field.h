@@ -1,10 +1,10 @@
 // Texts in the fixed fields of records: names, units, descriptions.
 #pragma once
 
-#include <bit>
 #include <cstddef>
-#include <cstdint>
 #include <cstring>
+
+#include "include/tevpf.h"
 
 namespace tevpf {
 
@@ -23,30 +23,6 @@ void terminate_field(char (&field)[N]) noexcept {
   field[N - 1] = '\0';
 }
 
-// Copies the text of a field of 20 bytes and its terminator, nothing behind it: whole words, the last one
-// over the one before, since a walk over names would spend most of its time in calls to strlen and memcpy.
-inline void copy_name(char* out, const char (&field)[20]) noexcept {
-  const auto words = [](const char* place) {
-    std::uint64_t word;
-    std::memcpy(&word, place, sizeof word);
-    return word;
-  };
-  const auto zero_byte = [](std::uint64_t word) {  // its number, at most 8
-    const std::uint64_t zeros = (word - 0x0101010101010101u) & ~word & 0x8080808080808080u;
-    return static_cast<std::size_t>(std::countr_zero(zeros)) / 8;
-  };
-  std::size_t end = zero_byte(words(field));
-  if (end == 8) end += zero_byte(words(field + 8));
-  if (end == 16) end = 12 + zero_byte(words(field + 12));
-  if (end < 7) {
-    std::memcpy(out, field, end + 1);
-    return;
-  }
-  std::memcpy(out, field, 8);
-  if (end > 15) std::memcpy(out + 8, field + 8, 8);
-  std::memcpy(out + end - 7, field + end - 7, 8);
-}
-
 // Whether a field holds exactly this text, which has fewer than 8 characters; false when it is longer. Most
 // names are short, and a call costs as much as eight steps.
 template <std::size_t N>
@@ -63,7 +39,7 @@ inline bool starts_with_blank(const char* name) noexcept { return name[0] == ' '
 
 // Names of elements count as equal when as much of them as is kept is equal.
 inline bool same_element_name(const char* a, const char* b) noexcept {
-  return std::strncmp(a, b, 19) == 0;
+  return std::strncmp(a, b, TEVPF_NAME_SIZE - 1) == 0;
 }
 
 }  // namespace tevpf

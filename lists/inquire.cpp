@@ -1,21 +1,11 @@
 // What can be asked of a list without moving its cursor.
-#include "core/directory.h"
+#include <cstring>
+
 #include "core/library.h"
-#include "core/status.h"
-#include "lists/list.h"
-#include "lists/name_index.h"
-#include "lists/param_record.h"
-#include "values/value_type.h"
+#include "lists/find.h"
 
 namespace tevpf {
 namespace {
-
-// A parameter of a list of the current file.
-TEVPF_STATUS find(const char* list_name, const char* param_name, TEVPF_LIST*& list,
-                  std::int32_t& position) noexcept {
-  PF_TRY(TEV8R1_get_list_ptr(list_name, &list));
-  return find_param(*list, param_name, position);
-}
 
 // The sizes fit, because they are part of btf.
 TEVPF_STATUS sizes_of(const TEVPF_PARAM_DEF& definition, std::int32_t* type_out,
@@ -39,7 +29,7 @@ TEVPF_STATUS TEV8R1_PF_inq_param_size(const char* list_name, const char* param_n
                                       std::int32_t* desc_size_out) noexcept {
   TEVPF_LIST* list;
   std::int32_t position;
-  PF_TRY(find(list_name, param_name, list, position));
+  PF_TRY(find_param_of(list_name, param_name, list, position));
   return sizes_of(list->param_ptr[position].def, type_out, value_size_out, desc_size_out);
 }
 
@@ -47,10 +37,7 @@ TEVPF_STATUS TEV8R1_PF_inq_param_size_by_pos(const char* list_name, std::int32_t
                                              std::int32_t* type_out, std::int32_t* value_size_out,
                                              std::int32_t* desc_size_out) noexcept {
   TEVPF_LIST* list;
-  PF_TRY(TEV8R1_get_list_ptr(list_name, &list));
-  if (position < 0 || position >= list->num_params) {
-    return fail(PF_BADPOS, Text(position), Text(list->num_params));
-  }
+  PF_TRY(find_list_with(list_name, position, list));
   return sizes_of(list->param_ptr[position].def, type_out, value_size_out, desc_size_out);
 }
 
@@ -75,7 +62,7 @@ TEVPF_STATUS TEV8R1_inq_param_pos(const char* list_name, const char* param_name,
                                   std::int32_t* position_out) noexcept {
   TEVPF_LIST* list;
   std::int32_t position;
-  PF_TRY(find(list_name, param_name, list, position));
+  PF_TRY(find_param_of(list_name, param_name, list, position));
   *position_out = position;
   return PF_NORMAL;
 }
@@ -83,14 +70,14 @@ TEVPF_STATUS TEV8R1_inq_param_pos(const char* list_name, const char* param_name,
 TEVPF_STATUS TEV8R1_inq_param_exists(const char* list_name, const char* param_name) noexcept {
   TEVPF_LIST* list;
   std::int32_t position;
-  return find(list_name, param_name, list, position);
+  return find_param_of(list_name, param_name, list, position);
 }
 
 TEVPF_STATUS TEV8R1_get_param_type(const char* list_name, const char* param_name,
                                    std::int32_t* type_out) noexcept {
   TEVPF_LIST* list;
   std::int32_t position;
-  PF_TRY(find(list_name, param_name, list, position));
+  PF_TRY(find_param_of(list_name, param_name, list, position));
   *type_out = list->param_ptr[position].def.type;
   return PF_NORMAL;
 }

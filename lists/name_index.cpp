@@ -172,7 +172,6 @@ TEVPF_STATUS TEV8R1_remove_param_from_index(TEVPF_LIST* list, std::int32_t place
   std::int32_t* const index = list->index_ptr;
   const std::int32_t removed = index[place];
   for (std::int32_t i = 0; i < count; ++i) index[i] -= index[i] > removed;
-  TEV8R1_memcpy((count - place - 1) * static_cast<std::int32_t>(sizeof *index), index + place + 1,
-                index + place);
+  std::copy(index + place + 1, index + count, index + place);
   return PF_NORMAL;
 }

@@ -3,11 +3,7 @@
 #include <cstring>
 #include <limits>
 
-#include "core/directory.h"
-#include "core/status.h"
-#include "core/text_field.h"
-#include "lists/list.h"
-#include "lists/name_index.h"
+#include "lists/find.h"
 #include "lists/param_record.h"
 
 namespace tevpf {
@@ -72,8 +68,7 @@ TEVPF_STATUS TEV8R1_PF_get_param_def(const char* list_name, const char* param_na
                                      TEVPF_PARAM_DEF* definition) noexcept {
   TEVPF_LIST* list;
   std::int32_t position;
-  PF_TRY(TEV8R1_get_list_ptr(list_name, &list));
-  PF_TRY(find_param(*list, param_name, position));
+  PF_TRY(find_param_of(list_name, param_name, list, position));
   deliver(*list, position, *definition);
   return PF_NORMAL;
 }
@@ -81,10 +76,7 @@ TEVPF_STATUS TEV8R1_PF_get_param_def(const char* list_name, const char* param_na
 TEVPF_STATUS TEV8R1_PF_get_param_def_by_pos(const char* list_name, std::int32_t position,
                                             TEVPF_PARAM_DEF* definition) noexcept {
   TEVPF_LIST* list;
-  PF_TRY(TEV8R1_get_list_ptr(list_name, &list));
-  if (position < 0 || position >= list->num_params) {
-    return fail(PF_BADPOS, Text(position), Text(list->num_params));
-  }
+  PF_TRY(find_list_with(list_name, position, list));
   deliver(*list, position, *definition);
   return PF_NORMAL;
 }

@@ -1,11 +1,9 @@
 // Values of parameters, in binary form and from text.
 #include <cstring>
 
-#include "core/directory.h"
 #include "core/heap.h"
 #include "core/status.h"
-#include "lists/list.h"
-#include "lists/name_index.h"
+#include "lists/find.h"
 #include "lists/param_check.h"
 #include "lists/param_record.h"
 #include "values/value_type.h"
@@ -62,8 +60,7 @@ TEVPF_STATUS TEV8R1_PF_modify_param(const char* list_name, const char* param_nam
                                     const void* value) noexcept {
   TEVPF_LIST* list;
   std::int32_t position;
-  PF_TRY(TEV8R1_get_list_ptr(list_name, &list));
-  PF_TRY(find_param(*list, param_name, position));
+  PF_TRY(find_param_of(list_name, param_name, list, position));
 
   TEVPF_PARAM_DEF& definition = list->param_ptr[position].def;
   if (!is_value_type(definition.type)) return bad_type(definition.type);
@@ -79,8 +76,7 @@ TEVPF_STATUS TEV8R1_PF_get_param_value(const char* list_name, const char* param_
                                        void* value_out) noexcept {
   TEVPF_LIST* list;
   std::int32_t position;
-  PF_TRY(TEV8R1_get_list_ptr(list_name, &list));
-  PF_TRY(find_param(*list, param_name, position));
+  PF_TRY(find_param_of(list_name, param_name, list, position));
   list->cur_param = position;
   copy_value(list->param_ptr[position].def, value_out);
   return PF_NORMAL;
