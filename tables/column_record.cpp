@@ -4,7 +4,6 @@
 #include <cstring>
 #include <utility>
 
-#include "core/directory.h"
 #include "core/heap.h"
 #include "core/status.h"
 #include "core/text_field.h"
@@ -154,14 +153,4 @@ TEVPF_STATUS TEV8R1_get_col_ptr(const TEVPF_TABLE* table, const char* name,
     }
   }
   return fail(PF_NOCOLUMN, name);
-}
-
-TEVPF_STATUS TEV8R1_get_col_type(const char* table_name, const char* column_name,
-                                 std::int32_t* type_out) noexcept {
-  TEVPF_TABLE* table = nullptr;
-  TEVPF_COLUMN* column = nullptr;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
-  PF_TRY(TEV8R1_get_col_ptr(table, column_name, &column));
-  *type_out = column->def.type;
-  return PF_NORMAL;
 }

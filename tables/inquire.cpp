@@ -50,6 +50,16 @@ TEVPF_STATUS TEV8R1_PF_inq_col_def_by_pos(const char* table_name, std::int32_t p
   return copy_definition(table->col_array[pos].def, *def_out);
 }
 
+TEVPF_STATUS TEV8R1_get_col_type(const char* table_name, const char* column_name,
+                                 std::int32_t* type_out) noexcept {
+  TEVPF_TABLE* table = nullptr;
+  TEVPF_COLUMN* column = nullptr;
+  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(TEV8R1_get_col_ptr(table, column_name, &column));
+  *type_out = column->def.type;
+  return PF_NORMAL;
+}
+
 TEVPF_STATUS TEV8R1_PF_inq_col_names(const char* table_name, std::int32_t* count_out,
                                      char (**names_out)[TEVPF_NAME_SIZE]) noexcept {
   using Name = char[TEVPF_NAME_SIZE];
