@@ -7,12 +7,13 @@
  *
  * Conventions
  *   Statuses   Every operation returns one TEVPF_STATUS unless its comment says otherwise. Compare
- *              it for equality with a name below: PF_NORMAL is success, PF_NEWFILE and PF_NOMORE are
- *              results. "Not found" statuses of a group stand at the head of the group.
+ *              it for equality with a name below: PF_NORMAL is success, PF_NEWFILE and PF_NOMORE
+ *              are results. "Not found" statuses of a group stand at the head of the group.
  *   Texts      NUL-terminated 8-bit texts; never null unless the comment says "or null". Texts
  *              handed in are copied; the library keeps no caller's pointer.
- *   Names      Elements, parameters and columns: at most 19 characters, longer names are cut.
- *              Descriptions of elements: at most 79 characters, cut likewise.
+ *   Names      Elements, parameters and columns: at most 19 characters; longer ones are cut when
+ *              they are stored, and find nothing when they are looked up. Descriptions of elements:
+ *              at most 79 characters, cut likewise.
  *   Buffers    Results go to storage of the caller, sized as the comment says. Blocks that an
  *              operation hands out come from malloc and are released by the caller with free of the
  *              same C runtime. A failure leaves out-arguments untouched unless the comment
@@ -186,21 +187,25 @@ typedef struct TEVPF_COL_DEF {
 /* ---- Library and files ----------------------------------------------------------------------
  * PF_NOFILE: no file is open, so none is current. */
 
-/* Initialises the library: forgets every open file and reads the environment variable
- * TEV8R1_debug (defined, even empty: dumps show internal fields).
- *   PF_INITDONE  it was initialised before; only TEV8R1_debug was looked at again */
+/* Initialises the library, once, before anything else: files that are open already are forgotten,
+ * neither written nor closed. Reads the environment variable TEV8R1_debug (defined, even empty:
+ * dumps show internal fields); without this call the library works, with debug output off.
+ *   PF_INITDONE  it was initialised before: files stay open, TEV8R1_debug was looked at again */
 TEVPF_API TEVPF_STATUS TEV8R1_PF_init(void) TEVPF_NOEXCEPT;
 
-/* Opens a parameter file and makes it current; creates an empty one when there is none. Costs
- * O(file size).
- *   name  path; a leading "$NAME/" is replaced by the value of the environment variable "$NAME",
- *         the "$" being part of the variable's name. At most 257 characters after that.
+/* Opens a parameter file and makes it current; creates an empty one when there is none, or when it
+ * may neither be updated nor read but written. O(file size).
+ *   name  path; a leading "$NAME", up to the first "/", is replaced by the value of the environment
+ *         variable "$NAME", the "$" being part of the variable's name. At most 257 characters after
+ *         that: the name by which the file is known from then on.
  *   PF_NEWFILE    open, new and empty; it is deleted again if it is closed without ever being saved
  *   PF_FILEOPEN   already open under this name; the current file stays as it was
  *   PF_OPENFAIL   cannot be opened or created, undefined "$" variable, or name too long
  *   PF_BADFILE    not a parameter file; closed again, current is what closing a file makes current
- *   PF_BADFORMAT, PF_BADTYPE, PF_DUPLICATE, PF_NOMEM
- *                 loading stopped part-way: the file is open and current with what was loaded */
+ *   PF_BADFORMAT, PF_BADTYPE, PF_DUPLICATE
+ *                 loading stopped part-way: the file is open and current with what was loaded
+ *   PF_NOMEM      the same, or else memory ran out before the file was opened: then the current
+ *                 file stays as it was */
 TEVPF_API TEVPF_STATUS TEV8R1_PF_open(const char* name) TEVPF_NOEXCEPT;
 
 /* Makes the open file of that name (as translated by open) current.
@@ -226,15 +231,18 @@ TEVPF_API TEVPF_STATUS TEV8R1_PF_inq_file_elements(
     char (**table_descs_out)[TEVPF_DESC_SIZE]) TEVPF_NOEXCEPT;
 
 /* Writes the current file whole: in place (path null or its own name), or as a copy to another
- * path.
+ * path, which is taken literally; the copy is not opened, and the file is as unsaved as it was.
  *   PF_NOPRIV    read-only, or the system refuses access to the path
- *   PF_OPENFAIL  cannot be opened, or not everything could be written; memory is whole */
+ *   PF_OPENFAIL  cannot be opened, or not everything could be written. What is in memory is whole
+ *                and can be saved again; on the disk is the old file where it can be replaced in one
+ *                step, else (a copy, too) possibly a part of the new one */
 TEVPF_API TEVPF_STATUS TEV8R1_PF_save(const char* path) TEVPF_NOEXCEPT;
 
 /* Closes the current file, writing it first when save is not 0, and releases it. The file opened
  * before it becomes current; for the first one, the one opened after it.
  *   PF_NOPRIV    save of a read-only file: it stays open. Every other outcome closes it
- *   PF_OPENFAIL  it could not be written */
+ *   PF_OPENFAIL  it could not be written, and what was in memory is lost; save first where that
+ *                matters */
 TEVPF_API TEVPF_STATUS TEV8R1_PF_close(int32_t save) TEVPF_NOEXCEPT;
 
 /* Sets how many slots arrays of parameters and rows get at first (default 25) and each time they
@@ -321,9 +329,10 @@ TEVPF_API TEVPF_STATUS TEV8R1_compare(int32_t type, const void* a, const void* b
 TEVPF_API TEVPF_STATUS TEV8R1_string_compare(const char* text, const char* pattern) TEVPF_NOEXCEPT;
 
 /* ---- Lists: parameters ----------------------------------------------------------------------
- * Every operation: PF_NOFILE, PF_NOELEM (no such list). Where a parameter is named: PF_NOPARAM. A
- * name whose first "*" is its last character finds the first parameter, in name order, that starts
- * with what stands before it. Positions count from 0. Finding costs O(log n) or less. */
+ * Every operation that names a list, here and in the next two groups: PF_NOFILE, PF_NOELEM (no such
+ * list). Where a parameter is named: PF_NOPARAM. A name whose first "*" is its last character finds
+ * the first parameter, in name order, that starts with what stands before it. Positions count from
+ * 0. Finding costs O(log n) or less. */
 
 /* Adds a parameter in front of the one at `position` (PF_END_POS, or any position behind the last:
  * at the end; negative: at the front). str.length is ignored, a null str.value is the empty text.
@@ -342,7 +351,8 @@ TEVPF_API TEVPF_STATUS TEV8R1_PF_add_param(const char* list_name, const TEVPF_PA
 TEVPF_API TEVPF_STATUS TEV8R1_PF_delete_param(const char* list_name,
                                               const char* param_name) TEVPF_NOEXCEPT;
 
-/* Replaces everything but the name of the parameter that definition.name selects.
+/* Replaces everything but the name of the parameter that definition.name selects. The
+ * str fields are read as for adding.
  *   PF_BADNAME, PF_BADTYPE, PF_BADRANGE, PF_RANGE, PF_BADPREC as for adding */
 TEVPF_API TEVPF_STATUS TEV8R1_PF_modify_param_def(const char* list_name,
                                                   TEVPF_PARAM_DEF definition) TEVPF_NOEXCEPT;
@@ -352,7 +362,8 @@ TEVPF_API TEVPF_STATUS TEV8R1_PF_modify_param_def(const char* list_name,
 TEVPF_API TEVPF_STATUS TEV8R1_PF_modify_param_name(const char* list_name, const char* old_name,
                                                    const char* new_name) TEVPF_NOEXCEPT;
 
-/* Moves a parameter so that it stands at new_position (PF_END_POS: last). O(n).
+/* Moves a parameter so that it stands at new_position (PF_END_POS: last). O(n). The cursor is not
+ * adjusted.
  *   PF_BADPOS  new_position outside 0..n-1 */
 TEVPF_API TEVPF_STATUS TEV8R1_PF_move_param(const char* list_name, const char* param_name,
                                             int32_t new_position) TEVPF_NOEXCEPT;
@@ -362,6 +373,8 @@ TEVPF_API TEVPF_STATUS TEV8R1_adjust_param_size_btf(int32_t old_type, int32_t ne
                                                     int32_t* btf) TEVPF_NOEXCEPT;
 
 /* The bytes a parameter takes in the file.
+ *   description  or null
+ *   length       of a string's value, without terminator; not looked at for numbers
  *   PF_BADTYPE  no such value type */
 TEVPF_API TEVPF_STATUS TEV8R1_calc_param_bytes(int32_t type, const char* description,
                                                int32_t length, int32_t* bytes_out) TEVPF_NOEXCEPT;
@@ -397,7 +410,8 @@ TEVPF_API TEVPF_STATUS TEV8R1_store_param_value(int32_t type, const char* text,
 TEVPF_API TEVPF_STATUS TEV8R1_PF_inq_param_dft(const char* list_name, int32_t type,
                                                TEVPF_PARAM_DEF* definition_out) TEVPF_NOEXCEPT;
 
-/* Replaces the list's default definition of definition.type. Kept in memory only.
+/* Replaces the list's default definition of definition.type. Kept in memory only. A null str.value
+ * is the empty text; str.length is kept as given.
  *   PF_BADNAME, PF_BADTYPE, PF_BADRANGE, PF_RANGE, PF_BADPREC as for adding a parameter */
 TEVPF_API TEVPF_STATUS TEV8R1_PF_set_param_dft(const char* list_name,
                                                TEVPF_PARAM_DEF definition) TEVPF_NOEXCEPT;
@@ -410,9 +424,13 @@ TEVPF_API TEVPF_STATUS TEV8R1_load_param_dft(TEVPF_PARAM_DEF** table_out) TEVPF_
  * Each list has a cursor: the position of its current parameter, -1 before the first.
  * Definitions go into the caller's record: before the call, description points to a buffer of the
  * description size and, for a string parameter, part.str.value to one of the value size, both as
- * the size inquiries report them. The two pointers stay; everything else is overwritten. */
+ * the size inquiries report them (at least 1: the empty text). The two pointers stay; everything
+ * else is overwritten. */
 
-/* Name (20 bytes) and value of the next parameter. The cursor advances, at the end too.
+/* Name and value of the next parameter. The cursor advances, at the end too, so that a step back
+ * then delivers the last one.
+ *   name_out   at least TEVPF_NAME_SIZE bytes
+ *   value_out  storage of the value size that TEV8R1_PF_inq_next_param_size reports
  *   PF_NOMORE  there is no next parameter */
 TEVPF_API TEVPF_STATUS TEV8R1_PF_get_next_param(const char* list_name, char* name_out,
                                                 void* value_out) TEVPF_NOEXCEPT;
@@ -712,7 +730,8 @@ TEVPF_API char* TEV8R1_strdup(const char* text) TEVPF_NOEXCEPT;
 TEVPF_API TEVPF_STATUS TEV8R1_allocate_elem(int32_t count, int32_t increment, int32_t size,
                                             void** array, void** first_new_out) TEVPF_NOEXCEPT;
 
-/* Inserts value into an array of count entries with room for one more. Always PF_NORMAL. */
+/* Inserts value into an array of count entries with room for one more; a position outside 0..count
+ * inserts nothing. Always PF_NORMAL. */
 TEVPF_API TEVPF_STATUS TEV8R1_insert_index_value(int32_t* array, int32_t count, int32_t position,
                                                  int32_t value) TEVPF_NOEXCEPT;
 
