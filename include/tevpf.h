@@ -234,8 +234,8 @@ TEVPF_API TEVPF_STATUS TEV8R1_PF_inq_file_elements(
  * path, which is taken literally; the copy is not opened, and the file is as unsaved as it was.
  *   PF_NOPRIV    read-only, or the system refuses access to the path
  *   PF_OPENFAIL  cannot be opened, or not everything could be written. What is in memory is whole
- *                and can be saved again; on the disk is the old file where it can be replaced in one
- *                step, else (a copy, too) possibly a part of the new one */
+ *                and can be saved again; on the disk is the old file where it can be replaced in
+ *                one step, else (a copy, too) possibly a part of the new one */
 TEVPF_API TEVPF_STATUS TEV8R1_PF_save(const char* path) TEVPF_NOEXCEPT;
 
 /* Closes the current file, writing it first when save is not 0, and releases it. The file opened
