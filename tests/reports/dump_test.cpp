@@ -73,11 +73,15 @@ TEST_F(Dump, AColumnAddedBetweenDumpsIsFormatted) {
   EXPECT_EQ(data_of(dump_table()), ".  a\n.-----\n\n     3\n");
   text_column("name", 2);
   EXPECT_EQ(data_of(dump_table()), ".  a    name\n.-----------\n\n     3  \\0  \n");
-  // Outside interactive mode a new width leaves the formats, and the width of rows, as they were made.
+  // Outside interactive mode new widths and names leave the formats, and the width of rows, as they
+  // were made.
   TEVPF_COL_DEF wider = table_->col_array[0].def;
   wider.width = 9;
   ASSERT_EQ(TEV8R1_PF_modify_col_def("T", "a", wider), PF_NORMAL);
-  EXPECT_EQ(data_of(dump_table()), ".    a      name\n.-----------\n\n     3  \\0  \n");
+  TEVPF_COL_DEF longer = table_->col_array[1].def;
+  std::strcpy(longer.name, "longest");
+  ASSERT_EQ(TEV8R1_PF_modify_col_def("T", "name", longer), PF_NORMAL);
+  EXPECT_EQ(data_of(dump_table()), ".    a      longest\n.-----------\n\n     3  \\0  \n");
 }
 
 TEST_F(Dump, DebugOutputShowsInnerFields) {
