@@ -18,9 +18,13 @@ class Sink {
 
   static constexpr std::size_t kMaxRecord = 512;  // what `record` can give room for
 
+  // How far behind a record its caller may write, so that what varies in size is copied as if it were of
+  // the largest size.
+  static constexpr std::size_t kSlack = 32;
+
   // Room for a record of so many bytes, which the caller fills at once.
   [[nodiscard]] unsigned char* record(std::size_t bytes) noexcept {
-    if (bytes > room()) empty_buffer();
+    if (bytes + kSlack > room()) empty_buffer();
     unsigned char* place = buffer_ + used_;
     used_ += bytes;
     return place;
@@ -43,7 +47,7 @@ class Sink {
 
   std::FILE* stream_;
   Owned<unsigned char> large_;
-  unsigned char small_[kMaxRecord];  // instead, when memory is short
+  unsigned char small_[kMaxRecord + kSlack];  // instead, when memory is short
   unsigned char* buffer_;
   std::size_t size_;
   std::size_t used_ = 0;

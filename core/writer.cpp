@@ -26,15 +26,20 @@ void put_index(Sink& sink, const std::int32_t* entries, std::int32_t count) noex
 
 TEVPF_STATUS put_param(Sink& sink, const TEVPF_PARAM& param) noexcept {
   const TEVPF_PARAM_DEF& def = param.def;
-  put_fields<kParamFields>(sink, &param);
   TEVPF_STATUS status = PF_NORMAL;
+  std::int32_t part_bytes = 0;
   if (is_value_type(def.type)) {
-    sink.put(&def.part, static_cast<std::uint64_t>(value_type(def.type).param_part));
-    if (def.type == PF_TYPE_STRING) {
-      sink.put(def.part.str.value, static_cast<std::uint64_t>(def.part.str.length) + 1);
-    }
+    part_bytes = value_type(def.type).param_part;
   } else {
     status = fail(PF_BADTYPE, "parameter", Text(def.type));
+  }
+  constexpr std::int32_t kHead = stored_size(kParamFields);
+  static_assert(sizeof def.part <= Sink::kSlack);
+  unsigned char* const place = sink.record(static_cast<std::size_t>(kHead + part_bytes));
+  pack<kParamFields>(&param, place);
+  std::memcpy(place + kHead, &def.part, sizeof def.part);
+  if (def.type == PF_TYPE_STRING) {
+    sink.put(def.part.str.value, static_cast<std::uint64_t>(def.part.str.length) + 1);
   }
   if (def.description != nullptr) put_text(sink, def.description);
   return status;
