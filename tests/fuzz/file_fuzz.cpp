@@ -298,6 +298,7 @@ void change_table(const char* table, Choices& choose) {
       break;
     default:
       TEV8R1_turn_off_interactive();
+      row.back() = 0;  // a value that is a text ends
       TEV8R1_validate_row_value(table, column.c_str(), row.data());
       break;
   }
