@@ -16,15 +16,13 @@ TEVPF_STATUS hand_out_columns(const char* table_name, std::int32_t* count_out, E
                               Fill fill) noexcept {
   TEVPF_TABLE* table = nullptr;
   PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
-  const std::int32_t count = table->num_cols;
-  if (count > 0) {
-    auto* entries =
-        static_cast<Entry*>(heap_zeroed(static_cast<std::uint64_t>(count), sizeof(Entry)));
-    if (entries == nullptr) return fail_empty(PF_NOMEM);
-    for (std::int32_t i = 0; i < count; ++i) fill(table->col_array[i], entries[i]);
-    *entries_out = entries;
-  }
-  *count_out = count;
+  const std::int32_t count = *count_out = table->num_cols;
+  if (count == 0) return PF_NORMAL;
+  auto* entries =
+      static_cast<Entry*>(heap_zeroed(static_cast<std::uint64_t>(count), sizeof(Entry)));
+  if (entries == nullptr) return fail_empty(PF_NOMEM);
+  for (std::int32_t i = 0; i < count; ++i) fill(table->col_array[i], entries[i]);
+  *entries_out = entries;
   return PF_NORMAL;
 }
 

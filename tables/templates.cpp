@@ -78,6 +78,7 @@ TEVPF_STATUS TEV8R1_load_col_dft(TEVPF_TABLE* table) noexcept {
   for (std::int32_t i = 0; i < kTemplates; ++i) {
     templates[static_cast<std::size_t>(i)] = initial_template(PF_TYPE_INT + i);
   }
+  release_templates(*table);
   table->col_dft = templates.release();
   return PF_NORMAL;
 }

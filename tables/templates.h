@@ -6,7 +6,7 @@
 
 extern "C" {
 
-// Gives a table without templates the five initial ones.
+// Gives a table the five initial templates, in place of those it has.
 TEVPF_API TEVPF_STATUS TEV8R1_load_col_dft(TEVPF_TABLE* table) noexcept;
 }
 
