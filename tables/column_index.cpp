@@ -453,19 +453,6 @@ TEVPF_STATUS TEV8R1_binary_search(int32_t type, double tolerance, int32_t count,
   });
 }
 
-TEVPF_STATUS TEV8R1_update_indexes(TEVPF_TABLE* table, const void* row,
-                                   int32_t row_number) noexcept {
-  for (int32_t i = 0; i < table->num_cols; ++i) {
-    TEVPF_COLUMN& column = table->col_array[i];
-    if (column.def.idx_flag == 0) continue;
-    const auto* const value = static_cast<const unsigned char*>(row) + column.offset;
-    int32_t position = 0;
-    (void)search_index(*table, column, 0, table->num_rows, value, position);
-    insert_entry(column, table->num_rows, position, row_number);
-  }
-  return PF_NORMAL;
-}
-
 TEVPF_STATUS TEV8R1_remove_index(int32_t* index, int32_t row_number, int32_t count) noexcept {
   remove_row(index, count, row_number);
   return PF_NORMAL;

@@ -14,8 +14,6 @@
 extern "C" {
 
 TEVPF_API TEVPF_STATUS TEV8R1_create_index(TEVPF_TABLE* table, TEVPF_COLUMN* column) noexcept;
-TEVPF_API TEVPF_STATUS TEV8R1_update_indexes(TEVPF_TABLE* table, const void* row,
-                                             std::int32_t row_number) noexcept;
 }
 
 namespace tevpf {
@@ -26,8 +24,7 @@ struct NewIndex {
   std::int32_t room = 0;  // entries that the block holds
 };
 
-// ---- Whole indexes
-// -------------------------------------------------------------------------------
+// ---- Whole indexes ------------------------------------------------------------------------------
 
 // Builds the index of a column of that type, tolerance and offset over the table's rows, with room
 // for `room` entries (at least num_rows; 0: no block is made); O(n log n). False when memory runs
@@ -59,8 +56,7 @@ void release_index(TEVPF_COLUMN& column) noexcept;
 // geometrically; false when memory runs out, and then every index is as it was but for room.
 [[nodiscard]] bool reserve_index_entries(TEVPF_TABLE& table, std::int32_t rows) noexcept;
 
-// ---- Reading
-// -------------------------------------------------------------------------------------
+// ---- Reading ------------------------------------------------------------------------------------
 
 // The row numbers in order of value; null when there is no array.
 inline const std::int32_t* index_entries(const TEVPF_COLUMN& column) noexcept {
@@ -74,8 +70,7 @@ inline std::int32_t row_at_position(const TEVPF_TABLE& table, std::int32_t posit
   return search != nullptr && search->def.idx_flag != 0 ? search->idx_ptr[position] : position;
 }
 
-// ---- Entries, as rows come and go
-// ----------------------------------------------------------------
+// ---- Entries, as rows come and go ---------------------------------------------------------------
 
 // Searches `count` entries from position `first` on for a key; gives the status and the position
 // (from `first`) that TEV8R1_binary_search gives.

@@ -9,6 +9,7 @@
 #include "core/text_field.h"
 #include "tables/column_index.h"
 #include "tables/layout.h"
+#include "values/value_text.h"
 #include "values/value_type.h"
 
 namespace tevpf {
@@ -111,10 +112,9 @@ TEVPF_STATUS TEV8R1_validate_col_range(const TEVPF_COL_DEF* definition) noexcept
 
   return with_number(def.type, [&](auto tag) -> TEVPF_STATUS {
     using T = decltype(tag);
-    using Shown = std::conditional_t<kIsFloating<T>, double, std::int32_t>;
     const auto& limits = limits_of<T>(def);
     const T min = limits.min, max = limits.max;
-    if (!bounds_in_order(min, max)) return fail(PF_BADRANGE, Text(Shown{min}));
+    if (!bounds_in_order(min, max)) return fail(PF_BADRANGE, ValueText(def.type, &min).c_str());
     if constexpr (kIsFloating<T>) {
       const std::int32_t precision = limits.precision;
       if (precision < 1) return fail(PF_BADPREC, Text(precision), def.name);

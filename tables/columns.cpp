@@ -142,6 +142,16 @@ void append_column(TEVPF_TABLE& table, NewColumn column) noexcept {
   set_layout(table, column.layout);
 }
 
+// Gives a column the next place of a new layout and notes which bytes of a row move there; returns the
+// new number of runs.
+std::int32_t place_again(Layout& layout, TEVPF_COLUMN& column, Run* runs,
+                         std::int32_t num_runs) noexcept {
+  const auto offset = static_cast<std::int32_t>(place_column(layout, column.def));
+  num_runs = add_run(runs, num_runs, {column.offset, offset, column_size(column)});
+  column.offset = offset;
+  return num_runs;
+}
+
 // ---- Deleting -----------------------------------------------------------------------------------
 
 // Lays out the columns but one afresh; the runs are what moves where in a row.
@@ -150,11 +160,7 @@ Layout lay_out_without(TEVPF_TABLE& table, std::int32_t deleted, Run* runs,
   Layout layout;
   num_runs = 0;
   for (std::int32_t i = 0; i < table.num_cols; ++i) {
-    if (i == deleted) continue;
-    TEVPF_COLUMN& column = table.col_array[i];
-    const auto offset = static_cast<std::int32_t>(place_column(layout, column.def));
-    num_runs = add_run(runs, num_runs, {column.offset, offset, column_size(column)});
-    column.offset = offset;
+    if (i != deleted) num_runs = place_again(layout, table.col_array[i], runs, num_runs);
   }
   return layout;
 }
@@ -212,11 +218,7 @@ bool lay_out_moved(const TEVPF_TABLE& table, std::int32_t from, std::int32_t to,
     at(next.columns, moved_position(i, from, to)) = table.col_array[i];
   }
   for (std::int32_t i = 0; i < table.num_cols; ++i) {
-    TEVPF_COLUMN& column = at(next.columns, i);
-    const auto offset = static_cast<std::int32_t>(place_column(next.layout, column.def));
-    next.num_runs =
-        add_run(next.runs.get(), next.num_runs, {column.offset, offset, column_size(column)});
-    column.offset = offset;
+    next.num_runs = place_again(next.layout, at(next.columns, i), next.runs.get(), next.num_runs);
   }
   return true;
 }

@@ -1,6 +1,5 @@
 // Redefining a column: all checks come first, then every block that is needed, then the change.
 #include <cstring>
-#include <type_traits>
 #include <utility>
 
 #include "core/directory.h"
@@ -16,6 +15,7 @@
 #include "tables/layout.h"
 #include "tables/row_store.h"
 #include "values/compare.h"
+#include "values/value_text.h"
 #include "values/value_type.h"
 
 namespace tevpf {
@@ -148,13 +148,12 @@ TEVPF_STATUS TEV8R1_check_column_values(const TEVPF_TABLE* table, std::int32_t o
   if (!is_number_type(definition.type)) return PF_NORMAL;
   const TEVPF_STATUS status = with_number(definition.type, [&](auto tag) -> TEVPF_STATUS {
     using T = decltype(tag);
-    using Shown = std::conditional_t<kIsFloating<T>, double, std::int32_t>;
     const T min = limits_of<T>(definition).min, max = limits_of<T>(definition).max;
     for (std::int32_t i = 0; i < table->num_rows; ++i) {
       const T value = load<T>(row_at(*table, i) + offset);
       if (compare_numbers(value, max, tolerance) > 0 ||
           compare_numbers(value, min, tolerance) < 0) {
-        return fail(PF_RANGE, Text(Shown{value}));
+        return fail(PF_RANGE, ValueText(definition.type, &value).c_str());
       }
     }
     return PF_NORMAL;

@@ -72,10 +72,9 @@ void open_slot(TEVPF_TABLE& table, const void* row, std::int32_t row_number) noe
   store_row(table, row, row_number);
 }
 
-// Gives a stored row its entries in all indexes, at the points that the value checks have found.
-void insert_entries(TEVPF_TABLE& table, std::int32_t row_number,
+// Gives a row its entries in all indexes, at the points that the value checks have found.
+void insert_entries(TEVPF_TABLE& table, const unsigned char* row, std::int32_t row_number,
                     const InsertionPoints& points) noexcept {
-  const unsigned char* const row = row_at(table, row_number);
   std::int32_t known = 0;
   for (std::int32_t i = 0; i < table.num_cols; ++i) {
     TEVPF_COLUMN& column = table.col_array[i];
@@ -105,7 +104,7 @@ TEVPF_STATUS insert_row(TEVPF_TABLE& table, const void* row, std::int32_t row_nu
 
   const std::int32_t place = std::clamp(row_number, 0, table.num_rows);
   open_slot(table, given.get(), place);
-  insert_entries(table, place, points);
+  insert_entries(table, row_at(table, place), place, points);
   count_row(table);
   return PF_NORMAL;
 }
@@ -174,6 +173,12 @@ TEVPF_STATUS TEV8R1_get_space(TEVPF_TABLE* table) noexcept {
     return fail_empty(PF_NOMEM);
   }
   table->free_rows = static_cast<std::int16_t>(increment);
+  return PF_NORMAL;
+}
+
+TEVPF_STATUS TEV8R1_update_indexes(TEVPF_TABLE* table, const void* row,
+                                   int32_t row_number) noexcept {
+  insert_entries(*table, static_cast<const unsigned char*>(row), row_number, InsertionPoints{});
   return PF_NORMAL;
 }
 

@@ -9,4 +9,9 @@ extern "C" {
 // without rows, else the later one; at most 32767, as free_rows counts them.
 //   PF_NOMEM  texts empty; the table is as it was
 TEVPF_API TEVPF_STATUS TEV8R1_get_space(TEVPF_TABLE* table) noexcept;
+
+// Gives a row that num_rows does not count yet its entries in all indexes, which have room for them.
+// Always PF_NORMAL.
+TEVPF_API TEVPF_STATUS TEV8R1_update_indexes(TEVPF_TABLE* table, const void* row,
+                                             std::int32_t row_number) noexcept;
 }

@@ -13,6 +13,10 @@ TEVPF_STATUS comparison_answer(int answer) noexcept {
 
 }  // namespace
 
+TEVPF_STATUS TEV8R1_string_compare(const char* text, const char* pattern) noexcept {
+  return comparison_answer(compare_text(text, make_pattern(pattern)));
+}
+
 TEVPF_STATUS TEV8R1_compare(int32_t type, const void* a, const void* b, double tolerance) noexcept {
   if (!is_value_type(type)) return fail(PF_BADTYPE, "value", Text(type));
   if (type == PF_TYPE_STRING) {
