@@ -190,7 +190,7 @@ inline void ReportTest::fill_lists() {
 
   const std::string value(66, 'v');
   list("Described", "");
-  text("eleven", "12345678901", "fits");
+  text("eleven", "1234567890\t", "fits");
   text("twelve", "123456789012", "moves");
   text("silent", "x");
   text("long", value.c_str(), std::string(60, 'd').c_str(), "m");
