@@ -8,9 +8,9 @@
 namespace tevpf {
 
 namespace {
-constexpr std::size_t kReadAhead = 64 * 1024;
-constexpr std::uint64_t kSmallClaim = 64 * 1024;            // not worth asking how much is left
-constexpr std::uint64_t kMaxRead = std::uint64_t{1} << 30;  // fits size_t everywhere
+constexpr std::size_t kReadAhead = std::size_t{64} * 1024;
+constexpr std::uint64_t kSmallClaim = std::uint64_t{64} * 1024;  // not worth asking what is left
+constexpr std::uint64_t kMaxRead = std::uint64_t{1} << 30;       // fits size_t everywhere
 }  // namespace
 
 bool Input::read_ahead() noexcept {

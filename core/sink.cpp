@@ -5,7 +5,7 @@
 namespace tevpf {
 
 namespace {
-constexpr std::size_t kBuffer = 256 * 1024;
+constexpr std::size_t kBuffer = std::size_t{256} * 1024;
 constexpr std::uint64_t kMaxWrite = std::uint64_t{1} << 30;  // fits size_t everywhere
 }  // namespace
 

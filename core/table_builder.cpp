@@ -19,8 +19,8 @@ namespace tevpf {
 
 namespace {
 
-constexpr std::int64_t kBatchBytes =
-    256 * 1024;  // rows read and cleaned while they are in the cache
+// Rows read and cleaned while they are in the cache.
+constexpr std::int64_t kBatchBytes = std::int64_t{256} * 1024;
 
 // Takes one stored column off the body. Its description is left where it is in the body.
 Parsed parse_column(ByteReader& body, TEVPF_COLUMN& column) noexcept {

@@ -47,7 +47,7 @@ bool strictly_ascending(const TEVPF_LIST& list) noexcept {
 
 // A table of all parameters with room for `names`, at least as many.
 bool build(TEVPF_LIST& list, std::int64_t names) noexcept {
-  std::uint64_t slots = 2 * kFewNames;
+  std::uint64_t slots = 2 * std::uint64_t{kFewNames};
   while (slots < 2 * static_cast<std::uint64_t>(names)) slots *= 2;
   Owned<NameSlot> block = new_array<NameSlot>(slots);
   if (!block) return false;

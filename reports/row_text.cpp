@@ -59,7 +59,7 @@ char* align_right(char* begin, char* end, std::int32_t width) noexcept {
   return end + blanks;
 }
 
-char* align_left(char* begin, char* end, std::int32_t width) noexcept {
+char* align_left(const char* begin, char* end, std::int32_t width) noexcept {
   const std::int64_t blanks = width - (end - begin);
   if (blanks <= 0) return end;
   std::memset(end, ' ', static_cast<std::size_t>(blanks));
