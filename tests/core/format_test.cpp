@@ -255,31 +255,6 @@ TEST_F(FormatTest, TwoParametersOfOneNameAreBothKept) {
   drive_current_file(dir_);
 }
 
-// Every byte flipped, every four bytes overwritten: whatever is loaded works, and saves to a good file.
-TEST_F(FormatTest, NoDamageLeavesAnythingBroken) {
-  const auto try_bytes = [&](const std::string& bytes) {
-    open_bytes(bytes);
-    if (current() == nullptr) return;
-    drive_current_file(dir_);
-    ASSERT_EQ(TEV8R1_PF_close(0), PF_NORMAL);
-  };
-  for (std::size_t place = 0; place < example_.size(); ++place) {
-    SCOPED_TRACE(place);
-    for (const int flip : {0x01, 0x80, 0xff}) {
-      std::string bytes = example_;
-      bytes[place] = static_cast<char>(bytes[place] ^ flip);
-      try_bytes(bytes);
-    }
-    if (place + 4 > example_.size()) continue;
-    for (const std::int32_t word : {-1, 0, 1, INT32_MAX, INT32_MIN}) {
-      std::string bytes = example_;
-      std::memcpy(&bytes[place], &word, sizeof word);
-      try_bytes(bytes);
-    }
-    if (HasFailure()) return;
-  }
-}
-
 // Bodies and rows larger than any buffer on the way.
 TEST_F(FormatTest, LargeElementsAreReadWhole) {
   const std::string text(300'000, 'x');

@@ -1,27 +1,52 @@
-// Runs a fuzz target over the files of a corpus folder, as an ordinary test.
+// Runs a fuzz target as an ordinary test: over the files of a corpus folder, and over each of them with
+// every byte changed and every four bytes overwritten in one of several ways.
 #include <cstdint>
 #include <cstdio>
+#include <cstring>
 #include <filesystem>
 #include <fstream>
 #include <iterator>
+#include <string>
 #include <vector>
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size);
 
+namespace {
+
+void run(const std::string& input) {
+  const std::vector<std::uint8_t> exact(input.begin(), input.end());  // no terminator behind it
+  const std::uint8_t nothing = 0;  // an empty input has an address too, as under the fuzzer
+  LLVMFuzzerTestOneInput(exact.empty() ? &nothing : exact.data(), exact.size());
+}
+
+void run_damaged(std::string input, std::size_t place, std::size_t way) {
+  constexpr std::uint8_t kFlips[] = {0x01, 0x80, 0xff};
+  constexpr std::int32_t kWords[] = {-1, 0, 1, INT32_MAX, INT32_MIN};
+  if (way < std::size(kFlips) || place + 4 > input.size()) {
+    input[place] = static_cast<char>(input[place] ^ kFlips[way % std::size(kFlips)]);
+  } else {
+    std::memcpy(&input[place], &kWords[way - std::size(kFlips)], 4);
+  }
+  run(input);
+}
+
+}  // namespace
+
 int main(int argc, char** argv) {
-  int inputs = 0;
+  std::size_t inputs = 0;
   for (int i = 1; i < argc; ++i) {
     for (const auto& entry : std::filesystem::directory_iterator(argv[i])) {
       std::ifstream file(entry.path(), std::ios::binary);
-      const std::vector<char> bytes{std::istreambuf_iterator<char>(file), {}};
+      const std::string bytes{std::istreambuf_iterator<char>(file), {}};
       std::printf("%s\n", entry.path().c_str());
       std::fflush(stdout);
-      const std::uint8_t nothing = 0;  // an empty input has an address too, as under the fuzzer
-      const auto* data = reinterpret_cast<const std::uint8_t*>(bytes.data());
-      LLVMFuzzerTestOneInput(bytes.empty() ? &nothing : data, bytes.size());
+      run(bytes);
+      for (std::size_t place = 0; place < bytes.size(); ++place) {
+        run_damaged(bytes, place, (place + inputs) % 8);
+      }
       ++inputs;
     }
   }
-  std::printf("%d inputs\n", inputs);
+  std::printf("%zu inputs\n", inputs);
   return inputs > 0 ? 0 : 1;
 }

@@ -1,386 +1,44 @@
-// Opens arbitrary bytes as a parameter file and drives every reading and changing operation over
-// whatever was loaded; then saves, reopens and compares. Nothing may crash, hang, leak or disagree.
+// Opens arbitrary bytes as a parameter file and drives whatever was loaded. Nothing may crash, hang,
+// leak or disagree.
 //
 // Input: one byte n, n bytes that choose the changes, then the file.
 #include <unistd.h>
 
-#include <algorithm>
-#include <cstdint>
 #include <cstdio>
-#include <cstdlib>
-#include <cstring>
-#include <memory>
-#include <string>
-#include <vector>
+#include <filesystem>
 
 #include "core/heap.h"
 #include "include/tevpf.h"
-
-namespace {
+#include "support/drive.h"
 
 // Rows may be as wide as a file says; what one default row takes is bounded here.
 constexpr std::uint64_t kLargestBlock = 4 << 20;
-constexpr int kMostElements = 6, kMostEntries = 12;
-
-void require(bool truth, const char* what) {
-  if (truth) return;
-  std::fprintf(stderr, "broken: %s\n", what);
-  std::abort();
-}
-
-class Choices {
- public:
-  Choices(const std::uint8_t* bytes, std::size_t count) : bytes_(bytes), count_(count) {}
-  std::uint8_t next() { return at_ < count_ ? bytes_[at_++] : 0; }
-  bool left() const { return at_ < count_; }
-
- private:
-  const std::uint8_t* bytes_;
-  std::size_t count_, at_ = 0;
-};
-
-struct FreeBlock {
-  void operator()(void* block) const { std::free(block); }
-};
-template <class T>
-using Block = std::unique_ptr<T, FreeBlock>;
-using Name = char[TEVPF_NAME_SIZE];
-using Desc = char[TEVPF_DESC_SIZE];
-
-struct Names {
-  std::vector<std::string> lists, tables;
-};
-
-Names element_names() {
-  char file[TEVPF_FILE_NAME_SIZE];
-  std::int32_t num_lists = 0, num_tables = 0;
-  Name *lists = nullptr, *tables = nullptr;
-  Desc *list_descs = nullptr, *table_descs = nullptr;
-  TEV8R1_PF_inq_file_elements(file, &num_lists, &lists, &list_descs, &num_tables, &tables,
-                              &table_descs);
-  const Block<Name> a(lists), b(tables);
-  const Block<Desc> d(list_descs), e(table_descs);
-  Names names;
-  for (int i = 0; lists != nullptr && i < std::min(num_lists, kMostElements); ++i)
-    names.lists.emplace_back(lists[i]);
-  for (int i = 0; tables != nullptr && i < std::min(num_tables, kMostElements); ++i)
-    names.tables.emplace_back(tables[i]);
-  return names;
-}
-
-// Everything that can be read of a list, as text to compare.
-std::string read_list(const char* list) {
-  std::string all;
-  TEV8R1_PF_reset_param(list);
-  for (int i = 0; i < kMostEntries; ++i) {
-    std::int32_t type, value_size, desc_size, position;
-    if (TEV8R1_PF_inq_next_param_size(list, &type, &value_size, &desc_size) != PF_NORMAL) break;
-    std::vector<char> value(static_cast<std::size_t>(value_size)),
-        desc(static_cast<std::size_t>(desc_size));
-    TEVPF_PARAM_DEF def{};
-    def.description = desc.data();
-    if (type == PF_TYPE_STRING) def.part.str.value = value.data();
-    require(TEV8R1_PF_get_next_param_def(list, &def) == PF_NORMAL, "a parameter that has sizes");
-    require(std::strlen(desc.data()) + 1 == desc.size(), "description size");
-    require(type != PF_TYPE_STRING || std::strlen(value.data()) + 1 == value.size(), "value size");
-    all.append(def.name).append("|").append(def.units).append("|").append(desc.data());
-    if (type == PF_TYPE_STRING) {
-      all.append(value.data());
-    } else {
-      std::vector<char> number(8);
-      require(TEV8R1_load_param_value(&def, number.data()) == PF_NORMAL, "a value");
-      all.append(number.data(), number.size());
-    }
-    if (TEV8R1_inq_param_pos(list, def.name, &position) == PF_NORMAL)
-      TEV8R1_get_param_type(list, def.name, &type);
-    all.push_back('\n');
-  }
-  std::vector<char> large(1 << 17);
-  char name[TEVPF_NAME_SIZE];
-  TEV8R1_PF_reset_param(list);
-  for (int i = 0; i < kMostEntries; ++i) {
-    std::int32_t type, value_size, desc_size;
-    if (TEV8R1_PF_inq_next_param_size(list, &type, &value_size, &desc_size) != PF_NORMAL) break;
-    large.resize(std::max(large.size(), static_cast<std::size_t>(value_size)));
-    TEV8R1_PF_get_next_param(list, name, large.data());
-  }
-  return all;
-}
-
-struct Table {
-  std::int32_t columns = 0, rows = 0, row_wid = 0, dsp_wid = 0, current = 0;
-  explicit Table(const char* name) {
-    TEV8R1_PF_inq_table_info(name, &columns, &rows, &row_wid, &dsp_wid, &current);
-  }
-  std::vector<unsigned char> row() const {
-    return std::vector<unsigned char>(static_cast<std::size_t>(row_wid) + 1);
-  }
-};
-
-std::string read_table(const char* table) {
-  std::string all;
-  const Table info(table);
-  std::vector<unsigned char> row = info.row();
-  std::vector<std::string> orders = {""};
-  for (int c = 0; c < std::min(info.columns, kMostEntries); ++c) {
-    TEVPF_COL_DEF def;
-    require(TEV8R1_PF_inq_col_def_by_pos(table, c, &def) == PF_NORMAL, "a column by position");
-    const Block<char> description(def.description);
-    all.append(def.name).append("|").append(def.units).append("|").append(
-        std::to_string(def.width));
-    if (def.description != nullptr) all.append(def.description);
-    if (def.idx_flag != 0) orders.emplace_back(def.name);
-    all.push_back('\n');
-  }
-  for (const std::string& order : orders) {
-    TEV8R1_PF_define_table_search(table, order.empty() ? nullptr : order.c_str());
-    TEV8R1_PF_reset_table(table);
-    for (int r = 0; r < kMostEntries && TEV8R1_PF_get_next_row(table, row.data()) == PF_NORMAL;
-         ++r) {
-      all.append(reinterpret_cast<const char*>(row.data()), static_cast<std::size_t>(info.row_wid));
-      TEV8R1_convert_row(table, r);
-    }
-  }
-  TEV8R1_PF_define_table_search(table, nullptr);
-  return all;
-}
-
-std::string read_everything() {
-  const Names names = element_names();
-  std::string all;
-  for (const std::string& list : names.lists) all += list + ":" + read_list(list.c_str());
-  for (const std::string& table : names.tables) all += table + ":" + read_table(table.c_str());
-  return all;
-}
-
-TEVPF_PARAM_DEF some_param(Choices& choose) {
-  static char text[] = "text with\ttab", desc[] = "what it is";
-  TEVPF_PARAM_DEF def{};
-  def.type = PF_TYPE_INT + choose.next() % 6;
-  std::snprintf(def.name, sizeof def.name, "p%d", choose.next() % 8);
-  if (choose.next() % 2 != 0) def.description = desc;
-  if (def.type == PF_TYPE_STRING) def.part.str.value = text;
-  if (def.type == PF_TYPE_INT) def.part.i32 = {choose.next(), 300, -1};
-  if (def.type == PF_TYPE_REAL) def.part.f32 = {choose.next(), 1.0f, 300.0f, -1.0f};
-  if (def.type == PF_TYPE_DOUBLE) def.part.f64 = {choose.next(), 1.0, 300.0, -1.0};
-  return def;
-}
-
-TEVPF_COL_DEF some_column(Choices& choose) {
-  TEVPF_COL_DEF def{};
-  def.type = PF_TYPE_INT + choose.next() % 6;
-  std::snprintf(def.name, sizeof def.name, "c%d", choose.next() % 8);
-  def.idx_flag = choose.next() % 2;
-  def.unq_flag = choose.next() % 2;
-  def.width = choose.next() % 40;
-  if (def.type == PF_TYPE_INT) def.limits.i32 = {1000, -1000};
-  if (def.type == PF_TYPE_REAL) def.limits.f32 = {1000.0f, 0.0f, choose.next()};
-  if (def.type == PF_TYPE_DOUBLE) def.limits.f64 = {1000.0, 0.0, choose.next()};
-  if (def.type == PF_TYPE_SHORT) def.limits.i16 = {1000, 0};
-  return def;
-}
-
-std::string any_param(const char* list, Choices& choose) {
-  std::int32_t count = 0;
-  TEV8R1_PF_inq_num_params(list, &count);
-  char name[TEVPF_NAME_SIZE] = "p*";
-  std::int32_t type, value_size, desc_size;
-  const std::int32_t pos = count > 0 ? choose.next() % count : 0;
-  if (TEV8R1_PF_inq_param_size_by_pos(list, pos, &type, &value_size, &desc_size) == PF_NORMAL &&
-      choose.next() % 4 != 0) {
-    std::vector<char> value(static_cast<std::size_t>(value_size) + 8);
-    if (TEV8R1_set_cur_param(list, pos) == PF_NORMAL && pos > 0) {
-      TEV8R1_set_cur_param(list, pos - 1);
-      TEV8R1_PF_get_next_param(list, name, value.data());
-    }
-  }
-  return name;
-}
-
-void change_list(const char* list, Choices& choose) {
-  const std::string name = any_param(list, choose);
-  const TEVPF_PARAM_DEF def = some_param(choose);
-  const std::int32_t where = choose.next() % 2 != 0 ? PF_END_POS : choose.next() - 5;
-  const double value[4] = {choose.next() * 0.5, 0, 0, 0};
-  switch (choose.next() % 8) {
-    case 0:
-      TEV8R1_PF_add_param(list, &def, where);
-      break;
-    case 1:
-      TEV8R1_PF_delete_param(list, name.c_str());
-      break;
-    case 2:
-      TEV8R1_PF_modify_param_def(list, def);
-      break;
-    case 3:
-      TEV8R1_PF_modify_param_name(list, name.c_str(), def.name);
-      break;
-    case 4:
-      TEV8R1_PF_move_param(list, name.c_str(), where);
-      break;
-    case 5:
-      TEV8R1_PF_modify_param(list, name.c_str(), value);
-      break;
-    case 6:
-      TEV8R1_PF_copy_list(list, def.name);
-      break;
-    default:
-      TEV8R1_PF_set_param_dft(list, def);
-      break;
-  }
-}
-
-std::string any_column(const char* table, Choices& choose) {
-  std::int32_t count = 0;
-  Name* names = nullptr;
-  TEV8R1_PF_inq_col_names(table, &count, &names);
-  const Block<Name> owner(names);
-  return count == 0 || names == nullptr ? "c1" : names[choose.next() % count];
-}
-
-void change_table(const char* table, Choices& choose) {
-  std::vector<unsigned char> row = Table(table).row();
-  TEV8R1_PF_inq_dft_row(table, row.data());
-  const std::string column = any_column(table, choose), other = any_column(table, choose);
-  TEVPF_COL_DEF def = some_column(choose);
-  for (int i = choose.next() % 8; i > 0; --i) row[choose.next() % row.size()] = choose.next();
-  const std::int32_t at = choose.next() % 4 == 0 ? PF_END_POS : choose.next() - 3;
-  const char key[64] = "a*";
-  switch (choose.next() % 16) {
-    case 0:
-      TEV8R1_PF_def_column(table, def);
-      break;
-    case 1:
-      std::snprintf(def.name, sizeof def.name, "%.19s", column.c_str());
-      [[fallthrough]];
-    case 2:
-      TEV8R1_PF_modify_col_def(table, column.c_str(), def);
-      break;
-    case 3:
-      TEV8R1_PF_delete_col(table, column.c_str());
-      break;
-    case 4:
-      TEV8R1_PF_move_col(table, column.c_str(), choose.next() % 2 != 0 ? other.c_str() : nullptr);
-      break;
-    case 5:
-      TEV8R1_PF_add_row(table, row.data());
-      break;
-    case 6:
-      TEV8R1_PF_add_row_by_pos(table, row.data(), at);
-      break;
-    case 7:
-      TEV8R1_PF_get_row_by_pos(table, at, row.data());
-      TEV8R1_PF_delete_row(table);
-      break;
-    case 8:
-      TEV8R1_PF_get_next_row(table, row.data());
-      row[0] ^= 1;
-      TEV8R1_PF_replace_row(table, row.data());
-      break;
-    case 9:
-      TEV8R1_PF_move_row(table, choose.next() % 8, at);
-      break;
-    case 10:
-      TEV8R1_PF_define_table_search(table, column.c_str());
-      break;
-    case 11:
-      TEV8R1_PF_get_row_by_value(table, 1, column.c_str(), key, row.data());
-      break;
-    case 12:
-      TEV8R1_PF_get_value(table, column.c_str(), key, row.data());
-      break;
-    case 13:
-      TEV8R1_set_interactive_table(table);
-      TEV8R1_PF_set_dft_row(table, row.data());
-      break;
-    case 14:
-      TEV8R1_PF_copy_table(table, def.name);
-      break;
-    default:
-      TEV8R1_turn_off_interactive();
-      row.back() = 0;  // a value that is a text ends
-      TEV8R1_validate_row_value(table, column.c_str(), row.data());
-      break;
-  }
-}
-
-void report_everything(const std::string& path) {
-  const std::string text = path + ".txt";
-  const Names names = element_names();
-  TEV8R1_PF_dump_file(text.c_str());
-  for (const std::string& list : names.lists) TEV8R1_PF_dump_list(list.c_str(), text.c_str());
-  for (const std::string& table : names.tables) {
-    TEV8R1_PF_dump_table(table.c_str(), text.c_str());
-    TEV8R1_PF_print_table(table.c_str(), text.c_str(), 1, PF_END_POS, nullptr, -1, PF_END_POS);
-  }
-  std::remove(text.c_str());
-}
-
-const std::string& scratch_path() {
-  static const std::string path = "/dev/shm/tevpf_fuzz_" + std::to_string(getpid());
-  return path;
-}
-
-void write_file(const std::string& path, const std::uint8_t* bytes, std::size_t count) {
-  std::FILE* out = std::fopen(path.c_str(), "wb");
-  require(out != nullptr, "scratch file");
-  if (count > 0) std::fwrite(bytes, 1, count, out);
-  std::fclose(out);
-}
-
-bool open_to_the_end(const std::string& path) {
-  const TEVPF_STATUS status = TEV8R1_PF_open(path.c_str());
-  require(status != PF_NEWFILE && status != PF_FILEOPEN && status != PF_OPENFAIL,
-          "opening what is there");
-  return status == PF_NORMAL;
-}
-
-// A file that was saved reads back as what was in memory.
-void save_and_compare(const std::string& path) {
-  TEV8R1_turn_off_interactive();
-  const std::string before = read_everything(), copy = path + ".copy";
-  if (TEV8R1_PF_save(copy.c_str()) != PF_NORMAL)
-    return;  // an unknown type that was loaded half-way
-  const bool whole = open_to_the_end(copy);
-  require(whole, "a saved file opens");
-  require(read_everything() == before, "a saved file holds what was saved");
-  TEV8R1_PF_close(0);
-  TEV8R1_PF_change_file(path.c_str());
-  std::remove(copy.c_str());
-}
-
-}  // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
   if (size == 0) return 0;
-  const std::size_t count = std::min<std::size_t>(data[0], size - 1);
-  Choices choose(data + 1, count);
-  const std::string& path = scratch_path();
-  write_file(path, data + 1 + count, size - 1 - count);
+  const std::string folder = "/dev/shm/tevpf_fuzz_" + std::to_string(getpid());
+  const std::string path = folder + "/file";
+  std::filesystem::create_directory(folder);
+  const std::string_view input(reinterpret_cast<const char*>(data), size);
+  const std::string_view choices = input.substr(1, data[0]),
+                         file = input.substr(1 + choices.size());
+  std::FILE* out = std::fopen(path.c_str(), "wb");
+  require(out != nullptr, "scratch file");
+  std::fwrite(file.data(), 1, file.size(), out);
+  std::fclose(out);
+
   tevpf::heap_fail_above(kLargestBlock);
   TEV8R1_PF_init();
-
-  open_to_the_end(path);
+  const TEVPF_STATUS status = TEV8R1_PF_open(path.c_str());
+  require(status != PF_NEWFILE && status != PF_FILEOPEN && status != PF_OPENFAIL, "opening a file");
   char current[TEVPF_FILE_NAME_SIZE];
   if (TEV8R1_PF_inq_current_file(current) == PF_NORMAL) {
-    report_everything(path);
-    save_and_compare(path);
-    while (choose.left()) {
-      const Names names = element_names();
-      const std::uint8_t which = choose.next();
-      if (which % 2 != 0 && !names.lists.empty())
-        change_list(names.lists[which / 2 % names.lists.size()].c_str(), choose);
-      if (which % 2 == 0 && !names.tables.empty())
-        change_table(names.tables[which / 2 % names.tables.size()].c_str(), choose);
-      if (which == 255) TEV8R1_PF_create_elem("made", "", 1 + choose.next() % 2);
-    }
-    report_everything(path);
-    save_and_compare(path);
+    drive_current_file(folder, {choices});
     TEV8R1_PF_close(1);
     require(TEV8R1_PF_inq_current_file(current) == PF_NOFILE, "everything is closed");
   }
   TEV8R1_turn_off_interactive();
   tevpf::heap_fail_above(UINT64_MAX);
-  std::remove(path.c_str());
+  std::filesystem::remove_all(folder);
   return 0;
 }
