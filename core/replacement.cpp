@@ -70,9 +70,10 @@ bool reached_disk(int fd) noexcept {
   return fsync(fd) == 0 || errno == EINVAL || errno == ENOTSUP || errno == EROFS;
 }
 
+// The system does not allow a file beside this one, or in its place; nothing is wrong with the disk.
 bool may_be_written_plainly(int error_number) noexcept {
-  return error_number == EACCES || error_number == EPERM || error_number == EBUSY ||
-         error_number == EXDEV;
+  return error_number == EACCES || error_number == EPERM || error_number == EROFS ||
+         error_number == EBUSY || error_number == EXDEV || error_number == ENAMETOOLONG;
 }
 
 // So that the new name survives a power cut; the file is whole either way.
@@ -95,6 +96,7 @@ Replacement::Replacement(const char* name) noexcept {
   std::memcpy(image_ + length, kSuffix, sizeof kSuffix);
   Descriptor image(mkostemp(image_, O_CLOEXEC));
   if (image.get() < 0) {
+    failed_ = !may_be_written_plainly(errno);
     image_[0] = '\0';
     return;
   }

@@ -20,6 +20,8 @@ class Replacement {
   Replacement& operator=(const Replacement&) = delete;
 
   [[nodiscard]] bool is_possible() const noexcept { return stream_ != nullptr; }
+  // There was no room for an image. A plain write would empty the file and then find none either.
+  [[nodiscard]] bool has_failed() const noexcept { return failed_; }
   [[nodiscard]] std::FILE* stream() const noexcept { return stream_; }  // open for writing
 
   enum class Outcome {
@@ -42,6 +44,7 @@ class Replacement {
   char image_[kPathSize];   // the new image; empty when there is none to be deleted
 #endif
   std::FILE* stream_ = nullptr;
+  bool failed_ = false;
 };
 
 }  // namespace tevpf

@@ -31,6 +31,7 @@ TEVPF_STATUS overwrite(TEVPF_FILE& file) noexcept {
 // Writes the file in place: by an image that takes its place once it is whole, or else plainly.
 TEVPF_STATUS rewrite(TEVPF_FILE& file) noexcept {
   Replacement replacement(file.file_name);
+  if (replacement.has_failed()) return fail(PF_OPENFAIL, file.file_name);
   if (!replacement.is_possible()) return overwrite(file);
   PF_TRY(write_elements(file, replacement.stream(), file.file_name));
   switch (replacement.put_in_place()) {
