@@ -96,7 +96,7 @@ Replacement::Replacement(const char* name) noexcept {
   std::memcpy(image_ + length, kSuffix, sizeof kSuffix);
   Descriptor image(mkostemp(image_, O_CLOEXEC));
   if (image.get() < 0) {
-    failed_ = !may_be_written_plainly(errno);
+    failed_ = facts.st_size > 0 && !may_be_written_plainly(errno);
     image_[0] = '\0';
     return;
   }

@@ -20,7 +20,7 @@ class Replacement {
   Replacement& operator=(const Replacement&) = delete;
 
   [[nodiscard]] bool is_possible() const noexcept { return stream_ != nullptr; }
-  // There was no room for an image. A plain write would empty the file and then find none either.
+  // There was no room for an image, and the file holds something that a plain write could lose.
   [[nodiscard]] bool has_failed() const noexcept { return failed_; }
   [[nodiscard]] std::FILE* stream() const noexcept { return stream_; }  // open for writing
 

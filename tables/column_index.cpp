@@ -460,8 +460,8 @@ TEVPF_STATUS TEV8R1_remove_index(int32_t* index, int32_t row_number, int32_t cou
 
 TEVPF_STATUS TEV8R1_adjust_index(int32_t num_rows, int16_t free_rows, int32_t** idx_out) noexcept {
   NewIndex index;
-  const int64_t room = int64_t{num_rows} + std::max<int16_t>(free_rows, 0);
-  if (!make_identity_index(num_rows, room, index)) {
+  const int32_t count = std::max(num_rows, 0);
+  if (!make_identity_index(count, int64_t{count} + std::max<int16_t>(free_rows, 0), index)) {
     return fail_empty(PF_NOMEM);
   }
   *idx_out = index.entries.release();

@@ -1,7 +1,9 @@
 // Open files: which one is current, names, access, and saving when the disk does not play along.
 #include <fcntl.h>
 #include <gtest/gtest.h>
+#include <sched.h>
 #include <signal.h>
+#include <sys/mount.h>
 #include <sys/resource.h>
 #include <sys/stat.h>
 #include <sys/wait.h>
@@ -365,6 +367,60 @@ TEST_F(FilesTest, AFailedWriteIsReportedAndDestroysNothing) {
   };
   EXPECT_EQ(in_child(body, false), 0);
   EXPECT_EQ(read_file(at("a")), old);
+  EXPECT_EQ(dir_.entries(), (std::set<std::string>{"a", "copy"}));
+}
+
+// Small disks of the child's own, where the system lets it mount them: full, and without room for one
+// more file.
+TEST_F(FilesTest, AFullDiskKeepsTheOldFile) {
+  constexpr int kNotAllowed = 77;
+  fs::create_directory(at("disk"));
+  const auto body = [&](const char* size) {
+    if (unshare(CLONE_NEWNS) != 0 || mount("", "/", "", MS_REC | MS_PRIVATE, nullptr) != 0 ||
+        mount("tmpfs", at("disk").c_str(), "tmpfs", 0, size) != 0) {
+      _exit(kNotAllowed);
+    }
+    make(at("disk/a"), "L");
+    const std::string old = read_file(at("disk/a"));
+    ASSERT_EQ(open(at("disk/a")), PF_NORMAL);
+    for (int i = 0; i < 1000; ++i) {
+      ASSERT_EQ(TEV8R1_PF_create_elem(std::to_string(i).c_str(), "", PF_ELEM_TABLE), PF_NORMAL);
+    }
+    for (int i = 0; i < 2; ++i) {
+      EXPECT_EQ(TEV8R1_PF_save(nullptr), PF_OPENFAIL);
+      EXPECT_EQ(error_texts(), (ErrorTexts{at("disk/a"), ""}));
+      EXPECT_EQ(read_file(at("disk/a")), old);
+      EXPECT_EQ(std::distance(fs::directory_iterator(at("disk")), {}), 1);
+    }
+    EXPECT_EQ(TEV8R1_PF_save(at("disk/copy").c_str()), PF_OPENFAIL);
+    EXPECT_EQ(TEV8R1_PF_save(at("copy").c_str()), PF_NORMAL);
+    EXPECT_EQ(read_file(at("copy")).size(), 120u + 1000 * 132);
+    EXPECT_EQ(TEV8R1_PF_close(1), PF_OPENFAIL);
+    EXPECT_EQ(read_file(at("disk/a")), old);
+  };
+  for (const char* size : {"size=64k", "size=1m,nr_inodes=2"}) {
+    SCOPED_TRACE(size);
+    const int status = in_child([&] { body(size); }, false);
+    if (WIFEXITED(status) && WEXITSTATUS(status) == kNotAllowed) GTEST_SKIP() << "no mounting";
+    EXPECT_EQ(status, 0);
+  }
+}
+
+// The name stands for another file by now; what is in memory is what the name shall hold.
+TEST_F(FilesTest, AFileReplacedUnderneathIsReplacedAgain) {
+  make(at("a"), "L");
+  const std::string own = read_file(at("a"));
+  ASSERT_EQ(open(at("a")), PF_NORMAL);
+  write_file(at("other"), "other");
+  fs::rename(at("other"), at("a"));
+  EXPECT_EQ(TEV8R1_PF_save(nullptr), PF_NORMAL);
+  EXPECT_EQ(read_file(at("a")), own);
+  fs::remove(at("a"));
+  fs::create_directory(at("a"));
+  EXPECT_EQ(TEV8R1_PF_save(nullptr), PF_OPENFAIL);
+  EXPECT_EQ(error_texts(), (ErrorTexts{at("a"), ""}));
+  EXPECT_EQ(TEV8R1_PF_save(at("copy").c_str()), PF_NORMAL);
+  EXPECT_EQ(read_file(at("copy")), own);
   EXPECT_EQ(dir_.entries(), (std::set<std::string>{"a", "copy"}));
 }
 

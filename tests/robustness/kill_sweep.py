@@ -23,7 +23,7 @@ NEVER_AN_ERROR = {"brk"}  # which tells a failure by another result
 
 
 def run(program, path, *options):
-    command = ["strace", "-f", *options, program, "change", path]
+    command = ["strace", "-f", *options, program, path]
     return subprocess.run(command, stdout=subprocess.DEVNULL, stderr=subprocess.DEVNULL, check=False).returncode
 
 
@@ -55,7 +55,7 @@ def main():
     program = os.path.abspath(sys.argv[1])
     with tempfile.TemporaryDirectory() as folder, concurrent.futures.ThreadPoolExecutor() as pool:
         old, new = (os.path.join(folder, name) for name in ("old.pf", "new.pf"))
-        subprocess.run([program, "make", old], check=True)
+        subprocess.run([program, old], check=True)
         shutil.copy(old, new)
         calls = calls_made(program, new)
         assert not filecmp.cmp(old, new, shallow=False)

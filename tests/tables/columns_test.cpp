@@ -330,52 +330,5 @@ TEST_F(Columns, CopiesAndInquiriesShareNothing) {
   EXPECT_EQ(def.limits.i16.min, -32768);
 }
 
-// Each allocation of each operation fails once; what is seen of the table stays.
-TEST_F(Columns, RunningOutOfMemoryChangesNothing) {
-  static void* block;  // that an operation hands out
-  const std::function<TEVPF_STATUS()> operations[] = {
-      [] { return TEV8R1_PF_def_column("t", described(indexed(col("x", kDouble)), "x")); },
-      [] {
-        return redefine("name", described(indexed(col("name", kText, 4), true), "another text"));
-      },
-      [] {
-        return redefine("r", indexed(col("r", kReal, 8, {-10, 10, 6})));
-      },
-      [] { return TEV8R1_PF_delete_col("t", "name"); },
-      [] { return TEV8R1_PF_move_col("t", "r", "n"); },
-      [] { return TEV8R1_PF_set_col_dft("t", described(col("x", kInt), "x")); },
-      [] { return TEV8R1_PF_copy_table("t", "copy"); },
-      [] {
-        std::int32_t count;
-        return TEV8R1_PF_inq_col_offsets("t", &count, reinterpret_cast<std::int32_t**>(&block));
-      },
-      [] {
-        TEVPF_COL_DEF def{};
-        const TEVPF_STATUS status = TEV8R1_PF_inq_col_def("t", "name", &def);
-        block = def.description;
-        return status;
-      },
-  };
-  for (const auto& operation : operations) {
-    SCOPED_TRACE(&operation - operations);
-    new_table();
-    fill();
-    define({col("a", kInt), col("b", kInt), col("c", kShort)});
-    const std::string before = snapshot();
-    for (int n = 0;; ++n) {
-      block = nullptr;
-      set_error_texts();
-      heap_fail_at(n);
-      const TEVPF_STATUS status = operation();
-      const bool failed = heap_fail_off();
-      std::free(block);
-      ASSERT_EQ(status, failed ? PF_NOMEM : PF_NORMAL) << n;
-      if (!failed) break;
-      EXPECT_EQ(error_texts(), kEmpty);
-      EXPECT_EQ(snapshot(), before) << n;
-    }
-  }
-}
-
 }  // namespace
 }  // namespace tevpf

@@ -1,10 +1,8 @@
 // What random sequences do not reach: tolerances and patterns in tables of cases, the probes of a
-// search, values that are no numbers, limits of counts, and every allocation of every operation failing.
+// search, values that are no numbers, and limits of counts.
 #include <cmath>
-#include <functional>
 #include <limits>
 
-#include "core/heap.h"
 #include "support/table_fixture.h"
 #include "tables/cursor.h"
 #include "tables/rows.h"
@@ -297,74 +295,6 @@ TEST_F(Rows, AMoveThatIsRefusedChangesNothing) {
   EXPECT_EQ(library.dup_row, 2);  // as the rows were without it
   EXPECT_EQ(order(0), before);
   EXPECT_EQ(table().free_rows, free_rows);
-}
-
-// ---- Memory --------------------------------------------------------------------------------------
-
-class RowMemory : public Rows {
- protected:
-  // An indexed unique number, an indexed text (the search column) and a double; no spare slot.
-  static void fill(int rows) {
-    new_table();
-    define({indexed(col("a", kInt), true), indexed(col("s", kText, 10)), col("d", kDouble)});
-    TEV8R1_PF_set_memory_allocation(rows, 2);
-    for (int i = 0; i < rows; ++i) ASSERT_OK(add(std::int32_t{i * 7 % 50}));
-    TEV8R1_PF_set_memory_allocation(0, 0);
-    TEV8R1_PF_define_table_search("t", "s");
-    std::vector<char> row(std::size_t(table().row_wid));
-    TEV8R1_PF_get_row_by_pos("t", rows / 2, row.data());
-  }
-  // A row whose text has no terminator: it is checked in a copy.
-  static std::vector<unsigned char> open_row() {
-    std::vector<unsigned char> row(std::size_t(table().row_wid), 'x');
-    store(row.data(), std::int32_t{999});
-    store(row.data() + column(2).offset, 1.0);
-    return row;
-  }
-};
-
-TEST_F(RowMemory, EveryAllocationOfEveryOperationFailsOnce) {
-  static std::int32_t key = 7, value[8];
-  const struct {
-    const char* name;
-    int rows;
-    int least;  // allocations that it makes at least
-    std::function<TEVPF_STATUS(const void* row)> run;
-  } kOperations[] = {
-      {"first row", 0, 4, [](auto* row) { return TEV8R1_PF_add_row("t", row); }},
-      {"insert", 9, 4, [](auto* row) { return TEV8R1_PF_add_row_by_pos("t", row, 3); }},
-      {"replace", 9, 1, [](auto* row) { return TEV8R1_PF_replace_row("t", row); }},
-      {"default row", 9, 1, [](auto* row) { return TEV8R1_PF_set_dft_row("t", row); }},
-      {"delete", 9, 0, [](auto*) { return TEV8R1_PF_delete_row("t"); }},
-      {"search", 9, 0, [](auto*) { return TEV8R1_PF_define_table_search("t", "a"); }},
-      {"value", 9, 0, [](auto*) { return TEV8R1_PF_get_value("t", "a", &key, value); }},
-      {"build", 9, 2, [](auto*) { return TEV8R1_create_index(&table(), &column(1)); }},
-      {"move", 9, 2,
-       [](auto*) {
-         table().cur_col = nullptr;
-         const TEVPF_STATUS status = TEV8R1_PF_move_row("t", 1, 7);
-         table().cur_col = &column(1);
-         return status;
-       }},
-  };
-  for (const auto& operation : kOperations) {
-    for (std::int64_t n = 0;; ++n) {
-      ASSERT_NO_FATAL_FAILURE(fill(operation.rows));
-      const auto row = open_row();
-      const std::string before = snapshot();
-      set_error_texts();
-      heap_fail_at(n);
-      const TEVPF_STATUS status = operation.run(row.data());
-      const bool failed = heap_fail_off();
-      EXPECT_EQ(status, failed ? PF_NOMEM : PF_NORMAL) << operation.name << ", allocation " << n;
-      if (!failed) {
-        EXPECT_GE(n, operation.least) << operation.name;
-        break;
-      }
-      EXPECT_EQ(error_texts(), kEmpty);
-      ASSERT_EQ(snapshot(), before) << operation.name << ", allocation " << n;
-    }
-  }
 }
 
 }  // namespace

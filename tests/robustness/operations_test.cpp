@@ -1,0 +1,228 @@
+// What must hold for every exported operation: nothing is lost when memory runs out at any of its
+// requests, and no integer argument, however extreme, breaks anything.
+#include "robustness/operations.h"
+
+#include <fstream>
+#include <span>
+
+#include "core/file.h"
+#include "core/heap.h"
+#include "core/library.h"
+#include "core/writer.h"
+#include "lists/list.h"
+#include "support/error_texts.h"
+#include "support/list_check.h"
+#include "support/table_check.h"
+
+namespace {
+
+constexpr std::uint64_t kLargestBlock = 1 << 20;  // enough for the files at hand
+
+std::string trace(const Call& call, const char* what, std::int64_t n) {
+  return std::string(call.operation) + ", " + what + " " + std::to_string(n);
+}
+
+// ---- The library's state as bytes: what files hold as they are saved, and what is not saved ------
+
+template <class T>
+void put(std::string& all, const T& value) {
+  all.append(reinterpret_cast<const char*>(&value), sizeof value);
+}
+
+template <class Definition>
+void put_definitions(std::string& all, const Definition* five) {
+  for (int i = 0; five != nullptr && i < 5; ++i) {
+    Definition def = five[i];
+    if (def.description != nullptr) all += def.description;
+    def.description = nullptr;
+    if constexpr (std::is_same_v<Definition, TEVPF_PARAM_DEF>) {
+      if (def.type == PF_TYPE_STRING) all += def.part.str.value;
+      if (def.type == PF_TYPE_STRING) def.part.str.value = nullptr;
+    }
+    put(all, def);
+  }
+}
+
+void put_stored(std::string& all, const TEVPF_FILE& file) {
+  char* bytes = nullptr;
+  std::size_t size = 0;
+  std::FILE* const stream = open_memstream(&bytes, &size);
+  EXPECT_EQ(tevpf::write_elements(file, stream, ""), PF_NORMAL);
+  std::fclose(stream);
+  all.append(bytes, size);
+  std::free(bytes);
+}
+
+void put_table(std::string& all, const TEVPF_TABLE& table) {
+  const int search = table.cur_col == nullptr ? -1 : int(table.cur_col - table.col_array);
+  for (const int n : {table.dsp_wid, table.next_row, table.cur_row, search}) put(all, n);
+  for (std::int32_t i = 0; i < table.num_cols; ++i) {
+    all += table.col_array[i].format;
+    put(all, table.col_array[i].tolerance);
+  }
+  if (table.dft_row != nullptr) {
+    all.append(reinterpret_cast<const char*>(table.dft_row), std::size_t(table.row_wid));
+  }
+  put_definitions(all, table.col_dft);
+}
+
+std::string snapshot(bool with_spare_slots) {
+  const tevpf::Library& library = tevpf::library;
+  std::string all;
+  for (const int n :
+       {library.num_files, library.interactive, library.alloc_initial, library.alloc_increment}) {
+    put(all, n);
+  }
+  if (library.current_file != nullptr) all += library.current_file->file_name;
+  for (const TEVPF_FILE* f = library.first_file; f != nullptr; f = f->next_file) {
+    all += f->file_name;
+    put(all, f->read_only);
+    put_stored(all, *f);
+    for (const TEVPF_LIST* list : std::span(f->list_ptr, std::size_t(f->num_lists))) {
+      put(all, list->cur_param);
+      put_definitions(all, list->dft_ptr);
+      if (with_spare_slots) put(all, list->free_params);
+    }
+    for (const TEVPF_TABLE* table : std::span(f->table_ptr, std::size_t(f->num_tables))) {
+      put_table(all, *table);
+      if (with_spare_slots) put(all, table->free_rows * 0x10000 + table->free_cols);
+    }
+  }
+  return all;
+}
+
+// The first broken rule of each list and table.
+std::string broken_rules() {
+  std::string all;
+  for (const TEVPF_FILE* f = tevpf::library.first_file; f != nullptr; f = f->next_file) {
+    for (const TEVPF_LIST* list : std::span(f->list_ptr, std::size_t(f->num_lists))) {
+      if (const char* rule = broken_rule(*list)) all += std::string(rule) + "; ";
+    }
+    for (const TEVPF_TABLE* table : std::span(f->table_ptr, std::size_t(f->num_tables))) {
+      if (const char* rule = tevpf_test::broken_rule(*table)) all += std::string(rule) + "; ";
+    }
+  }
+  return all;
+}
+
+class OperationsTest : public testing::Test {
+ protected:
+  OperationsTest() {
+    TEV8R1_PF_init();
+    start();
+    EXPECT_EQ(TEV8R1_PF_save((dir_ / "other").c_str()), PF_NORMAL);
+  }
+  ~OperationsTest() override { close_all(); }
+
+  static void close_all() {
+    while (TEV8R1_PF_close(0) == PF_NORMAL) {
+    }
+    TEV8R1_turn_off_interactive();
+    TEV8R1_PF_set_memory_allocation(0, 0);
+  }
+  void start() const {
+    close_all();
+    for (const char* name : {"file", "new"}) std::remove((dir_ / name).c_str());
+    ASSERT_EQ(TEV8R1_PF_open((dir_ / "file").c_str()), PF_NEWFILE);
+    ASSERT_NO_FATAL_FAILURE(make_elements());
+  }
+
+  // The current file, saved under another name, is read back whole and saved to the same bytes.
+  void expect_reopens() const {
+    const std::string saved = dir_ / "saved", again = dir_ / "again";
+    // Some file systems flush a file that is emptied and filled again.
+    for (const std::string& path : {saved, again}) std::remove(path.c_str());
+    const TEVPF_FILE& file = *tevpf::library.current_file;
+    if (file.num_lists + file.num_tables == 0) return;
+    ASSERT_EQ(TEV8R1_PF_save(saved.c_str()), PF_NORMAL);
+    ASSERT_EQ(TEV8R1_PF_open(saved.c_str()), PF_NORMAL);
+    EXPECT_EQ(broken_rules(), "");
+    EXPECT_EQ(TEV8R1_PF_save(again.c_str()), PF_NORMAL);
+    EXPECT_EQ(read_file(again), read_file(saved));
+  }
+
+  TempDir dir_;
+};
+
+TEST_F(OperationsTest, TheTableNamesEveryExportedOperation) {
+  std::set<std::string> listed, tested;
+  std::ifstream list(TEVPF_OPERATIONS);
+  for (std::string name; std::getline(list, name);) listed.insert(name);
+  for (const Call& call : all_calls(dir_)) tested.insert(std::string("TEV8R1_") + call.operation);
+  EXPECT_EQ(tested, listed);
+  EXPECT_FALSE(listed.empty());
+}
+
+// Each request of each operation fails once: it says so, nothing but spare slots has changed, and the same call
+// then succeeds as if nothing had been; or it can do without and nobody notices.
+TEST_F(OperationsTest, EveryRequestForMemoryFailsOnce) {
+  int requests = 0;
+  std::set<std::string> allocating;
+  for (const Call& call : all_calls(dir_)) {
+    if (call.leeway == kNumbersOnly) continue;
+    start();
+    const TEVPF_STATUS usual = call.run(call.numbers.data());
+    const std::string usual_state = snapshot(true);
+    for (std::int64_t n = 0;; ++n) {
+      SCOPED_TRACE(trace(call, "request", n));
+      start();
+      const std::string before = snapshot(false);
+      set_error_texts();
+      tevpf::heap_fail_at(n);
+      TEVPF_STATUS status = call.run(call.numbers.data());
+      if (!tevpf::heap_fail_off()) break;
+      ++requests;
+      allocating.insert(call.operation);
+      EXPECT_EQ(broken_rules(), "");
+      if (status == PF_NOMEM) {
+        EXPECT_EQ(error_texts(), kEmpty);
+        EXPECT_FALSE(std::filesystem::exists(dir_ / "new"));
+        if (call.leeway == kPartStays) continue;
+        EXPECT_TRUE(snapshot(false) == before);
+        status = call.run(call.numbers.data());
+      }
+      EXPECT_EQ(status, usual);
+      EXPECT_TRUE(snapshot(true) == usual_state);
+      if (HasFailure()) return;
+    }
+  }
+  RecordProperty("requests", requests);
+  RecordProperty("operations", static_cast<int>(allocating.size()));
+  EXPECT_GT(requests, 300);
+}
+
+// A refusal changes nothing but spare slots; what was accepted can be saved and read back.
+TEST_F(OperationsTest, ExtremeNumbersEverywhere) {
+  const std::int32_t extremes[] = {INT32_MIN, INT16_MIN, INT8_MIN,      -1,       0, 1,
+                                   INT8_MAX,  INT16_MAX, INT32_MAX - 1, INT32_MAX};
+  int tried = 0;
+  for (const Call& call : all_calls(dir_)) {
+    for (std::size_t argument = 0; argument < call.numbers.size(); ++argument) {
+      for (const std::int32_t extreme : extremes) {
+        SCOPED_TRACE(trace(call, "argument", std::int64_t(argument)) + " = " +
+                     std::to_string(extreme));
+        start();
+        const std::string before = snapshot(false);
+        std::vector<std::int32_t> numbers = call.numbers;
+        numbers[argument] = extreme;
+        tevpf::heap_fail_above(kLargestBlock);
+        const TEVPF_STATUS status = call.run(numbers.data());
+        tevpf::heap_fail_above(UINT64_MAX);
+        ++tried;
+        EXPECT_EQ(broken_rules(), "");
+        if (call.leeway == kNoStatus) continue;
+        EXPECT_EQ(status & 0xFFFF8000u, 0x09608000u);
+        const auto severity = status & 7u;
+        const bool refused = severity == TEVPF_SEVERITY_ERROR || severity == TEVPF_SEVERITY_WARNING;
+        if (refused && call.leeway == kNone) {
+          EXPECT_TRUE(snapshot(false) == before);
+        }
+        if (!refused && tevpf::library.current_file != nullptr) expect_reopens();
+        if (HasFailure()) return;
+      }
+    }
+  }
+  RecordProperty("calls", tried);
+}
+
+}  // namespace
