@@ -273,6 +273,7 @@ struct Model {
     columns.push_back(column);
     Column& added = columns.back();
     if (!def.idx_flag) added.def.unq_flag = 0;
+    added.def.spare_byte = 0;
     for (Row& row : rows) row.push_back(least(added));
     defaults.push_back(least(added));
     if (def.idx_flag) added.index = sorted(int(columns.size()) - 1);
@@ -408,6 +409,7 @@ class Pair {
     EXPECT_EQ(TEV8R1_PF_create_elem("t", "model", PF_ELEM_TABLE), PF_NORMAL);
     TEV8R1_PF_set_memory_allocation(Model::kInitial, Model::kIncrement);
     model_.dup_row = tevpf::library.dup_row;
+    table_named("t")->RESERVED[7] = 'r';
     set_error_texts();
     define_column();
   }
@@ -465,6 +467,7 @@ class Pair {
     if (t.num_rows == 0 && t.free_rows == 0) model_.free_rows = 0;
     if (t.free_rows != model_.free_rows) return "free_rows " + std::to_string(t.free_rows);
     if (t.free_cols != model_.free_cols) return "free_cols";
+    if (t.RESERVED[7] != 'r') return "RESERVED";
     if (t.dsp_wid != model_.dsp_wid) return "dsp_wid " + std::to_string(t.dsp_wid);
     if (tevpf::library.dup_row != model_.dup_row) return "dup_row";
     if (t.cur_row != model_.cur || t.next_row != model_.next) return "cursor";
@@ -489,7 +492,12 @@ class Pair {
   const char* column_difference(const TEVPF_TABLE& t, int i) {
     const TEVPF_COLUMN& column = t.col_array[i];
     const Column& expected = model_.col(i);
-    const TEVPF_COL_DEF& def = column.def;
+    TEVPF_COL_DEF def = column.def;
+    const char* wanted = expected.def.description;
+    if (wanted != nullptr && def.description != nullptr) {
+      if (std::strcmp(def.description, wanted) != 0) return "description";
+      def.description = expected.def.description;
+    }
     if (std::memcmp(&def, &expected.def, sizeof def) != 0) return "definition";
     if (!def.idx_flag) return nullptr;
     const std::vector<int> entries(column.idx_ptr, column.idx_ptr + t.num_rows);
@@ -691,6 +699,10 @@ class Pair {
     TEVPF_COL_DEF& def = c.def;
     def.type = type;
     std::snprintf(def.name, sizeof def.name, "c%d", ++names_);
+    static constexpr const char* kDescriptions[] = {nullptr, "", "short", "longer than short"};
+    def.description = const_cast<char*>(kDescriptions[below(4)]);
+    std::snprintf(def.units, sizeof def.units, "u%d", names_ % 100);
+    def.spare_byte = std::int8_t(below(3));
     def.width = 1 + below(12);
     def.idx_flag = std::int8_t(chance(60));
     def.unq_flag = std::int8_t(chance(30));
