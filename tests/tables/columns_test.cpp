@@ -20,43 +20,7 @@ class Columns : public TableTest {
   }
 };
 
-TEST_F(Columns, LieBehindEachOtherWhateverTheDetour) {
-  const struct {
-    std::vector<std::int32_t> types;  // below 10: a string of that width
-    std::vector<std::int32_t> offsets;
-    std::int32_t row_wid, mod, extra_bytes;
-  } cases[] = {
-      {{5, kInt}, {0, 8}, 12, 4, 0},
-      {{kShort, 2, kDouble}, {0, 2, 8}, 16, 8, 0},
-      {{kDouble, kShort, kInt}, {0, 8, 12}, 16, 8, 0},
-      {{kDouble, 1, 1, kShort, kShort}, {0, 8, 10, 12, 14}, 16, 8, 0},
-      {{kInt, 1, 2}, {0, 4, 6}, 12, 4, 3},
-      {{2, kShort, 1, kReal, 9}, {0, 4, 6, 8, 12}, 24, 4, 2},
-      {{1, 1, 1}, {0, 2, 4}, 6, 0, 0},
-  };
-  for (const auto& [types, offsets, row_wid, mod, extra_bytes] : cases) {
-    new_table();
-    for (std::size_t i = 0; i < types.size(); ++i) {
-      const std::string name = "c" + std::to_string(i);
-      const bool is_text = types[i] < 10;
-      define({col(name.c_str(), is_text ? kText : types[i], is_text ? types[i] : 6, {0, 1})});
-      if (i == 0) add_rows({{"1"}, {"0"}});
-    }
-    const std::string rows = rows_text();
-    define({col("detour", kDouble)});
-    ASSERT_OK(TEV8R1_PF_move_col("t", "detour", "c0"));
-    ASSERT_OK(TEV8R1_PF_move_col("t", "c0", nullptr));
-    ASSERT_OK(TEV8R1_PF_delete_col("t", "detour"));
-    ASSERT_OK(TEV8R1_PF_move_col("t", "c0", "c1"));
-    EXPECT_EQ(rows_text(), rows);
-    for (std::size_t i = 0; i < types.size(); ++i) {
-      EXPECT_EQ(column(static_cast<int>(i)).offset, offsets[i]);
-    }
-    EXPECT_EQ(table().row_wid, row_wid);
-    EXPECT_EQ(table().mod, mod);
-    EXPECT_EQ(table().extra_bytes, extra_bytes);
-  }
-
+TEST_F(Columns, PlaceBehindARowThatIsPadded) {
   std::int16_t extra = 6, mod = 8;
   std::int32_t pad = 0;
   TEVPF_COLUMN column{};
@@ -66,36 +30,21 @@ TEST_F(Columns, LieBehindEachOtherWhateverTheDetour) {
   EXPECT_EQ(extra, 0);
 }
 
-TEST_F(Columns, DefiningGivesEveryRowTheMinimum) {
+// What a caller leaves in the bytes of a definition that are not his.
+TEST_F(Columns, SpareFieldsOfDefinitions) {
   TEVPF_COL_DEF def = described(col("n", kInt, 6, {3, 9}), "");
   def.unq_flag = def.desc_byte = def.spare_byte = 5;
   def.spare = 77;
   define({def});
-  EXPECT_EQ(table().free_cols, 2);
   EXPECT_EQ(column(0).desc_flag, 15);
   EXPECT_EQ(column(0).def.unq_flag, 0);
   EXPECT_EQ(column(0).def.spare_byte, 0);
   EXPECT_EQ(column(0).def.spare, 77u);
-  add_rows({{"4"}, {"5"}, {"4"}});
-  EXPECT_EQ(table().free_rows, 22);
-
-  define({indexed(col("s", kShort, 6, {-7, 9})), col("text", kText, 4),
-          indexed(col("d", kDouble, 6, {0.25, 9}))});
-  EXPECT_EQ(table().free_cols, 2);
-  EXPECT_EQ(table().free_rows, 0);
-  EXPECT_EQ(rows_text(), "4 -7  0.25/5 -7  0.25/4 -7  0.25");
-  EXPECT_EQ(default_text(), "3 -7  0.25");
-  EXPECT_EQ(table().header.btf, 24 + 57 + 52 + 48 + 68);
+  EXPECT_EQ(table().header.btf, 24 + 57);
   EXPECT_EQ(table().dsp_wid, 0);
-  EXPECT_EQ(order(1), (std::vector<int>{0, 1, 2}));
-  EXPECT_EQ(order(3), (std::vector<int>{0, 1, 2}));
-
-  // A redefinition takes the flags as they come; set without an index, unq_flag is never judged.
   def.description = nullptr;
   ASSERT_OK(redefine("n", def));
   EXPECT_EQ(column(0).desc_flag, 0);
-  ASSERT_OK(redefine("n", indexed(def, true)));
-  EXPECT_EQ(order(0), (std::vector<int>{0, 2, 1}));
 }
 
 struct Refusal {
@@ -159,32 +108,6 @@ TEST_F(Columns, RefusedDefinitionsChangeNothing) {
   EXPECT_EQ(index_entries(column(3)), nullptr);
 }
 
-TEST_F(Columns, RedefiningKeepsRowsAndRebuildsTheDefaultRow) {
-  fill();
-  const std::string zeros(static_cast<std::size_t>(table().row_wid), '\0');
-  ASSERT_OK(TEV8R1_PF_set_dft_row("t", zeros.data()));
-  const std::string rows = rows_text();
-
-  // 0.5004 stood in front of 0.5 as its equal; a finer tolerance tells them apart.
-  EXPECT_EQ(order(2), (std::vector<int>{2, 1, 0}));
-  TEVPF_COL_DEF real = indexed(col("ratio", kReal, 9, {-1, 10, 4}));
-  real.description = const_cast<char*>("longer than before");
-  ASSERT_OK(redefine("r", real));
-  EXPECT_EQ(order(2), (std::vector<int>{2, 0, 1}));
-  EXPECT_EQ(column(2).tolerance, 1e-5);
-  EXPECT_STREQ(column(2).def.description, real.description);
-  EXPECT_EQ(table().cur_col, &column(2));
-  EXPECT_EQ(rows_text(), rows);
-  EXPECT_EQ(default_text(), "-1000  -1");
-
-  real.unq_flag = 1;
-  ASSERT_OK(redefine("ratio", real));
-  real.idx_flag = 0;
-  ASSERT_OK(redefine("ratio", real));
-  EXPECT_EQ(table().cur_col, nullptr);
-  EXPECT_EQ(index_entries(column(2)), nullptr);
-}
-
 TEST_F(Columns, FormatsAreRemadeWhereTheirWidthChangesInInteractiveMode) {
   fill();
   ASSERT_OK(TEV8R1_make_table_format(&table()));
@@ -210,65 +133,6 @@ TEST_F(Columns, FormatsAreRemadeWhereTheirWidthChangesInInteractiveMode) {
   ASSERT_OK(redefine("n", col("n", kText)));
   EXPECT_STREQ(column(0).format, "");
   EXPECT_EQ(column(1).offset, 8);
-}
-
-TEST_F(Columns, RowsIndexesAndSearchFollowTheirColumns) {
-  fill();
-  ASSERT_OK(TEV8R1_PF_move_col("t", "r", "n"));
-  EXPECT_EQ(rows_text(), "0.5 30 c/0.5004 10 a/-1 20 bb");
-  EXPECT_EQ(table().cur_col, &column(0));
-  EXPECT_EQ(table().free_cols, 0);
-  EXPECT_EQ(table().free_rows, 0);
-  define({col("d", kDouble, 6, {7, 7}), col("s", kShort, 6, {1, 2})});
-  ASSERT_OK(TEV8R1_PF_move_col("t", "n", "s"));
-  ASSERT_OK(TEV8R1_PF_move_col("t", "r", nullptr));
-  EXPECT_EQ(rows_text(), "c 7 30 1 0.5/a 7 10 1 0.5004/bb 7 20 1 -1");
-  EXPECT_EQ(default_text(), " 7 -1000 1 -10");
-
-  ASSERT_OK(TEV8R1_PF_delete_col("t", "d"));
-  EXPECT_EQ(rows_text(), "c 30 1 0.5/a 10 1 0.5004/bb 20 1 -1");
-  EXPECT_EQ(default_text(), " -1000 1 -10");
-  EXPECT_EQ(table().cur_col, &column(3));
-  EXPECT_EQ(table().dsp_wid, 4 + 2 + 6 + 2 + 6 + 2 + 8 + 1);
-  EXPECT_EQ(order(1), (std::vector<int>{1, 2, 0}));
-  add_rows({{"dd", "15", "2", "0"}});
-  char row[64];
-  ASSERT_OK(TEV8R1_PF_get_next_row("t", row));
-  EXPECT_EQ(text_of(table(), row), "bb 20 1 -1");
-
-  for (const char* name : {"r", "n", "s", "name"}) {
-    ASSERT_OK(TEV8R1_PF_delete_col("t", name));
-    EXPECT_EQ(table().cur_col, nullptr);
-  }
-  EXPECT_EQ(table().num_rows, 0);
-  EXPECT_EQ(table().dsp_wid, 0);
-  EXPECT_EQ(TEV8R1_PF_get_next_row("t", row), PF_NOMORE);
-  EXPECT_EQ(TEV8R1_PF_delete_row("t"), PF_NOCURROW);
-  define({indexed(col("n", kInt), true)});
-  add_rows({{"2"}, {"1"}});
-  EXPECT_EQ(rows_text(), "2/1");
-}
-
-TEST_F(Columns, SpareRowSlotsGoWhenTheLayoutChanges) {
-  const std::function<TEVPF_STATUS()> changes[] = {
-      [] { return TEV8R1_PF_def_column("t", indexed(col("new", kDouble))); },
-      [] { return redefine("n", indexed(col("n", kDouble))); },
-      [] { return TEV8R1_PF_delete_col("t", "name"); },
-      [] { return TEV8R1_PF_move_col("t", "n", nullptr); },
-  };
-  for (const auto& change : changes) {
-    new_table();
-    define({indexed(col("n", kInt)), col("name", kText, 3), col("s", kShort)});
-    const std::string bad(static_cast<std::size_t>(table().row_wid), '\x7f');
-    EXPECT_EQ(TEV8R1_PF_add_row("t", bad.data()), PF_RANGE);
-    ASSERT_OK(redefine("n", indexed(col("n", kInt, 9))));
-    EXPECT_EQ(table().free_rows, 25);  // a redefinition that changes no place keeps them
-    ASSERT_OK(change());
-    EXPECT_EQ(table().free_rows, 0);
-    const std::string row(static_cast<std::size_t>(table().row_wid), '\0');
-    for (int i = 0; i < 40; ++i) ASSERT_OK(TEV8R1_PF_add_row("t", row.data()));
-    EXPECT_EQ(table().num_rows, 40);
-  }
 }
 
 TEST_F(Columns, MovesAreShownWhenDebugging) {
