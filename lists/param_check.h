@@ -3,7 +3,7 @@
 
 #include "core/status.h"
 #include "lists/list.h"
-#include "values/value_type.h"
+#include "values/value_text.h"
 
 extern "C" {
 
@@ -22,8 +22,7 @@ namespace tevpf {
 // The refusal of a number outside its bounds.
 template <class T>
 [[nodiscard]] TEVPF_STATUS out_of_range(T value) noexcept {
-  using Shown = std::conditional_t<kIsFloating<T>, double, std::int32_t>;
-  return fail(PF_RANGE, Text(static_cast<Shown>(value)));
+  return fail(PF_RANGE, number_text(value));
 }
 
 }  // namespace tevpf

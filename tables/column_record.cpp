@@ -114,7 +114,7 @@ TEVPF_STATUS TEV8R1_validate_col_range(const TEVPF_COL_DEF* definition) noexcept
     using T = decltype(tag);
     const auto& limits = limits_of<T>(def);
     const T min = limits.min, max = limits.max;
-    if (!bounds_in_order(min, max)) return fail(PF_BADRANGE, ValueText(def.type, &min).c_str());
+    if (!bounds_in_order(min, max)) return fail(PF_BADRANGE, number_text(min));
     if constexpr (kIsFloating<T>) {
       const std::int32_t precision = limits.precision;
       if (precision < 1) return fail(PF_BADPREC, Text(precision), def.name);

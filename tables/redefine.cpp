@@ -153,7 +153,7 @@ TEVPF_STATUS TEV8R1_check_column_values(const TEVPF_TABLE* table, std::int32_t o
       const T value = load<T>(row_at(*table, i) + offset);
       if (compare_numbers(value, max, tolerance) > 0 ||
           compare_numbers(value, min, tolerance) < 0) {
-        return fail(PF_RANGE, ValueText(definition.type, &value).c_str());
+        return fail(PF_RANGE, number_text(value));
       }
     }
     return PF_NORMAL;

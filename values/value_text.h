@@ -6,25 +6,27 @@
 
 namespace tevpf {
 
-// Points to a text value, which must outlive it.
+template <class T>
+Text number_text(T value) noexcept {
+  if constexpr (kIsFloating<T>) {
+    return Text(static_cast<double>(value));
+  } else {
+    return Text(std::int32_t{value});
+  }
+}
+
+// A value by its type code. Points to a text value, which must outlive it.
 class ValueText {
  public:
   ValueText(std::int32_t type, const void* value) noexcept
-      : number_(type == PF_TYPE_STRING ? Text(std::int32_t{0}) : number_text(type, value)),
+      : number_(type == PF_TYPE_STRING ? Text(std::int32_t{0}) : text_of_number(type, value)),
         text_(type == PF_TYPE_STRING ? static_cast<const char*>(value) : nullptr) {}
 
   const char* c_str() const noexcept { return text_ != nullptr ? text_ : number_.c_str(); }
 
  private:
-  static Text number_text(std::int32_t type, const void* value) noexcept {
-    return with_number(type, [&](auto tag) {
-      using T = decltype(tag);
-      if constexpr (kIsFloating<T>) {
-        return Text(static_cast<double>(load<T>(value)));
-      } else {
-        return Text(static_cast<std::int32_t>(load<T>(value)));
-      }
-    });
+  static Text text_of_number(std::int32_t type, const void* value) noexcept {
+    return with_number(type, [&](auto tag) { return number_text(load<decltype(tag)>(value)); });
   }
 
   Text number_;
