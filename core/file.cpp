@@ -4,7 +4,6 @@
 #include <cerrno>
 #include <cstring>
 
-#include "core/directory.h"
 #include "core/library.h"
 #include "core/status.h"
 #include "core/text_field.h"
@@ -86,8 +85,8 @@ TEVPF_STATUS TEV8R1_add_file(std::FILE* stream, const char* name, std::uint8_t r
 }
 
 TEVPF_STATUS TEV8R1_free_file(TEVPF_FILE* file) noexcept {
-  for (std::int32_t i = 0; i < file->num_lists; ++i) TEV8R1_free_list(file->list_ptr[i]);
-  for (std::int32_t i = 0; i < file->num_tables; ++i) TEV8R1_free_table(file->table_ptr[i]);
+  for (std::int32_t i = 0; i < file->num_lists; ++i) release_list(file->list_ptr[i]);
+  for (std::int32_t i = 0; i < file->num_tables; ++i) release_table(file->table_ptr[i]);
   drop_names(file->list_names);
   drop_names(file->table_names);
   heap_free(file->list_ptr);

@@ -1,30 +1,13 @@
-#include "lists/defaults.h"
-
-#include <cstring>
-#include <limits>
-
+// The operations on a list's default definitions.
 #include "core/directory.h"
-#include "core/heap.h"
 #include "core/status.h"
-#include "core/text_field.h"
+#include "lists/list.h"
 #include "lists/param_check.h"
 #include "lists/param_record.h"
 #include "values/value_type.h"
 
 namespace tevpf {
 namespace {
-
-constexpr std::int32_t kSlots = 5;
-constexpr std::int32_t kPrecision = 6;
-
-// The initial definition of a number: any value of the type.
-template <class T>
-void initialise(TEVPF_PARAM_DEF& slot) noexcept {
-  auto& part = number_part<T>(slot);
-  part.max = std::numeric_limits<T>::max();
-  part.min = std::numeric_limits<T>::lowest();
-  if constexpr (kIsFloating<T>) part.precision = kPrecision;
-}
 
 // The list's table, made by the first operation that needs it; null when memory runs out.
 TEVPF_PARAM_DEF* defaults_of(TEVPF_LIST& list) noexcept {
@@ -33,47 +16,9 @@ TEVPF_PARAM_DEF* defaults_of(TEVPF_LIST& list) noexcept {
 }
 
 }  // namespace
-
-void release_defaults(TEVPF_PARAM_DEF* table) noexcept {
-  if (table == nullptr) return;
-  for (std::int32_t i = 0; i < kSlots; ++i) release_texts(table[i]);
-  heap_free(table);
-}
-
-bool copy_defaults(const TEVPF_PARAM_DEF* source, TEVPF_PARAM_DEF*& copy) noexcept {
-  if (source == nullptr) return true;
-  Owned<TEVPF_PARAM_DEF> table = new_array<TEVPF_PARAM_DEF>(kSlots);
-  if (!table) return false;
-  for (std::int32_t i = 0; i < kSlots; ++i) {
-    table[i] = source[i];
-    if (own_texts(table[i])) continue;
-    while (i-- > 0) release_texts(table[i]);
-    return false;
-  }
-  copy = table.release();
-  return true;
-}
-
 }  // namespace tevpf
 
 using namespace tevpf;
-
-TEVPF_STATUS TEV8R1_load_param_dft(TEVPF_PARAM_DEF** table_out) noexcept {
-  Owned<TEVPF_PARAM_DEF> table = new_zeroed<TEVPF_PARAM_DEF>(kSlots);
-  if (!table) return fail_empty(PF_NOMEM);
-  for (std::int32_t i = 0; i < kSlots; ++i) {
-    TEVPF_PARAM_DEF& slot = table[i];
-    slot.type = PF_TYPE_INT + i;
-    if (slot.type == PF_TYPE_STRING) {
-      slot.part.str.value = heap_copy("");
-      if (slot.part.str.value == nullptr) return fail_empty(PF_NOMEM);
-    } else {
-      with_number(slot.type, [&](auto tag) { initialise<decltype(tag)>(slot); });
-    }
-  }
-  *table_out = table.release();
-  return PF_NORMAL;
-}
 
 TEVPF_STATUS TEV8R1_PF_inq_param_dft(const char* list_name, std::int32_t type,
                                      TEVPF_PARAM_DEF* definition_out) noexcept {

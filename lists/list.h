@@ -9,7 +9,23 @@
 #include <cstdint>
 
 #include "core/element.h"
-#include "lists/name_table.h"
+
+namespace tevpf {
+
+struct NameSlot {
+  std::uint32_t hash;
+  std::int32_t position;  // -1: empty
+};
+
+// The state of lists/name_table.
+struct NameTable {
+  NameSlot* slots;        // open addressing, at most half full; null while not built
+  std::uint32_t mask;     // slots - 1, a power of two - 1
+  std::int32_t lookups;   // since the table was dropped
+  std::uint8_t in_order;  // the index is known to be strictly ascending; a file's need not be
+};
+
+}  // namespace tevpf
 
 extern "C" {
 

@@ -3,8 +3,9 @@
 
 #include "core/heap.h"
 #include "core/text_field.h"
-#include "lists/defaults.h"
+#include "lists/default_table.h"
 #include "lists/list.h"
+#include "lists/name_table.h"
 #include "lists/param_record.h"
 
 namespace tevpf {

@@ -6,6 +6,7 @@
 #include <numeric>
 
 #include "core/status.h"
+#include "lists/name_table.h"
 #include "values/text_compare.h"
 #include "values/value_type.h"
 

@@ -3,7 +3,6 @@
 #include <cstring>
 
 #include "core/heap.h"
-#include "lists/list.h"
 #include "values/text_compare.h"
 
 namespace tevpf {

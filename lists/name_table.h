@@ -5,23 +5,11 @@
 
 #include <cstdint>
 
-struct TEVPF_LIST;
+#include "lists/list.h"
 
 namespace tevpf {
 
 struct TextPattern;
-
-struct NameSlot {
-  std::uint32_t hash;
-  std::int32_t position;  // -1: empty
-};
-
-struct NameTable {
-  NameSlot* slots;        // open addressing, at most half full; null while not built
-  std::uint32_t mask;     // slots - 1, a power of two - 1
-  std::int32_t lookups;   // since the table was dropped
-  std::uint8_t in_order;  // the index is known to be strictly ascending; a file's need not be
-};
 
 // Counts a look-up by exact name and tells whether the table can answer it; builds it when it is due:
 // after some sixteenth as many look-ups as there are parameters.

@@ -5,6 +5,7 @@
 
 #include "core/directory.h"
 #include "core/library.h"
+#include "reports/debug_text.h"
 #include "reports/definition_text.h"
 #include "reports/display.h"
 #include "reports/escape.h"

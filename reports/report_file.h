@@ -23,22 +23,4 @@ template <class Body>
   return status;
 }
 
-// The entries of an index, two a line, as debug output shows them.
-inline void write_index_entries(TextOut& out, const std::int32_t* entries,
-                                std::int32_t count) noexcept {
-  for (std::int32_t i = 0; i < count; ++i) {
-    out.print(i, ".  ", entries[i]);
-    if (i % 2 == 0 && i + 1 < count) {
-      out.print("        ");
-    } else {
-      out.print('\n');
-    }
-  }
-}
-
-// The address of a block as debug output shows it.
-inline std::uintptr_t address_of(const void* block) noexcept {
-  return reinterpret_cast<std::uintptr_t>(block);
-}
-
 }  // namespace tevpf

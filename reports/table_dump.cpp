@@ -4,6 +4,7 @@
 
 #include "core/directory.h"
 #include "core/library.h"
+#include "reports/debug_text.h"
 #include "reports/definition_text.h"
 #include "reports/report_file.h"
 #include "reports/row_text.h"

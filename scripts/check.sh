@@ -1,16 +1,18 @@
 #!/usr/bin/env bash
-# check.sh [format|tidy|cppcheck|shell...]: the static checks, all of them unless some are named.
+# check.sh [format|layers|tidy|cppcheck|shell...]: the static checks, all of them unless some are named.
 set -euo pipefail
 cd "$(dirname "${BASH_SOURCE[0]}")/.."
 
 checks=("$@")
-((${#checks[@]})) || checks=(format tidy cppcheck shell)
+((${#checks[@]})) || checks=(format layers tidy cppcheck shell)
 scripts/install-packages.sh build tool test lint
 
 mapfile -t sources < <(git ls-files '*.cpp' '*.c' '*.h')
 mapfile -t library < <(git ls-files 'core/*.cpp' 'values/*.cpp' 'lists/*.cpp' 'tables/*.cpp' 'reports/*.cpp' 'tools/*.cpp')
 
 check_format() { clang-format --dry-run -Werror "${sources[@]}"; }
+
+check_layers() { scripts/check_layers.py; }
 
 check_tidy() {
   cmake --preset dev >/dev/null
@@ -31,7 +33,7 @@ failed=()
 for check in "${checks[@]}"; do
   echo "== $check"
   case $check in
-    format | tidy | cppcheck | shell) "check_$check" || failed+=("$check") ;;
+    format | layers | tidy | cppcheck | shell) "check_$check" || failed+=("$check") ;;
     *) echo "check.sh: no check '$check'" >&2; exit 2 ;;
   esac
 done

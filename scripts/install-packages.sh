@@ -11,7 +11,7 @@ declare -A groups=(
   [x86]="g++-multilib googletest"
   [windows]="g++-mingw-w64-i686-win32"
   [fuzz]="clang libclang-rt-14-dev llvm"
-  [lint]="clang-format clang-tidy cppcheck shellcheck"
+  [lint]="clang-format clang-tidy cppcheck shellcheck python3"
 )
 
 missing=()

@@ -3,7 +3,6 @@
 #include <limits>
 #include <utility>
 
-#include "core/directory.h"
 #include "core/heap.h"
 #include "core/status.h"
 #include "tables/column_record.h"
@@ -29,17 +28,6 @@ TEVPF_COL_DEF initial_template(std::int32_t type) noexcept {
     if constexpr (kIsFloating<T>) limits.precision = kInitialPrecision;
   });
   return def;
-}
-
-// The table's template of a type; makes the templates where there are none yet.
-TEVPF_STATUS find_template(const char* table_name, std::int32_t type,
-                           TEVPF_COL_DEF*& found) noexcept {
-  TEVPF_TABLE* table = nullptr;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
-  if (table->col_dft == nullptr) PF_TRY(TEV8R1_load_col_dft(table));
-  if (!is_value_type(type)) return fail(PF_BADTYPE, "function call", Text(type));
-  found = &table->col_dft[type - PF_TYPE_INT];
-  return PF_NORMAL;
 }
 
 }  // namespace
@@ -81,24 +69,4 @@ TEVPF_STATUS TEV8R1_load_col_dft(TEVPF_TABLE* table) noexcept {
   release_templates(*table);
   table->col_dft = templates.release();
   return PF_NORMAL;
-}
-
-TEVPF_STATUS TEV8R1_PF_set_col_dft(const char* table_name, TEVPF_COL_DEF def) noexcept {
-  TEVPF_COL_DEF* slot = nullptr;
-  PF_TRY(find_template(table_name, def.type, slot));
-  terminate_texts(def);
-  if (def.description != nullptr) {
-    def.description = heap_copy(def.description);
-    if (def.description == nullptr) return fail_empty(PF_NOMEM);
-  }
-  heap_free(slot->description);
-  *slot = def;
-  return PF_NORMAL;
-}
-
-TEVPF_STATUS TEV8R1_PF_inq_col_dft(const char* table_name, std::int32_t type,
-                                   TEVPF_COL_DEF* def_out) noexcept {
-  TEVPF_COL_DEF* slot = nullptr;
-  PF_TRY(find_template(table_name, type, slot));
-  return copy_definition(*slot, *def_out);
 }
