@@ -80,7 +80,8 @@ TEVPF_STATUS TEV8R1_add_file(std::FILE* stream, const char* name, std::uint8_t r
   if (std::strlen(name) >= TEVPF_FILE_NAME_SIZE) return fail(PF_OPENFAIL, name);
   Owned<TEVPF_FILE> record = new_file_record(name);
   if (!record) return fail_empty(PF_NOMEM);
-  append_file(std::move(record), stream, false).read_only = read_only;
+  TEVPF_FILE& file = append_file(std::move(record), stream, false);
+  file.read_only = read_only;
   return PF_NORMAL;
 }
 

@@ -35,7 +35,8 @@ TEVPF_STATUS put_param(Sink& sink, const TEVPF_PARAM& param) noexcept {
   }
   constexpr std::int32_t kHead = stored_size(kParamFields);
   static_assert(sizeof def.part <= Sink::kSlack);
-  unsigned char* const place = sink.record(static_cast<std::size_t>(kHead + part_bytes));
+  unsigned char* const place =
+      sink.record(std::size_t{kHead} + static_cast<std::size_t>(part_bytes));
   pack<kParamFields>(&param, place);
   std::memcpy(place + kHead, &def.part, sizeof def.part);
   if (def.type == PF_TYPE_STRING) {
