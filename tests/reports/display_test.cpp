@@ -36,7 +36,7 @@ TEST_F(Display, LinesBreakBehindWhiteSpaceOrWithinWords) {
         << c.label;
     std::fputs("|after", stream);
     std::fclose(stream);
-    EXPECT_EQ(slurp("out.txt"), "before|" + std::string(c.shown) + "|after") << c.label;
+    EXPECT_EQ(read_file("out.txt"), "before|" + std::string(c.shown) + "|after") << c.label;
   }
 }
 

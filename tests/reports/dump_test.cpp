@@ -12,12 +12,12 @@ TEST_F(Dump, AFileWithAllKindsOfLists) {
   fill_lists();
   table("TEVPF_FILE_HEADER", "only a name");
   ASSERT_EQ(TEV8R1_PF_dump_file("out.txt"), PF_NORMAL);
-  EXPECT_EQ(slurp("out.txt"), golden("file"));
+  EXPECT_EQ(read_file("out.txt"), golden("file"));
 }
 
 TEST_F(Dump, WithoutAHeaderListTheBlockIsShortAndTheTextsStay) {
   ASSERT_EQ(TEV8R1_PF_dump_file("out.txt"), PF_NORMAL);
-  EXPECT_EQ(slurp("out.txt"),
+  EXPECT_EQ(read_file("out.txt"),
             "\t\tFile name           : report.pf\n\n.\t\tNumber of lists     : 0\n\n"
             ".\t\tNumber of tables    : 0\n\n\f\n");
   EXPECT_STREQ(err_item, "list");
@@ -27,11 +27,11 @@ TEST_F(Dump, WithoutAHeaderListTheBlockIsShortAndTheTextsStay) {
 TEST_F(Dump, RefusalsAndWhatTheyLeave) {
   const char names[1][TEVPF_NAME_SIZE] = {"x"};
   EXPECT_EQ(TEV8R1_PF_dump_list("No", "list.txt"), PF_NOELEM);
-  EXPECT_EQ(slurp("list.txt"), "");
+  EXPECT_EQ(read_file("list.txt"), "");
   EXPECT_EQ(TEV8R1_PF_dump_table("No", "table.txt"), PF_NOELEM);
-  EXPECT_EQ(slurp("table.txt"), "");
+  EXPECT_EQ(read_file("table.txt"), "");
   EXPECT_EQ(TEV8R1_PF_print_table("No", "print.txt", 1, 1, names, 0, 1), PF_NOELEM);
-  EXPECT_EQ(slurp("print.txt"), "");
+  EXPECT_EQ(read_file("print.txt"), "");
   EXPECT_STREQ(err_item, "table");
   EXPECT_STREQ(err_value, "No");
   const std::string nowhere = "no/such/directory";
@@ -62,7 +62,7 @@ TEST_F(Dump, ATableOfMixedColumnsInStorageOrder) {
   std::fputs("mine\n", stream);
   EXPECT_EQ(TEV8R1_table_dump(table_, stream), PF_NORMAL);
   std::fclose(stream);
-  EXPECT_EQ(slurp("own.txt"), "mine\n" + golden("table"));
+  EXPECT_EQ(read_file("own.txt"), "mine\n" + golden("table"));
 }
 
 // A column defined after the formats were made has none: a dump makes all of them, and the width.
@@ -108,7 +108,7 @@ TEST_F(Dump, DebugOutputShowsInnerFields) {
                  std::to_string(reinterpret_cast<std::uintptr_t>(address)));
     return text;
   };
-  EXPECT_EQ(slurp("out.txt"), with_address("debug_list", tiny->index_ptr));
+  EXPECT_EQ(read_file("out.txt"), with_address("debug_list", tiny->index_ptr));
   EXPECT_EQ(dump_table(), with_address("debug_table", table_->col_array[1].idx_ptr));
   ASSERT_EQ(TEV8R1_PF_define_table_search("Pair", "b"), PF_NORMAL);
   EXPECT_NE(dump_table().find("\ncur_col = b\n\n\n."), std::string::npos);
@@ -143,6 +143,49 @@ TEST_F(Dump, HeadingsAndRowsOfSomeColumns) {
   EXPECT_STREQ(line.c_str(), "  7  ");
   EXPECT_STREQ(err_item, "value");
   EXPECT_STREQ(err_value, "16");
+}
+
+TEST_F(Dump, LinesBeyond31BitsAreRefused) {
+  table("T", "");
+  number_column("a", PF_TYPE_INT, INT32_MAX, 9, 1);
+  number_column("b", PF_TYPE_INT, INT32_MAX, 9, 1);
+  EXPECT_EQ(TEV8R1_PF_dump_table("T", "out.txt"), PF_NORMAL);
+  row({1.0, 2.0});
+  EXPECT_EQ(TEV8R1_PF_dump_table("T", "out.txt"), PF_NOMEM);
+  const std::string text = read_file("out.txt");
+  EXPECT_EQ(text.substr(text.size() - 12), "TABLE DATA\n\n");
+  listing({"a", "b"});
+  EXPECT_EQ(status_, PF_NOMEM);
+}
+
+// Precisions that no definition operation would refuse, and widths smaller than any number.
+TEST_F(Dump, NumbersOfAnyPrecisionFitTheirLines) {
+  table("T", "");
+  number_column("a", PF_TYPE_DOUBLE, 1, 1e308, -1e308, kNone, nullptr, INT32_MAX);
+  number_column("b", PF_TYPE_REAL, 1, 1e38, -1e38, kNone, nullptr, 1100);
+  for (const double value : {1e308, -1e308, 4.9406564584124654e-324, 1e-5}) {
+    row({value, value > 1e38 ? 1e38 : value < -1e38 ? -1e38 : value});
+  }
+  char text[2400];
+  std::string expected;
+  for (std::int32_t n = 0; n < table_->num_rows; ++n) {
+    const unsigned char* const at = table_->row_data + n * table_->row_wid;
+    std::snprintf(text, sizeof text, " %1.1100g  %1.1100g\n", load<double>(at),
+                  static_cast<double>(load<float>(at + table_->col_array[1].offset)));
+    expected += text;
+  }
+  EXPECT_EQ(data_of(dump_table()), ".a  b\n.----\n\n" + expected);
+}
+
+// Every character doubled, in the widest text that its column takes.
+TEST_F(Dump, EscapedTextsFitTheirLines) {
+  table("T", "");
+  text_column("a", 100);
+  row({std::string(100, '\t')});
+  std::string doubled;
+  for (int n = 0; n < 100; ++n) doubled += "\\t";
+  EXPECT_TRUE(dump_table().ends_with("\n\n " + doubled + "\n"));
+  EXPECT_TRUE(listing({"a"}).ends_with("\n\n " + doubled + "\n"));
 }
 
 }  // namespace

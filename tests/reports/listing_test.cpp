@@ -21,7 +21,7 @@ TEST_F(Listing, ChosenColumnsInSearchOrder) {
 
 TEST_F(Listing, MoreColumnsThanThereAreMeansAll) {
   ASSERT_EQ(TEV8R1_PF_print_table("Mixed", "out.txt", 0, INT32_MAX, nullptr, 1, 3), PF_NORMAL);
-  EXPECT_EQ(slurp("out.txt"), golden("listing_all"));
+  EXPECT_EQ(read_file("out.txt"), golden("listing_all"));
 }
 
 TEST_F(Listing, ColumnsMayRepeatAndStorageOrderHoldsWithoutASearchColumn) {
@@ -56,7 +56,7 @@ TEST_F(Listing, RefusalsWriteNothing) {
   for (const std::int32_t count : {0, -3}) {
     std::strcpy(err_value, "old");
     EXPECT_EQ(TEV8R1_PF_print_table("Mixed", "out.txt", 0, count, nullptr, 0, 1), PF_BADARG);
-    EXPECT_EQ(slurp("out.txt"), "");
+    EXPECT_EQ(read_file("out.txt"), "");
     EXPECT_EQ(err_item, std::to_string(count));
     EXPECT_STREQ(err_value, "");
   }

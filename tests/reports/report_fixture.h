@@ -3,45 +3,28 @@
 
 #include <gtest/gtest.h>
 
-#include <cstdlib>
-#include <cstring>
-#include <filesystem>
-#include <fstream>
 #include <sstream>
 #include <string>
 #include <variant>
 #include <vector>
 
-#include "core/directory.h"
 #include "core/error_context.h"
-#include "lists/list.h"
-#include "tables/table.h"
-#include "values/value_type.h"
+#include "support/param_def.h"
+#include "support/table_fixture.h"
+#include "support/temp_dir.h"
 
 namespace tevpf {
 
 using Value = std::variant<double, std::string>;
 
-inline std::string slurp(const std::filesystem::path& path) {
-  std::ifstream in(path, std::ios::binary);
-  EXPECT_TRUE(in) << path;
-  std::ostringstream text;
-  text << in.rdbuf();
-  return text.str();
-}
-
 inline std::string golden(const std::string& name) {
-  return slurp(std::string(TEVPF_GOLDEN_DIR) + name + ".golden");
+  return read_file(std::string(TEVPF_GOLDEN_DIR) + name + ".golden");
 }
 
 class ReportTest : public ::testing::Test {
  protected:
   void SetUp() override {
-    const std::string pattern = (std::filesystem::temp_directory_path() / "tevpf.XXXXXX").string();
-    std::vector<char> name(pattern.c_str(), pattern.c_str() + pattern.size() + 1);
-    ASSERT_NE(mkdtemp(name.data()), nullptr);
-    directory_ = name.data();
-    std::filesystem::current_path(directory_);
+    std::filesystem::current_path(dir_.path());
     unsetenv("TEV8R1_debug");
     TEV8R1_PF_init();
     ASSERT_EQ(TEV8R1_PF_open("report.pf"), PF_NEWFILE);
@@ -52,7 +35,6 @@ class ReportTest : public ::testing::Test {
     while (TEV8R1_PF_close(0) == PF_NORMAL) {
     }
     std::filesystem::current_path(std::filesystem::temp_directory_path());
-    std::filesystem::remove_all(directory_);
   }
 
   static void list(const char* name, const char* description) {
@@ -60,22 +42,18 @@ class ReportTest : public ::testing::Test {
     list_ = name;
   }
   // Parameters at the end of the last list.
-  static void number(const char* name, const char* units, std::int32_t type, double max, double min,
-                     double value, const char* description = nullptr, std::int32_t precision = 1) {
-    TEVPF_PARAM_DEF def = named<TEVPF_PARAM_DEF>(name, units, type, description);
-    with_number(type, [&](auto tag) {
-      using T = decltype(tag);
-      auto& part = number_part<T>(def);
-      part.value = static_cast<T>(value);
-      set_bounds<T>(part, max, min, precision);
-    });
-    ASSERT_EQ(TEV8R1_PF_add_param(list_, &def, PF_END_POS), PF_NORMAL) << err_item;
+  static void add(const Def& def) {
+    const TEVPF_PARAM_DEF c = to_c(def);
+    ASSERT_EQ(TEV8R1_PF_add_param(list_, &c, PF_END_POS), PF_NORMAL) << err_item;
   }
-  static void text(const char* name, const char* value, const char* description = nullptr,
+  static void number(const char* name, const char* units, std::int32_t type, double max, double min,
+                     double value, std::optional<std::string> description = {},
+                     std::int32_t precision = 1) {
+    add({type, name, units, description, value, max, min, precision});
+  }
+  static void text(const char* name, const char* value, std::optional<std::string> description = {},
                    const char* units = "") {
-    TEVPF_PARAM_DEF def = named<TEVPF_PARAM_DEF>(name, units, PF_TYPE_STRING, description);
-    def.part.str.value = const_cast<char*>(value);
-    ASSERT_EQ(TEV8R1_PF_add_param(list_, &def, PF_END_POS), PF_NORMAL) << err_item;
+    add({PF_TYPE_STRING, name, units, description, 0, 0, 0, 0, value});
   }
 
   static void table(const char* name, const char* description) {
@@ -87,19 +65,13 @@ class ReportTest : public ::testing::Test {
   static void number_column(const char* name, std::int32_t type, std::int32_t width, double max,
                             double min, Index index = kNone, const char* description = nullptr,
                             std::int32_t precision = 1, const char* units = "") {
-    TEVPF_COL_DEF def = named<TEVPF_COL_DEF>(name, units, type, description);
-    def.width = width;
-    def.idx_flag = index != kNone;
-    def.unq_flag = index == kUnique;
-    with_number(type, [&](auto tag) {
-      set_bounds<decltype(tag)>(limits_of<decltype(tag)>(def), max, min, precision);
-    });
+    TEVPF_COL_DEF def = described(col(name, type, width, {min, max, precision}), description);
+    std::strcpy(def.units, units);
+    if (index != kNone) def = indexed(def, index == kUnique);
     ASSERT_EQ(TEV8R1_PF_def_column(table_->header.elem_name, def), PF_NORMAL) << err_item;
   }
   static void text_column(const char* name, std::int32_t width, const char* units = "") {
-    TEVPF_COL_DEF def = named<TEVPF_COL_DEF>(name, units, PF_TYPE_STRING, nullptr);
-    def.width = width;
-    ASSERT_EQ(TEV8R1_PF_def_column(table_->header.elem_name, def), PF_NORMAL) << err_item;
+    number_column(name, PF_TYPE_STRING, width, 0, 0, kNone, nullptr, 1, units);
   }
   // A row at the end of the last table, a value for each column.
   static void row(const std::vector<Value>& values) {
@@ -120,7 +92,7 @@ class ReportTest : public ::testing::Test {
 
   static std::string dump_table() {
     EXPECT_EQ(TEV8R1_PF_dump_table(table_->header.elem_name, "out.txt"), PF_NORMAL);
-    return slurp("out.txt");
+    return read_file("out.txt");
   }
   static std::string listing(const std::vector<std::string>& names, std::int32_t first = 0,
                              std::int32_t last = PF_END_POS, std::int32_t definitions = 0) {
@@ -131,7 +103,7 @@ class ReportTest : public ::testing::Test {
     status_ = TEV8R1_PF_print_table(
         table_->header.elem_name, "out.txt", definitions, static_cast<std::int32_t>(names.size()),
         reinterpret_cast<const char(*)[TEVPF_NAME_SIZE]>(fields.data()), first, last);
-    return slurp("out.txt");
+    return read_file("out.txt");
   }
   // What stands behind the heading of the rows' block.
   static std::string data_of(const std::string& report) {
@@ -148,25 +120,7 @@ class ReportTest : public ::testing::Test {
   inline static TEVPF_STATUS status_ = PF_NORMAL;
 
  private:
-  template <class Def>
-  static Def named(const char* name, const char* units, std::int32_t type,
-                   const char* description) {
-    Def def{};
-    def.type = type;
-    std::strncpy(def.name, name, sizeof def.name - 1);
-    std::strncpy(def.units, units, sizeof def.units - 1);
-    def.description = const_cast<char*>(description);
-    return def;
-  }
-
-  template <class T, class Part>
-  static void set_bounds(Part& part, double max, double min, std::int32_t precision) {
-    part.max = static_cast<T>(max);
-    part.min = static_cast<T>(min);
-    if constexpr (kIsFloating<T>) part.precision = precision;
-  }
-
-  std::filesystem::path directory_;
+  TempDir dir_;
 };
 
 inline void ReportTest::fill_lists() {
@@ -182,8 +136,8 @@ inline void ReportTest::fill_lists() {
   list("Plain", "100%s");
   number("count", "pcs", PF_TYPE_INT, 100, -100, 42);
   number("level", "", PF_TYPE_SHORT, 32767, -32768, -5);
-  number("pi", "rad", PF_TYPE_REAL, 10, 0, 3.14159, nullptr, 3);
-  number("far", "", PF_TYPE_DOUBLE, 1e300, -1e300, 1e-7, nullptr, 6);
+  number("pi", "rad", PF_TYPE_REAL, 10, 0, 3.14159, {}, 3);
+  number("far", "", PF_TYPE_DOUBLE, 1e300, -1e300, 1e-7, {}, 6);
   text("tabbed", "a\tb\n");
   text("blank", "ends ");
   text("empty", "");
@@ -195,7 +149,7 @@ inline void ReportTest::fill_lists() {
   text("silent", "x");
   text("long", value.c_str(), std::string(60, 'd').c_str(), "m");
   number("n%d", "%s", PF_TYPE_INT, INT32_MAX, INT32_MIN, INT32_MIN, "50% of\t%s");
-  number("half", "", PF_TYPE_DOUBLE, 1, 0, 0.5, nullptr, 1200);
+  number("half", "", PF_TYPE_DOUBLE, 1, 0, 0.5, {}, 1200);
 }
 
 inline void ReportTest::fill_mixed_table() {
