@@ -8,11 +8,8 @@
 #include <vector>
 
 #include "core/directory.h"
-#include "core/file.h"
-#include "core/library.h"
 #include "support/error_texts.h"
-#include "support/list_check.h"
-#include "support/table_check.h"
+#include "support/state.h"
 #include "support/temp_dir.h"
 
 namespace {
@@ -67,16 +64,23 @@ const Kind kKinds[] = {
     {PF_ELEM_TABLE, "table", TEV8R1_PF_copy_table, TEV8R1_PF_delete_table,
      TEV8R1_check_table_unique}};
 
-// The directory as the file's record has it; checks every record on the way.
-template <class Record>
-std::vector<Element> elements(Record* const* records, std::int32_t count) {
-  using tevpf_test::broken_rule;
-  std::vector<Element> found;
-  for (std::int32_t i = 0; i < count; ++i) {
-    EXPECT_STREQ(broken_rule(*records[i]), nullptr);
-    found.push_back({records[i]->header.elem_name, records[i]->header.elem_desc});
+// The directory as it is handed out.
+void compare_elements(const std::vector<Element> (&expected)[2]) {
+  char file[TEVPF_FILE_NAME_SIZE];
+  std::int32_t counts[2];
+  char(*names[2])[TEVPF_NAME_SIZE] = {};
+  char(*descs[2])[TEVPF_DESC_SIZE] = {};
+  ASSERT_EQ(TEV8R1_PF_inq_file_elements(file, &counts[0], &names[0], &descs[0], &counts[1],
+                                        &names[1], &descs[1]),
+            PF_NORMAL);
+  for (int k = 0; k < 2; ++k) {
+    std::vector<Element> found;
+    for (std::int32_t i = 0; i < counts[k]; ++i) found.push_back({names[k][i], descs[k][i]});
+    EXPECT_EQ(found, expected[k]);
+    std::free(names[k]);
+    std::free(descs[k]);
   }
-  return found;
+  EXPECT_EQ(broken_rules(), "");
 }
 
 // One random operation on the model and on the library: they must agree on whether it is done.
@@ -127,8 +131,7 @@ class Model {
   }
 
   void compare(const TEVPF_FILE& file) const {
-    ASSERT_EQ(elements(file.list_ptr, file.num_lists), elements_[0]);
-    ASSERT_EQ(elements(file.table_ptr, file.num_tables), elements_[1]);
+    ASSERT_NO_FATAL_FAILURE(compare_elements(elements_));
     EXPECT_LE(file.num_lists + file.free_lists, file.list_room);
     EXPECT_LE(file.num_tables + file.free_tables, file.table_room);
   }
@@ -192,50 +195,32 @@ TEST_F(DirectoryTest, NamesAreCutAndComparedAsTheyAreKept) {
 
 TEST_F(DirectoryTest, RefusalsSayWhyAndChangeNothing) {
   ASSERT_EQ(TEV8R1_PF_create_elem("A", "a", PF_ELEM_LIST), PF_NORMAL);
-  struct Case {
-    const char* label;
+  TEVPF_LIST* list = nullptr;
+  std::int32_t pos = 7;
+  const struct {
     std::function<TEVPF_STATUS()> call;
     TEVPF_STATUS status;
     ErrorTexts texts;
+  } cases[] = {
+      {[] { return TEV8R1_PF_create_elem(" x", "", 3); }, PF_BADNAME, kEmpty},
+      {[] { return TEV8R1_PF_create_elem("x", "", 3); }, PF_BADTYPE, {"function call ", "3"}},
+      {[] { return TEV8R1_modify_elem_name(3, "x", " y"); }, PF_BADNAME, kEmpty},
+      {[] { return TEV8R1_modify_elem_name(-1, "x", "y"); }, PF_BADTYPE, {"function call", "-1"}},
+      {[] { return TEV8R1_modify_elem_name(2, "A", "B"); }, PF_NOELEM, {"table", "A"}},
+      {[] { return TEV8R1_modify_elem_desc(0, "A", "B"); }, PF_BADTYPE, {"function call", "0"}},
+      {[] { return TEV8R1_modify_elem_desc(1, "a", "B"); }, PF_NOELEM, {"list", "a"}},
+      {[] { return TEV8R1_PF_copy_list("A", " x"); }, PF_BADNAME, kUntouched},
+      {[] { return TEV8R1_PF_copy_list("B", " x"); }, PF_NOELEM, {"list", "B"}},
+      {[&] { return TEV8R1_get_list_ptr("A ", &list); }, PF_NOELEM, {"list", "A "}},
+      {[&] { return TEV8R1_get_list_array_pos(nullptr, &pos); }, PF_NOELEM, kUntouched},
   };
-  TEVPF_LIST* list = nullptr;
-  std::int32_t pos = 7;
-  const Case cases[] = {
-      {"blank", [] { return TEV8R1_PF_create_elem(" x", "", 3); }, PF_BADNAME, kEmpty},
-      {"type",
-       [] { return TEV8R1_PF_create_elem("x", "", 3); },
-       PF_BADTYPE,
-       {"function call ", "3"}},
-      {"rename blank", [] { return TEV8R1_modify_elem_name(3, "x", " y"); }, PF_BADNAME, kEmpty},
-      {"rename type",
-       [] { return TEV8R1_modify_elem_name(-1, "x", "y"); },
-       PF_BADTYPE,
-       {"function call", "-1"}},
-      {"rename",
-       [] { return TEV8R1_modify_elem_name(PF_ELEM_TABLE, "A", "B"); },
-       PF_NOELEM,
-       {"table", "A"}},
-      {"describe type",
-       [] { return TEV8R1_modify_elem_desc(0, "A", "B"); },
-       PF_BADTYPE,
-       {"function call", "0"}},
-      {"describe",
-       [] { return TEV8R1_modify_elem_desc(PF_ELEM_LIST, "a", "B"); },
-       PF_NOELEM,
-       {"list", "a"}},
-      {"copy blank", [] { return TEV8R1_PF_copy_list("A", " x"); }, PF_BADNAME, kUntouched},
-      {"copy", [] { return TEV8R1_PF_copy_list("B", " x"); }, PF_NOELEM, {"list", "B"}},
-      {"delete", [] { return TEV8R1_PF_delete_table("A"); }, PF_NOELEM, {"table", "A"}},
-      {"find", [&] { return TEV8R1_get_list_ptr("A ", &list); }, PF_NOELEM, {"list", "A "}},
-      {"position", [&] { return TEV8R1_get_list_array_pos(nullptr, &pos); }, PF_NOELEM, kUntouched},
-  };
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.label);
+  const std::string before = snapshot(true);
+  for (const auto& c : cases) {
+    SCOPED_TRACE(&c - cases);
     set_error_texts();
     EXPECT_EQ(c.call(), c.status);
     EXPECT_EQ(error_texts(), c.texts);
-    EXPECT_EQ(elements(file().list_ptr, file().num_lists), (std::vector<Element>{{"A", "a"}}));
-    EXPECT_EQ(file().num_tables, 0);
+    EXPECT_EQ(snapshot(true), before);
   }
   EXPECT_EQ(list, nullptr);
   EXPECT_EQ(pos, 7);

@@ -7,8 +7,8 @@
 #include <cstdint>
 #include <cstring>
 
+#include "core/heap.h"
 #include "core/reader.h"
-#include "driver.h"
 #include "example_file.h"
 #include "support/error_texts.h"
 
@@ -255,6 +255,27 @@ TEST_F(FormatTest, TwoParametersOfOneNameAreBothKept) {
   drive_current_file(dir_);
 }
 
+// What was loaded before memory ran out stays, and can be worked with.
+TEST_F(FormatTest, HalfAFileIsWholeElements) {
+  std::string bytes = example_;
+  bytes.replace(kColumnIndex, 4, std::string(4, '\0'));  // an index to be built again
+  for (int n = 0;; ++n) {
+    SCOPED_TRACE(n);
+    tevpf::heap_fail_at(n);
+    const TEVPF_STATUS status = open_bytes(bytes);
+    const bool failed = tevpf::heap_fail_off();
+    EXPECT_EQ(status, failed ? PF_NOMEM : PF_NORMAL);
+    EXPECT_EQ(error_texts(), failed ? kEmpty : kUntouched);
+    if (n == 0) {
+      EXPECT_EQ(current(), nullptr);
+      continue;
+    }
+    drive_current_file(dir_);
+    ASSERT_EQ(TEV8R1_PF_close(0), PF_NORMAL);
+    if (!failed) break;
+  }
+}
+
 // Bodies and rows larger than any buffer on the way.
 TEST_F(FormatTest, LargeElementsAreReadWhole) {
   const std::string text(300'000, 'x');
@@ -273,7 +294,7 @@ TEST_F(FormatTest, LargeElementsAreReadWhole) {
   for (std::int32_t i = 0; i < 100'000; ++i) {
     ASSERT_EQ(TEV8R1_PF_add_row("T", &i), PF_NORMAL);
   }
-  expect_reopens_alike(dir_);
+  EXPECT_NO_THROW(drive_current_file(dir_.path(), {}));
   // From a stream that does not say how long it is.
   const std::string bytes = saved_bytes(dir_), fifo = dir_ / "fifo";
   ASSERT_EQ(mkfifo(fifo.c_str(), 0600), 0);
@@ -287,6 +308,38 @@ TEST_F(FormatTest, LargeElementsAreReadWhole) {
   EXPECT_EQ(tevpf::load_file(*tevpf::library.current_file), PF_NORMAL);
   EXPECT_EQ(saved_bytes(dir_), bytes);
   waitpid(writer, nullptr, 0);
+}
+
+TEST(ArrayTest, GrowsOrStays) {
+  void* array = nullptr;
+  void* first_new = nullptr;
+  ASSERT_EQ(TEV8R1_allocate_elem(0, 3, 4, &array, &first_new), PF_NORMAL);
+  EXPECT_EQ(first_new, array);
+  auto* numbers = static_cast<std::int32_t*>(array);
+  EXPECT_EQ(std::vector<std::int32_t>(numbers, numbers + 3), std::vector<std::int32_t>(3, 0));
+  numbers[0] = 5;
+  numbers[1] = 9;
+  EXPECT_EQ(TEV8R1_insert_index_value(numbers, 2, 1, 7), PF_NORMAL);
+  EXPECT_EQ(std::vector<std::int32_t>(numbers, numbers + 3), (std::vector<std::int32_t>{5, 7, 9}));
+  const std::int32_t extremes[][3] = {
+      {3, INT32_MAX, INT32_MAX}, {INT32_MAX, 1, INT32_MAX}, {-1, 2, 4}, {3, -4, 4},
+      {3, 1, INT32_MIN},         {INT32_MIN, INT32_MIN, -1}};
+  tevpf::heap_fail_above(1 << 30);  // the sanitizer's allocator stops at larger ones
+  for (const auto& [count, increment, size] : extremes) {
+    void* const before = array;
+    set_error_texts();
+    EXPECT_EQ(TEV8R1_allocate_elem(count, increment, size, &array, &first_new), PF_NOMEM);
+    EXPECT_EQ(error_texts(), kEmpty);
+    EXPECT_EQ(array, before);
+  }
+  tevpf::heap_fail_above(UINT64_MAX);
+  ASSERT_EQ(TEV8R1_allocate_elem(3, 1000, 4, &array, &first_new), PF_NORMAL);
+  numbers = static_cast<std::int32_t*>(array);
+  EXPECT_EQ(first_new, numbers + 3);
+  EXPECT_EQ(TEV8R1_memcpy(12, numbers, numbers + 1), PF_NORMAL);
+  EXPECT_EQ(std::vector<std::int32_t>(numbers, numbers + 4),
+            (std::vector<std::int32_t>{5, 5, 7, 9}));
+  std::free(array);
 }
 
 }  // namespace

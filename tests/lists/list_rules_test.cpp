@@ -6,6 +6,7 @@
 #include <functional>
 #include <limits>
 
+#include "core/heap.h"
 #include "core/library.h"
 #include "lists/name_index.h"
 #include "lists/param_check.h"
@@ -28,47 +29,6 @@ class ListRules : public TempFileTest {
     return TEV8R1_PF_add_param("list", &c, PF_END_POS);
   }
 };
-
-TEST_F(ListRules, EveryOperationNeedsItsFileAndItsList) {
-  TEVPF_PARAM_DEF def{};
-  std::int32_t a, b, c;
-  char text[TEVPF_NAME_SIZE];
-  const std::function<TEVPF_STATUS()> operations[] = {
-      [&] { return TEV8R1_PF_add_param("none", &def, 0); },
-      [&] { return TEV8R1_PF_delete_param("none", "p"); },
-      [&] { return TEV8R1_PF_modify_param_def("none", def); },
-      [&] { return TEV8R1_PF_modify_param_name("none", "p", "q"); },
-      [&] { return TEV8R1_PF_move_param("none", "p", -1); },
-      [&] { return TEV8R1_PF_modify_param("none", "p", text); },
-      [&] { return TEV8R1_PF_get_param_value("none", "p", text); },
-      [&] { return TEV8R1_PF_inq_param_dft("none", 0, &def); },
-      [&] { return TEV8R1_PF_set_param_dft("none", def); },
-      [&] { return TEV8R1_PF_get_next_param("none", text, text); },
-      [&] { return TEV8R1_PF_get_next_param_def("none", &def); },
-      [&] { return TEV8R1_PF_get_prev_param_def("none", &def); },
-      [&] { return TEV8R1_PF_get_param_def("none", "p", &def); },
-      [&] { return TEV8R1_PF_get_param_def_by_pos("none", -1, &def); },
-      [&] { return TEV8R1_PF_inq_param_size("none", "p", &a, &b, &c); },
-      [&] { return TEV8R1_PF_inq_param_size_by_pos("none", -1, &a, &b, &c); },
-      [&] { return TEV8R1_PF_inq_next_param_size("none", &a, &b, &c); },
-      [&] { return TEV8R1_PF_inq_num_params("none", &a); },
-      [&] { return TEV8R1_PF_reset_param("none"); },
-      [&] { return TEV8R1_set_cur_param("none", -1); },
-      [&] { return TEV8R1_inq_param_pos("none", "p", &a); },
-      [&] { return TEV8R1_inq_param_exists("none", "p"); },
-      [&] { return TEV8R1_get_param_type("none", "p", &a); },
-      [&] { return TEV8R1_set_interactive_list("none"); },
-  };
-  for (const bool open : {true, false}) {
-    if (!open) TEV8R1_PF_close(0);
-    for (std::size_t i = 0; i < std::size(operations); ++i) {
-      set_error_texts();
-      EXPECT_EQ(operations[i](), open ? PF_NOELEM : PF_NOFILE) << "operation " << i;
-      EXPECT_EQ(error_texts(), open ? (ErrorTexts{"list", "none"}) : kEmpty) << "operation " << i;
-    }
-  }
-  EXPECT_EQ(tevpf::library.interactive, 0) << "an unknown list does not switch it on";
-}
 
 TEST_F(ListRules, WhatIsNotANumberIsInRangeUntilItIsSet) {
   const struct {
@@ -239,6 +199,34 @@ TEST_F(ListRules, AbsentStringIsEmpty) {
   EXPECT_EQ(list("list").header.btf, 12 + 49);
   EXPECT_STREQ(list("list").param_ptr[0].def.part.str.value, "");
   EXPECT_TRUE(def.part.str.value == nullptr) << "the caller's record is not written to";
+}
+
+TEST_F(ListRules, TableOfNamesIsNotNeeded) {
+  ASSERT_EQ(TEV8R1_PF_create_elem("many", "", PF_ELEM_LIST), PF_NORMAL);
+  const auto add = [](int i) {
+    const TEVPF_PARAM_DEF c = to_c({PF_TYPE_INT, "p" + std::to_string(i)});
+    return TEV8R1_PF_add_param("many", &c, PF_END_POS);
+  };
+  for (int i = 0; i < 32; ++i) ASSERT_EQ(add(i), PF_NORMAL);
+  TEVPF_LIST& many = list("many");
+  const auto look_up_twice = [] {  // which pays for a table of so few names
+    EXPECT_EQ(TEV8R1_inq_param_exists("many", "p31"), PF_NORMAL);
+    EXPECT_EQ(TEV8R1_inq_param_exists("many", "p32"), PF_NOPARAM);
+  };
+  tevpf::heap_fail_at(0);
+  look_up_twice();
+  EXPECT_TRUE(tevpf::heap_fail_off());
+  EXPECT_EQ(many.names.slots, nullptr);
+  look_up_twice();
+  EXPECT_NE(many.names.slots, nullptr);
+  // A full table that cannot grow is given up; the parameter is added all the same.
+  ASSERT_GT(many.free_params, 0);
+  tevpf::heap_fail_at(0);
+  EXPECT_EQ(add(32), PF_NORMAL);
+  EXPECT_TRUE(tevpf::heap_fail_off());
+  EXPECT_EQ(many.names.slots, nullptr);
+  EXPECT_EQ(TEV8R1_inq_param_exists("many", "p32"), PF_NORMAL);
+  EXPECT_EQ(broken_rule(many), nullptr);
 }
 
 }  // namespace

@@ -89,9 +89,8 @@ TEVPF_COL_DEF column(const char* name, Numbers n) {
 // A row that fits the tables; its text has no terminator.
 unsigned char* new_row(std::int32_t number = 999) {
   std::memset(row, 0, sizeof row);
-  const TEVPF_COLUMN& text = table("empty").col_array[1];
-  std::memset(row + text.offset, 'x', std::size_t(text.def.width) + 1);
   std::memcpy(row, &number, sizeof number);
+  std::memset(row + sizeof number, 'x', 9);
   return row;
 }
 
@@ -162,17 +161,14 @@ struct Stored {
 // ---- The rows ------------------------------------------------------------------------------------
 
 // An operation, its arguments, and the usual numbers that stand in them as n.
-#define CALL(operation, arguments, ...) MORE(operation, kNone, arguments, __VA_ARGS__)
-#define MORE(operation, leeway, arguments, ...)                                                        \
-  Call {                                                                                               \
-#operation,                                                                                        \
-        {__VA_ARGS__ },                                                                                \
-         [=]([[maybe_unused]] Numbers n)                                                               \
-              -> TEVPF_STATUS { return static_cast<TEVPF_STATUS>(TEV8R1_##operation arguments); },     \
-                                                                                                leeway \
-  }
-
 // clang-format off
+#define CALL(operation, arguments, ...) MORE(operation, kNone, arguments, __VA_ARGS__)
+#define MORE(operation, leeway, arguments, ...)                                                  \
+  Call{#operation, {__VA_ARGS__},                                                                \
+       [=]([[maybe_unused]] Numbers n) -> TEVPF_STATUS {                                         \
+         return static_cast<TEVPF_STATUS>(TEV8R1_##operation arguments);                         \
+       }, leeway, #arguments}
+
 void add_file_calls(std::vector<Call>& calls, const TempDir& dir) {
   const std::string file = dir / "file", other = dir / "other", copy = dir / "copy", fresh = dir / "new";
   calls.insert(calls.end(), {

@@ -4,6 +4,7 @@
 
 #include <cstdint>
 #include <functional>
+#include <string_view>
 #include <vector>
 
 #include "support/temp_dir.h"
@@ -23,6 +24,7 @@ struct Call {
   std::vector<std::int32_t> numbers;  // its integer arguments, those in definitions included
   std::function<std::uint32_t(Numbers)> run;
   Leeway leeway = kNone;
+  std::string_view arguments{};  // as they are written; none of rows with a body of their own
 };
 
 // One row or more for each operation, on what make_elements makes in the current file, "file" in the

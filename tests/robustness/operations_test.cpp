@@ -66,6 +66,35 @@ TEST_F(OperationsTest, TheTableNamesEveryExportedOperation) {
   EXPECT_FALSE(listed.empty());
 }
 
+// The first thing that operations check: the current file, and then the element in it.
+TEST_F(OperationsTest, ElementsAreThoseOfTheCurrentFile) {
+  int without_file = 0, without_element = 0;
+  for (const Call& call : all_calls(dir_)) {
+    const std::string_view operation = call.operation, arguments = call.arguments;
+    SCOPED_TRACE(std::string(operation) + std::string(arguments));
+    const bool of_list = arguments.starts_with("(\"list\"");
+    const bool of_table = arguments.starts_with("(\"t\"");
+    const bool of_file = operation.starts_with("PF_") && operation != "PF_init" &&
+                         operation != "PF_open" && operation != "PF_set_memory_allocation";
+    if (call.leeway == kNoStatus || arguments.empty()) continue;
+    close_all();
+    set_error_texts();
+    if (of_file || of_list || of_table) {
+      EXPECT_EQ(call.run(call.numbers.data()), PF_NOFILE);
+      EXPECT_EQ(error_texts(), operation == "PF_dump_file" ? kUntouched : kEmpty);
+      ++without_file;
+    }
+    if ((!of_list && !of_table) || operation == "check_list_unique") continue;
+    ASSERT_EQ(TEV8R1_PF_open((dir_ / "new").c_str()), PF_NEWFILE);
+    EXPECT_EQ(call.run(call.numbers.data()), PF_NOELEM);
+    EXPECT_EQ(error_texts(), of_list ? (ErrorTexts{"list", "list"}) : (ErrorTexts{"table", "t"}));
+    EXPECT_EQ(tevpf::library.interactive, 0);
+    ++without_element;
+  }
+  EXPECT_GT(without_file, 100);
+  EXPECT_GT(without_element, 80);
+}
+
 // Each request of each operation fails once: it says so, nothing but spare slots has changed, and the same call
 // then succeeds as if nothing had been; or it can do without and nobody notices.
 TEST_F(OperationsTest, EveryRequestForMemoryFailsOnce) {

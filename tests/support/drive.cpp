@@ -4,6 +4,7 @@
 #include <cstdio>
 #include <cstdlib>
 #include <cstring>
+#include <fstream>
 #include <functional>
 #include <memory>
 #include <stdexcept>
@@ -55,9 +56,7 @@ Names element_names() {
   return names;
 }
 
-// Everything that can be read of a list, as text to compare.
-std::string read_list(const char* list) {
-  std::string all;
+void read_list(const char* list) {
   std::int32_t type, value_size, desc_size, position;
   char name[TEVPF_NAME_SIZE];
   TEV8R1_PF_reset_param(list);
@@ -77,13 +76,8 @@ std::string read_list(const char* list) {
     TEV8R1_set_cur_param(list, i - 1);  // refused for the first
     require(TEV8R1_PF_get_next_param(list, name, again.data()) == PF_NORMAL, "the value again");
     require(again == value, "the same value");
-    all.append(def.name).append("|").append(def.units).append("|").append(desc.data());
-    all.append(value.data(), value.size());
-    if (TEV8R1_inq_param_pos(list, def.name, &position) == PF_NORMAL)
-      TEV8R1_get_param_type(list, def.name, &type);
-    all.push_back('\n');
+    TEV8R1_inq_param_pos(list, def.name, &position);
   }
-  return all;
 }
 
 struct Table {
@@ -96,40 +90,22 @@ struct Table {
   }
 };
 
-std::string read_table(const char* table) {
-  std::string all;
+void read_table(const char* table) {
   const Table info(table);
   std::vector<unsigned char> row = info.row();
-  std::vector<std::string> orders = {""};
-  for (int c = 0; c < std::min(info.columns, kMostEntries); ++c) {
-    TEVPF_COL_DEF def;
-    require(TEV8R1_PF_inq_col_def_by_pos(table, c, &def) == PF_NORMAL, "a column by position");
+  for (int c = -1; c < std::min(info.columns, kMostEntries); ++c) {
+    TEVPF_COL_DEF def{};
+    if (c >= 0)
+      require(TEV8R1_PF_inq_col_def_by_pos(table, c, &def) == PF_NORMAL, "a column by position");
     const Block<char> description(def.description);
-    all.append(def.name).append("|").append(def.units).append("|").append(
-        std::to_string(def.width));
-    if (def.description != nullptr) all.append(def.description);
-    if (def.idx_flag != 0) orders.emplace_back(def.name);
-    all.push_back('\n');
-  }
-  for (const std::string& order : orders) {
-    TEV8R1_PF_define_table_search(table, order.empty() ? nullptr : order.c_str());
+    TEV8R1_PF_define_table_search(table, c < 0 ? nullptr : def.name);
     TEV8R1_PF_reset_table(table);
     for (int r = 0; r < std::min(info.rows, kMostEntries); ++r) {
       require(TEV8R1_PF_get_next_row(table, row.data()) == PF_NORMAL, "a row that is counted");
-      all.append(reinterpret_cast<const char*>(row.data()), static_cast<std::size_t>(info.row_wid));
       TEV8R1_convert_row(table, r);
     }
   }
   TEV8R1_PF_define_table_search(table, nullptr);
-  return all;
-}
-
-std::string read_everything() {
-  const Names names = element_names();
-  std::string all;
-  for (const std::string& list : names.lists) all += list + ":" + read_list(list.c_str());
-  for (const std::string& table : names.tables) all += table + ":" + read_table(table.c_str());
-  return all;
 }
 
 TEVPF_PARAM_DEF some_param(Choices& choose) {
@@ -241,38 +217,51 @@ void change_table(const char* table, Choices& choose) {
   changes[info.columns == 0 ? 0 : choose.next() % std::size(changes)]();
 }
 
-void report_everything(const std::string& path) {
+void read_everything(const std::string& text) {
   const Names names = element_names();
-  TEV8R1_PF_dump_file(path.c_str());
-  for (const std::string& list : names.lists) TEV8R1_PF_dump_list(list.c_str(), path.c_str());
-  for (const std::string& table : names.tables) {
-    TEV8R1_PF_dump_table(table.c_str(), path.c_str());
-    TEV8R1_PF_print_table(table.c_str(), path.c_str(), 1, PF_END_POS, nullptr, -1, PF_END_POS);
+  TEV8R1_PF_dump_file(text.c_str());
+  for (const std::string& list : names.lists) {
+    read_list(list.c_str());
+    TEV8R1_PF_dump_list(list.c_str(), text.c_str());
   }
-  std::remove(path.c_str());
+  for (const std::string& table : names.tables) {
+    read_table(table.c_str());
+    TEV8R1_PF_dump_table(table.c_str(), text.c_str());
+    TEV8R1_PF_print_table(table.c_str(), text.c_str(), 1, PF_END_POS, nullptr, -1, PF_END_POS);
+  }
+  std::remove(text.c_str());
 }
 
-// A file that was saved reads back as what was in memory.
-void save_and_compare(const std::string& path) {
+// The current file's bytes; "" when an unknown type was loaded half-way.
+std::string saved(const std::string& path) {
+  const bool done = TEV8R1_PF_save(path.c_str()) == PF_NORMAL;
+  std::ifstream in(path, std::ios::binary);
+  const std::string bytes(std::istreambuf_iterator<char>(in), {});
+  if (!done) std::remove(path.c_str());
+  return done ? bytes : "";
+}
+
+// A file that was saved is read back and saved to the same bytes.
+void save_and_compare(const std::string& folder) {
+  const std::string copy = folder + "/copy", again = folder + "/again";
   char own[TEVPF_FILE_NAME_SIZE];
   TEV8R1_turn_off_interactive();
   TEV8R1_PF_inq_current_file(own);
-  const std::string before = read_everything();
-  if (TEV8R1_PF_save(path.c_str()) == PF_NORMAL) {  // not an unknown type, loaded half-way
-    require(TEV8R1_PF_open(path.c_str()) == PF_NORMAL, "a saved file opens");
-    require(read_everything() == before, "a saved file holds what was saved");
+  if (const std::string bytes = saved(copy); !bytes.empty()) {
+    require(TEV8R1_PF_open(copy.c_str()) == PF_NORMAL, "a saved file opens");
+    require(saved(again) == bytes, "a saved file holds what was saved");
     TEV8R1_PF_close(0);
     TEV8R1_PF_change_file(own);
   }
-  std::remove(path.c_str());  // some file systems flush a file that is emptied and filled again
+  // Some file systems flush a file that is emptied and filled again.
+  for (const std::string& path : {copy, again}) std::remove(path.c_str());
 }
 
 }  // namespace
 
 void drive_current_file(const std::string& folder, Choices choose) {
-  const std::string text = folder + "/driven.txt", copy = folder + "/driven.pf";
-  report_everything(text);
-  save_and_compare(copy);
+  read_everything(folder + "/text");
+  save_and_compare(folder);
   while (!choose.bytes.empty()) {
     const Names names = element_names();
     const std::uint8_t which = choose.next();
@@ -282,6 +271,6 @@ void drive_current_file(const std::string& folder, Choices choose) {
       change_table(names.tables[which / 2 % names.tables.size()].c_str(), choose);
     if (which == 255) TEV8R1_PF_create_elem("made", "", 1 + choose.next() % 2);
   }
-  report_everything(text);
-  save_and_compare(copy);
+  read_everything(folder + "/text");
+  save_and_compare(folder);
 }

@@ -4,6 +4,7 @@
 #include <gtest/gtest.h>
 #include <unistd.h>
 
+#include <array>
 #include <cmath>
 #include <cstdio>
 #include <random>
@@ -531,13 +532,13 @@ class Pair {
     return row;
   }
 
-  // Mostly a value that some row holds.
+  // Mostly a value that some row holds, or a part of it as a pattern; some texts are longer than any.
   Value random_key(int column) {
     if (model_.rows.empty() || chance(30)) return random_value(model_.col(column));
     Value key = model_.at(below(model_.count()), column);
-    if (model_.col(column).is_text() && chance(40)) {
-      key.text = key.text.substr(0, size_t(below(int(key.text.size()) + 1))) + "*";
-    }
+    if (!model_.col(column).is_text()) return key;
+    if (chance(40)) key.text = key.text.substr(0, size_t(below(int(key.text.size()) + 1))) + "*";
+    if (chance(10)) key.text += std::array{"a", "\xFF", "*", "b*"}[size_t(below(4))];
     return key;
   }
 
