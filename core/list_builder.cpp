@@ -1,3 +1,4 @@
+// Lists from their stored form.
 #include <algorithm>
 #include <cstring>
 

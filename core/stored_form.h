@@ -3,9 +3,9 @@
 // whatever the size of a pointer.
 //
 //   element      list head, or table head; then btf - 12, or btf - 24 bytes of parameters or columns
-//   parameter    kParamHead, type part, [description and terminator]
+//   parameter    kParamFields, type part, [description and terminator]
 //                type part: the first param_part bytes of `part`; strings: then the text and terminator
-//   column       kColumnHead, the first column_part bytes of `limits`, [description and terminator]
+//   column       kColumnFields, the first column_part bytes of `limits`, [description and terminator]
 //   behind       list: name index; table: the index of each indexed column, then the rows
 #pragma once
 
@@ -17,6 +17,8 @@
 #include <utility>
 
 #include "lists/list.h"
+#include "lists/param_record.h"
+#include "tables/column_record.h"
 #include "tables/table.h"
 #include "values/value_type.h"
 
@@ -73,8 +75,8 @@ constexpr std::int32_t stored_size(const Field (&fields)[N]) noexcept {
 
 static_assert(stored_size(kListFields) == kListHead);
 static_assert(stored_size(kTableFields) == kTableHead);
-static_assert(stored_size(kParamFields) == 44);
-static_assert(stored_size(kColumnFields) == 48);
+static_assert(stored_size(kParamFields) == kParamHead);
+static_assert(stored_size(kColumnFields) == kColumnHead);
 
 namespace stored_form {
 

@@ -1,3 +1,4 @@
+// Tables from their stored form.
 #include <algorithm>
 #include <cstring>
 #include <optional>

@@ -11,7 +11,6 @@
 namespace tevpf {
 namespace {
 
-constexpr std::int32_t kSlots = 5;
 constexpr std::int32_t kPrecision = 6;
 
 // The initial definition of a number: any value of the type.
@@ -27,15 +26,15 @@ void initialise(TEVPF_PARAM_DEF& slot) noexcept {
 
 void release_defaults(TEVPF_PARAM_DEF* table) noexcept {
   if (table == nullptr) return;
-  for (std::int32_t i = 0; i < kSlots; ++i) release_texts(table[i]);
+  for (std::int32_t i = 0; i < kValueTypeCount; ++i) release_texts(table[i]);
   heap_free(table);
 }
 
 bool copy_defaults(const TEVPF_PARAM_DEF* source, TEVPF_PARAM_DEF*& copy) noexcept {
   if (source == nullptr) return true;
-  Owned<TEVPF_PARAM_DEF> table = new_array<TEVPF_PARAM_DEF>(kSlots);
+  Owned<TEVPF_PARAM_DEF> table = new_array<TEVPF_PARAM_DEF>(kValueTypeCount);
   if (!table) return false;
-  for (std::int32_t i = 0; i < kSlots; ++i) {
+  for (std::int32_t i = 0; i < kValueTypeCount; ++i) {
     table[i] = source[i];
     if (own_texts(table[i])) continue;
     while (i-- > 0) release_texts(table[i]);
@@ -50,9 +49,9 @@ bool copy_defaults(const TEVPF_PARAM_DEF* source, TEVPF_PARAM_DEF*& copy) noexce
 using namespace tevpf;
 
 TEVPF_STATUS TEV8R1_load_param_dft(TEVPF_PARAM_DEF** table_out) noexcept {
-  Owned<TEVPF_PARAM_DEF> table = new_zeroed<TEVPF_PARAM_DEF>(kSlots);
+  Owned<TEVPF_PARAM_DEF> table = new_zeroed<TEVPF_PARAM_DEF>(kValueTypeCount);
   if (!table) return fail_empty(PF_NOMEM);
-  for (std::int32_t i = 0; i < kSlots; ++i) {
+  for (std::int32_t i = 0; i < kValueTypeCount; ++i) {
     TEVPF_PARAM_DEF& slot = table[i];
     slot.type = PF_TYPE_INT + i;
     if (slot.type == PF_TYPE_STRING) {

@@ -4,6 +4,7 @@
 
 #include <cstdint>
 #include <cstdio>
+#include <iterator>
 
 #include "reports/text_out.h"
 #include "tables/table.h"
@@ -31,6 +32,7 @@ struct TypeText {
 // In the order of the type codes, from PF_TYPE_INT on.
 inline constexpr TypeText kTypeTexts[] = {
     {"INT ", 0}, {"REAL", 5}, {"STG ", 0}, {"DBL ", 4}, {"SHT ", 0}};
+static_assert(std::size(kTypeTexts) == kValueTypeCount);
 
 constexpr const TypeText& type_text(std::int32_t type) noexcept {
   return kTypeTexts[type - PF_TYPE_INT];

@@ -15,9 +15,6 @@
 namespace tevpf {
 namespace {
 
-// What a stored column takes besides its limits and its description.
-constexpr std::int64_t kStoredHead = 48;
-
 // The stored place of a description counts from here.
 constexpr std::int64_t kDescriptionBase = 41;
 
@@ -50,7 +47,7 @@ double tolerance_of(const TEVPF_COL_DEF& definition) noexcept {
 std::int64_t stored_column_size(std::int32_t type, const char* description) noexcept {
   const std::int64_t text =
       description == nullptr ? 0 : static_cast<std::int64_t>(std::strlen(description)) + 1;
-  return kStoredHead + value_type(type).column_part + text;
+  return kColumnHead + value_type(type).column_part + text;
 }
 
 std::int8_t description_flag(const TEVPF_COL_DEF& definition) noexcept {

@@ -31,6 +31,9 @@ TEVPF_API TEVPF_STATUS TEV8R1_get_col_ptr(const TEVPF_TABLE* table, const char* 
 
 namespace tevpf {
 
+// What every column takes in the file before its limits.
+inline constexpr std::int32_t kColumnHead = 48;
+
 // Names and units from a caller or a file end within their fields.
 void terminate_texts(TEVPF_COL_DEF& definition) noexcept;
 

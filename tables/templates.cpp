@@ -1,5 +1,6 @@
 #include "tables/templates.h"
 
+#include <iterator>
 #include <limits>
 #include <utility>
 
@@ -11,8 +12,8 @@
 namespace tevpf {
 namespace {
 
-constexpr std::int32_t kTemplates = PF_TYPE_SHORT - PF_TYPE_INT + 1;
-constexpr std::int32_t kInitialWidths[kTemplates] = {11, 13, 1, 23, 6};
+constexpr std::int32_t kInitialWidths[] = {11, 13, 1, 23, 6};  // in type order
+static_assert(std::size(kInitialWidths) == kValueTypeCount);
 constexpr std::int32_t kInitialPrecision = 6;
 
 TEVPF_COL_DEF initial_template(std::int32_t type) noexcept {
@@ -34,7 +35,7 @@ TEVPF_COL_DEF initial_template(std::int32_t type) noexcept {
 
 void release_templates(TEVPF_TABLE& table) noexcept {
   TEVPF_COL_DEF* templates = std::exchange(table.col_dft, nullptr);
-  for (std::int32_t i = 0; templates != nullptr && i < kTemplates; ++i) {
+  for (std::int32_t i = 0; templates != nullptr && i < kValueTypeCount; ++i) {
     heap_free(templates[i].description);
   }
   heap_free(templates);
@@ -42,11 +43,11 @@ void release_templates(TEVPF_TABLE& table) noexcept {
 
 bool copy_templates(const TEVPF_TABLE& source, TEVPF_TABLE& copy) noexcept {
   if (source.col_dft == nullptr) return true;
-  copy.col_dft = new_array<TEVPF_COL_DEF>(kTemplates).release();
+  copy.col_dft = new_array<TEVPF_COL_DEF>(kValueTypeCount).release();
   if (copy.col_dft == nullptr) return false;
 
   bool whole = true;
-  for (std::int32_t i = 0; i < kTemplates; ++i) {
+  for (std::int32_t i = 0; i < kValueTypeCount; ++i) {
     const char* text = source.col_dft[i].description;
     copy.col_dft[i] = source.col_dft[i];
     copy.col_dft[i].description = text == nullptr ? nullptr : heap_copy(text);
@@ -61,9 +62,9 @@ bool copy_templates(const TEVPF_TABLE& source, TEVPF_TABLE& copy) noexcept {
 using namespace tevpf;
 
 TEVPF_STATUS TEV8R1_load_col_dft(TEVPF_TABLE* table) noexcept {
-  auto templates = new_zeroed<TEVPF_COL_DEF>(kTemplates);
+  auto templates = new_zeroed<TEVPF_COL_DEF>(kValueTypeCount);
   if (!templates) return fail_empty(PF_NOMEM);
-  for (std::int32_t i = 0; i < kTemplates; ++i) {
+  for (std::int32_t i = 0; i < kValueTypeCount; ++i) {
     templates[static_cast<std::size_t>(i)] = initial_template(PF_TYPE_INT + i);
   }
   release_templates(*table);

@@ -6,6 +6,7 @@
 
 #include <cstdint>
 #include <cstring>
+#include <iterator>
 #include <type_traits>
 
 #include "include/tevpf.h"
@@ -26,8 +27,12 @@ inline constexpr ValueType kValueTypes[] = {
     {8, 8, 28, 20, "double"}, {2, 2, 6, 4, "short"},
 };
 
+// Tables of this order elsewhere have so many entries.
+inline constexpr std::int32_t kValueTypeCount = std::size(kValueTypes);
+static_assert(PF_TYPE_INT + kValueTypeCount - 1 == PF_TYPE_SHORT);
+
 constexpr bool is_value_type(std::int32_t type) noexcept {
-  return type >= PF_TYPE_INT && type <= PF_TYPE_SHORT;
+  return type >= PF_TYPE_INT && type < PF_TYPE_INT + kValueTypeCount;
 }
 
 // The facts of a valid type.
