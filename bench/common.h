@@ -168,7 +168,7 @@ inline void add(const char* workload, const char* contestant, void (*body)(bench
   const std::string name = std::string(workload) + "/" + contestant;
   for (const std::int64_t n : sizes) {
     auto* entry = benchmark::RegisterBenchmark(name.c_str(), body)->Arg(n)->UseManualTime();
-    if (n > 10'000) entry->Iterations(n > 100'000 ? 2 : 4);
+    if (n > 10'000) entry->Iterations(3);
   }
 }
 

@@ -1,31 +1,33 @@
 #!/usr/bin/env python3
 """Turns the benchmark's JSON into the table of ratios and into plots.
 
-    ratios.py RESULT.json            the table, as Markdown, on standard output
-    ratios.py RESULT.json --plots D  SVG plots of time per operation against n, one a workload, in D
+    ratios.py RESULT.json...            the table, as Markdown, on standard output
+    ratios.py RESULT.json... --plots D  SVG plots of time per operation against n, in D
 
 A factor above 1 against a peer: the library is faster by it. Against a limit (the plain thing
 without a library) the figure is how many times the limit's time the library takes.
 """
+import argparse
 import json
 import math
 import os
-import sys
 from collections import defaultdict
 
 UNIT = {"ns": 1.0, "us": 1e3, "ms": 1e6, "s": 1e9}
 
 
-def medians(path):
+def medians(paths):
     """{workload: {contestant: {n: nanoseconds per operation}}}, medians where a run was repeated."""
-    with open(path, encoding="utf-8") as file:
-        data = json.load(file)
     runs = defaultdict(list)
-    for run in data["benchmarks"]:
-        if run.get("run_type") == "aggregate":
-            continue
-        workload, contestant, n = run["name"].split("/")[:3]
-        runs[workload, contestant, int(n)].append(run["real_time"] * UNIT[run["time_unit"]] / run["operations"])
+    for path in paths:
+        with open(path, encoding="utf-8") as file:
+            data = json.load(file)
+        for run in data["benchmarks"]:
+            if run.get("run_type") == "aggregate":
+                continue
+            workload, contestant, n = run["name"].split("/")[:3]
+            runs[workload, contestant, int(n)].append(
+                run["real_time"] * UNIT[run["time_unit"]] / run["operations"])
     table = defaultdict(lambda: defaultdict(dict))
     for (workload, contestant, n), times in runs.items():
         table[workload][contestant][n] = sorted(times)[len(times) // 2]
@@ -152,17 +154,25 @@ def plot(workload, contestants):
     return "\n".join(out)
 
 
+# The workloads that show how cost grows: flat, with the logarithm, and with n.
+PLOTTED = ["list look up", "list open", "table find indexed", "table append at random", "table delete", "table open"]
+
+
 def main():
-    context, table = medians(sys.argv[1])
-    if len(sys.argv) > 3 and sys.argv[2] == "--plots":
-        os.makedirs(sys.argv[3], exist_ok=True)
-        for workload, contestants in table.items():
-            picture = plot(workload, contestants)
-            if picture:
-                with open(os.path.join(sys.argv[3], workload.replace(" ", "_") + ".svg"), "w", encoding="utf-8") as file:
-                    file.write(picture)
-    else:
+    arguments = argparse.ArgumentParser(description=__doc__, formatter_class=argparse.RawDescriptionHelpFormatter)
+    arguments.add_argument("results", nargs="+")
+    arguments.add_argument("--plots", metavar="D")
+    arguments = arguments.parse_args()
+    context, table = medians(arguments.results)
+    if not arguments.plots:
         print_table(context, table)
+        return
+    os.makedirs(arguments.plots, exist_ok=True)
+    for workload in PLOTTED:
+        picture = plot(workload, table[workload])
+        if picture:
+            with open(os.path.join(arguments.plots, workload.replace(" ", "_") + ".svg"), "w", encoding="utf-8") as file:
+                file.write(picture)
 
 
 if __name__ == "__main__":
