@@ -23,7 +23,11 @@
  *              operation that allocates.
  *   Threads    None: all state (open files, current file, settings) is process-wide. Use the
  *              library from one thread at a time.
- *   Costs      Given in n, the number of parameters, rows or elements at hand.
+ *   Costs      Given in n, the number of parameters, rows or elements at hand; O(1) where none is
+ *              given. Beside that, every operation finds what is named: an element in O(1), a
+ *              parameter by its exact name in O(1) (in O(log n) until n / 16 have been looked up
+ *              since the list's names or order changed, and by a pattern), a column among the
+ *              columns one by one.
  *
  * C99 and C++. Little-endian hosts. */
 #ifndef TEVPF_H
@@ -219,7 +223,7 @@ TEVPF_API TEVPF_STATUS TEV8R1_PF_inq_current_file(char* name_out) TEVPF_NOEXCEPT
 /* 1 when the current file may be written, 0 when it could only be opened for reading. */
 TEVPF_API TEVPF_STATUS TEV8R1_PF_inq_file_access(int32_t* access_out) TEVPF_NOEXCEPT;
 
-/* Names and descriptions of the current file's elements, in directory order.
+/* Names and descriptions of the current file's elements, in directory order. O(n).
  *   file_name_out  at least TEVPF_FILE_NAME_SIZE bytes
  *   ..._out        receive new arrays of 20-byte names and 80-byte descriptions, released by the
  *                  caller with free; not written when their count is 0
@@ -232,6 +236,7 @@ TEVPF_API TEVPF_STATUS TEV8R1_PF_inq_file_elements(
 
 /* Writes the current file whole: in place (path null or its own name), or as a copy to another
  * path, which is taken literally; the copy is not opened, and the file is as unsaved as it was.
+ * O(file size).
  *   PF_NOPRIV    read-only, or the system refuses access to the path
  *   PF_OPENFAIL  cannot be opened, or not everything could be written. What is in memory is whole
  *                and can be saved again; on the disk is the old file where it can be replaced in
@@ -240,6 +245,7 @@ TEVPF_API TEVPF_STATUS TEV8R1_PF_save(const char* path) TEVPF_NOEXCEPT;
 
 /* Closes the current file, writing it first when save is not 0, and releases it. The file opened
  * before it becomes current; for the first one, the one opened after it.
+ * O(file size), the writing and the releasing.
  *   PF_NOPRIV    save of a read-only file: it stays open. Every other outcome closes it
  *   PF_OPENFAIL  it could not be written, and what was in memory is lost; save first where that
  *                matters */
@@ -278,11 +284,12 @@ TEVPF_API TEVPF_STATUS TEV8R1_modify_elem_name(int32_t elem_type, const char* ol
 TEVPF_API TEVPF_STATUS TEV8R1_modify_elem_desc(int32_t elem_type, const char* name,
                                                const char* description) TEVPF_NOEXCEPT;
 
-/* Deletes an element with everything it holds. */
+/* Deletes an element with everything it holds. O(n) elements and what it holds. */
 TEVPF_API TEVPF_STATUS TEV8R1_PF_delete_list(const char* name) TEVPF_NOEXCEPT;
 TEVPF_API TEVPF_STATUS TEV8R1_PF_delete_table(const char* name) TEVPF_NOEXCEPT;
 
 /* Copies an element, whole and with storage of its own, to the end of the directory.
+ * O(its size).
  *   PF_BADNAME    the new name starts with a blank
  *   PF_DUPLICATE  an element of that kind has the same first 19 characters */
 TEVPF_API TEVPF_STATUS TEV8R1_PF_copy_list(const char* source_name,
@@ -298,6 +305,7 @@ TEVPF_API TEVPF_STATUS TEV8R1_compute_size(int32_t type, int32_t width,
                                            int32_t* size_out) TEVPF_NOEXCEPT;
 
 /* Converts text to the binary form of the type.
+ * O(its length), like everything that takes a text.
  *   destination  storage of the value's size; for strings room for the whole text and terminator
  *   PF_BADARG  not a number of that type, or something behind it (blanks included)
  *   PF_RANGE   a number outside the type's range */
@@ -332,7 +340,7 @@ TEVPF_API TEVPF_STATUS TEV8R1_string_compare(const char* text, const char* patte
  * Every operation that names a list, here and in the next two groups: PF_NOFILE, PF_NOELEM (no such
  * list). Where a parameter is named: PF_NOPARAM. A name whose first "*" is its last character finds
  * the first parameter, in name order, that starts with what stands before it. Positions count from
- * 0. Finding costs O(log n) or less. */
+ * 0. Costs of finding: see the top. */
 
 /* Adds a parameter in front of the one at `position` (PF_END_POS, or any position behind the last:
  * at the end; negative: at the front). str.length is ignored, a null str.value is the empty text.
@@ -352,7 +360,7 @@ TEVPF_API TEVPF_STATUS TEV8R1_PF_delete_param(const char* list_name,
                                               const char* param_name) TEVPF_NOEXCEPT;
 
 /* Replaces everything but the name of the parameter that definition.name selects. The
- * str fields are read as for adding.
+ * str fields are read as for adding. O(length of the texts).
  *   PF_BADNAME, PF_BADTYPE, PF_BADRANGE, PF_RANGE, PF_BADPREC as for adding */
 TEVPF_API TEVPF_STATUS TEV8R1_PF_modify_param_def(const char* list_name,
                                                   TEVPF_PARAM_DEF definition) TEVPF_NOEXCEPT;
@@ -529,7 +537,7 @@ TEVPF_API TEVPF_STATUS TEV8R1_PF_inq_col_def_by_pos(const char* table_name, int3
                                                     TEVPF_COL_DEF* def_out) TEVPF_NOEXCEPT;
 
 /* Names, and byte offsets within a row, of all columns in column order: new arrays that the caller
- * owns (free); without columns the count is 0 and the array pointer is not written. */
+ * owns (free); without columns the count is 0 and the array pointer is not written. O(columns). */
 TEVPF_API TEVPF_STATUS TEV8R1_PF_inq_col_names(const char* table_name, int32_t* count_out,
                                                char (**names_out)[TEVPF_NAME_SIZE]) TEVPF_NOEXCEPT;
 TEVPF_API TEVPF_STATUS TEV8R1_PF_inq_col_offsets(const char* table_name, int32_t* count_out,
@@ -567,8 +575,8 @@ TEVPF_API int32_t TEV8R1_calc_col_width(int32_t width, int32_t name_length) TEVP
  * whose order positions then follow. The cursor (current row, next row) holds positions.
  * Value checks: PF_RANGE (a value outside its column's bounds, give or take the column's
  * tolerance) and PF_DUPLICATE (a unique column already holds it); interactive mode switches them
- * off where said. Adding and deleting cost O(log n) comparisons and O(n) moves of entries per
- * index. */
+ * off where said. Adding and deleting cost O(log n) comparisons and O(n) moves of entries per index,
+ * and O(n) moves of rows; appending moves no row, and no entry where its value is the greatest. */
 
 /* Appends a row; inserts it in front of a row number (PF_END_POS or beyond the last: at the end;
  * negative: at the front); or appends it after filling every column whose entry in `supplied` is 0
@@ -581,6 +589,7 @@ TEVPF_API TEVPF_STATUS TEV8R1_PF_add_row_with_dft(const char* table_name, void* 
                                                   const int32_t* supplied) TEVPF_NOEXCEPT;
 
 /* Replaces the current row; values are always checked, its own unique values are no duplicates.
+ * O(log n) comparisons and O(n) moves of entries for each index whose value changes.
  *   PF_NOCURROW  no row is current */
 TEVPF_API TEVPF_STATUS TEV8R1_PF_replace_row(const char* table_name,
                                              const void* row) TEVPF_NOEXCEPT;
@@ -591,6 +600,7 @@ TEVPF_API TEVPF_STATUS TEV8R1_PF_replace_row(const char* table_name,
 TEVPF_API TEVPF_STATUS TEV8R1_PF_delete_row(const char* table_name) TEVPF_NOEXCEPT;
 
 /* Moves row number `from` so that it becomes row number `to` (or the last). The cursor stays.
+ * O(n).
  *   PF_SEARCHSET  a search column is set
  *   PF_BADPOS     no such row, or fewer than two rows
  *   PF_RANGE, PF_DUPLICATE  the row does not pass the value checks; it stays where it was */
@@ -614,7 +624,7 @@ TEVPF_API TEVPF_STATUS TEV8R1_PF_set_dft_row(const char* table_name,
                                              const void* row) TEVPF_NOEXCEPT;
 TEVPF_API TEVPF_STATUS TEV8R1_PF_inq_dft_row(const char* table_name, void* row_out) TEVPF_NOEXCEPT;
 
-/* Copies one column's values of all rows, in storage order, one behind the other.
+/* Copies one column's values of all rows, in storage order, one behind the other. O(n).
  *   values_out  rows * value size bytes
  *   PF_NOMORE    the table has no rows
  *   PF_NOCOLUMN  no such column */
@@ -630,7 +640,7 @@ TEVPF_API TEVPF_STATUS TEV8R1_PF_inq_table_info(const char* table_name, int32_t*
                                                 int32_t* dsp_wid_out,
                                                 int32_t* cur_row_out) TEVPF_NOEXCEPT;
 
-/* Checks one value against one column, in every mode.
+/* Checks one value against one column, in every mode. O(log n) for a unique column.
  *   PF_NOCOLUMN  no such column; PF_RANGE, PF_DUPLICATE: the value checks */
 TEVPF_API TEVPF_STATUS TEV8R1_validate_row_value(const char* table_name, const char* column_name,
                                                  const void* value) TEVPF_NOEXCEPT;
@@ -659,6 +669,7 @@ TEVPF_API TEVPF_STATUS TEV8R1_PF_get_row_by_value(const char* table_name, int8_t
 
 /* Copies the value that the named column has in the first row whose first column holds the key. The
  * cursor is the same afterwards. A table without columns: PF_NORMAL, nothing is written.
+ * O(log n) when the first column is the search column, else O(n).
  *   value_out  storage of the column's value size
  *   PF_NOTFOUND  no such row; PF_NOCOLUMN  no such column */
 TEVPF_API TEVPF_STATUS TEV8R1_PF_get_value(const char* table_name, const char* column_name,
@@ -673,14 +684,14 @@ TEVPF_API int32_t TEV8R1_convert_row(const char* table_name, int32_t pos) TEVPF_
  *   PF_OPENFAIL  the path cannot be written
  *   PF_NOFILE, PF_NOELEM  as above; the text file is then there and empty */
 
-/* The whole current file. Without a file, PF_NOFILE and no text file. */
+/* The whole current file. Without a file, PF_NOFILE and no text file. O(file size). */
 TEVPF_API TEVPF_STATUS TEV8R1_PF_dump_file(const char* path) TEVPF_NOEXCEPT;
 
-/* One list; one table with all columns and rows in storage order. */
+/* One list; one table with all columns and rows in storage order. O(n). */
 TEVPF_API TEVPF_STATUS TEV8R1_PF_dump_list(const char* name, const char* path) TEVPF_NOEXCEPT;
 TEVPF_API TEVPF_STATUS TEV8R1_PF_dump_table(const char* name, const char* path) TEVPF_NOEXCEPT;
 
-/* Chosen columns and rows of a table, in traversal order.
+/* Chosen columns and rows of a table, in traversal order. O(the rows shown).
  *   definitions   not 0: show the definitions of the columns
  *   count, names  the columns, as an array of 20-byte names; a count above the number of columns
  *                 shows all of them and names is not read
@@ -703,7 +714,7 @@ TEVPF_API TEVPF_STATUS TEV8R1_remove_escape_chars(int32_t* size, char** buffer) 
  *   length_out  length of the rewritten text, which may hold NUL characters */
 TEVPF_API TEVPF_STATUS TEV8R1_insert_escape_chars(char* text, int32_t* length_out) TEVPF_NOEXCEPT;
 
-/* Builds the heading of columns first..last (positions in column order) of a table.
+/* Builds the heading of columns first..last (positions in column order) of a table. O(columns).
  *   gap         blanks between neighbours
  *   fill_width  blanks the buffer gets first
  *   first_lead  receives the blanks in front of the first name
@@ -731,16 +742,17 @@ TEVPF_API TEVPF_STATUS TEV8R1_allocate_elem(int32_t count, int32_t increment, in
                                             void** array, void** first_new_out) TEVPF_NOEXCEPT;
 
 /* Inserts value into an array of count entries with room for one more; a position outside 0..count
- * inserts nothing. Always PF_NORMAL. */
+ * inserts nothing. Always PF_NORMAL. O(count). */
 TEVPF_API TEVPF_STATUS TEV8R1_insert_index_value(int32_t* array, int32_t count, int32_t position,
                                                  int32_t value) TEVPF_NOEXCEPT;
 
 /* Removes a row number from an index of count entries and lowers every greater one by 1. Always
- * PF_NORMAL. */
+ * PF_NORMAL. O(count). */
 TEVPF_API TEVPF_STATUS TEV8R1_remove_index(int32_t* index, int32_t row_number,
                                            int32_t count) TEVPF_NOEXCEPT;
 
 /* Searches an index for a key.
+ * O(log count); for reals and doubles also one step for each equal entry.
  *   column_base  the column's value in row number 0; row number e has it e * row_wid bytes further
  *                on
  *   pos_out      PF_NORMAL: the first equal entry. PF_NOTFOUND: where the key would be inserted
@@ -755,7 +767,7 @@ TEVPF_API TEVPF_STATUS TEV8R1_binary_search(int32_t type, double tolerance, int3
 TEVPF_API int32_t TEV8R1_sort_comp(const void* a, const void* b) TEVPF_NOEXCEPT;
 
 /* A new index of num_rows entries 0, 1, 2 ... with room for num_rows + free_rows; the caller owns
- * it (free). Without room to make, PF_NORMAL and null. */
+ * it (free). Without room to make, PF_NORMAL and null. O(num_rows). */
 TEVPF_API TEVPF_STATUS TEV8R1_adjust_index(int32_t num_rows, int16_t free_rows,
                                            int32_t** idx_out) TEVPF_NOEXCEPT;
 
