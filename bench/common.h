@@ -24,6 +24,9 @@ inline constexpr std::uint32_t kSeed = 20240229;
 inline constexpr std::int64_t kManyRows = 100'000;
 inline constexpr std::int64_t kFewOperations = 1'000;
 
+// So many random accesses are enough to time one that costs the same from the first on.
+inline constexpr std::int64_t kManyAccesses = 100'000;
+
 [[noreturn]] inline void give_up(const char* what, long code) {
   std::fprintf(stderr, "%s failed: 0x%lx\n", what, static_cast<unsigned long>(code));
   std::abort();
@@ -162,13 +165,13 @@ void read_plainly(const std::string& path, std::vector<char>& bytes);
 std::vector<char> contents(const std::string& path);
 
 // Registers a benchmark under workload/contestant/n; its figure is time per operation. Large sizes,
-// which take long to set up, get a fixed number of passes.
+// which take long to set up, get one pass a run.
 inline void add(const char* workload, const char* contestant, void (*body)(benchmark::State&),
                 const std::vector<std::int64_t>& sizes = {1'000, 10'000, 100'000, 1'000'000}) {
   const std::string name = std::string(workload) + "/" + contestant;
   for (const std::int64_t n : sizes) {
     auto* entry = benchmark::RegisterBenchmark(name.c_str(), body)->Arg(n)->UseManualTime();
-    if (n > 10'000) entry->Iterations(3);
+    if (n > 10'000) entry->Iterations(1);
   }
 }
 

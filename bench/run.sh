@@ -10,8 +10,8 @@ cmake -S . -B build/bench -G Ninja -DCMAKE_BUILD_TYPE=Release -DTEVPF_BUILD_BENC
 cmake --build build/bench --parallel
 
 program=build/bench/bench/tevpf_bench
-# The million takes long to set up: one run of three passes. All others run three times, interleaved, so
-# that a noisy minute on a shared machine meets ours and theirs alike.
+# The million takes long to set up and runs once. All others run three times, interleaved, so that a noisy
+# minute on a shared machine meets ours and theirs alike.
 mapfile -t names < <("$program" --benchmark_list_tests --benchmark_filter="${1:-.}")
 run() {  # RESULT NAME-SUFFIX-PATTERN OPTIONS...
   local result=$1 pattern=$2 filter
