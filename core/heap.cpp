@@ -38,7 +38,7 @@ void* in_large_pages(void* block, [[maybe_unused]] std::size_t bytes) noexcept {
 #ifdef __linux__
   constexpr std::size_t kLarge = std::size_t{4} << 20;
   if (block == nullptr || bytes < kLarge) return block;
-  static const auto page = static_cast<std::uintptr_t>(sysconf(_SC_PAGESIZE));
+  const auto page = static_cast<std::uintptr_t>(sysconf(_SC_PAGESIZE));
   const std::uintptr_t first = (reinterpret_cast<std::uintptr_t>(block) + page - 1) & ~(page - 1);
   const std::uintptr_t end = (reinterpret_cast<std::uintptr_t>(block) + bytes) & ~(page - 1);
   (void)madvise(reinterpret_cast<void*>(first), end - first, MADV_HUGEPAGE);
