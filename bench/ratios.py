@@ -89,10 +89,14 @@ def target(table, workload, n, contestant):
     return wanted.get(contestant) if isinstance(wanted, dict) else wanted
 
 
+def factor(ratio):
+    return f"{ratio:.2f}" if ratio >= 0.1 else f"{ratio:.1g}"
+
+
 def judged(ratio, text, wanted, met):
     if wanted is None:
-        return f"{ratio:.2f}x {text}"
-    figure = f"{ratio:.2f}x {text}" if met else f"**{ratio:.2f}x** {text}"
+        return f"{factor(ratio)}x {text}"
+    figure = f"{factor(ratio)}x {text}" if met else f"**{factor(ratio)}x** {text}"
     return f"{figure} (wanted {wanted:g})"
 
 
