@@ -7,10 +7,7 @@
 #include <random>
 #include <vector>
 
-#include "core/directory.h"
-#include "support/error_texts.h"
-#include "support/state.h"
-#include "support/temp_dir.h"
+#include "support/temp_file.h"
 
 namespace {
 
@@ -19,18 +16,9 @@ struct Element {
   bool operator==(const Element&) const = default;
 };
 
-class DirectoryTest : public testing::Test {
+class DirectoryTest : public TempFileTest {
  protected:
-  DirectoryTest() {
-    TEV8R1_PF_init();
-    EXPECT_EQ(TEV8R1_PF_open((dir_ / "file").c_str()), PF_NEWFILE);
-    set_error_texts();
-  }
-  ~DirectoryTest() override { TEV8R1_PF_close(0); }
-
   static TEVPF_FILE& file() { return *tevpf::library.current_file; }
-
-  TempDir dir_;
 };
 
 // The two kinds of elements through one set of operations.
@@ -157,8 +145,7 @@ TEST_F(DirectoryTest, AgreesWithAPlainModel) {
     model.step();
     if (i % 7 == 0) model.compare(file());
     if (i % 1500 != 1499) continue;
-    ASSERT_EQ(TEV8R1_PF_close(1), PF_NORMAL);
-    ASSERT_EQ(TEV8R1_PF_open((dir_ / "file").c_str()), PF_NORMAL);
+    save_and_reopen();
     model.compare(file());
   }
   EXPECT_GT(file().num_lists, 16);  // names were hashed

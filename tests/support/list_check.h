@@ -5,7 +5,7 @@
 #include <cstring>
 #include <vector>
 
-#include "lists/list.h"
+#include "lists/name_table.h"
 #include "values/text_compare.h"
 #include "values/value_type.h"
 

@@ -1,18 +1,11 @@
 // A table "t" in a new file, filled and read as text, its invariants checked with each look at it.
 #pragma once
 
-#include <gtest/gtest.h>
-#include <unistd.h>
-
-#include <cstdlib>
 #include <cstring>
 #include <string>
 #include <vector>
 
-#include "core/directory.h"
-#include "core/library.h"
-#include "support/error_texts.h"
-#include "support/table_check.h"
+#include "support/temp_file.h"
 #include "tables/column_index.h"
 #include "tables/row_store.h"
 
@@ -55,18 +48,9 @@ inline TEVPF_COL_DEF described(TEVPF_COL_DEF def, const char* text) {
   return def;
 }
 
-class TableTest : public testing::Test {
+class TableTest : public TempFileTest {
  protected:
-  TableTest() {
-    TEV8R1_PF_init();
-    const std::string path = testing::TempDir() + "table_test_" + std::to_string(getpid());
-    EXPECT_EQ(TEV8R1_PF_open(path.c_str()), PF_NEWFILE);
-    new_table();
-  }
-  ~TableTest() override {
-    TEV8R1_turn_off_interactive();
-    TEV8R1_PF_close(0);
-  }
+  TableTest() { new_table(); }
 
   // An empty table "t" in place of the one that there is.
   static void new_table() {
@@ -122,29 +106,6 @@ class TableTest : public testing::Test {
     return text;
   }
   static std::string default_text() { return text_of(table(), table().dft_row); }
-
-  // Everything that can be seen of the table, as bytes.
-  static std::string snapshot() {
-    const TEVPF_TABLE& t = table();
-    std::string bytes;
-    const auto add = [&](const void* from, std::size_t size) {
-      if (size > 0) bytes.append(static_cast<const char*>(from), size);
-    };
-    const auto rows = static_cast<std::size_t>(t.num_rows);
-    add(&t, offsetof(TEVPF_TABLE, cur_col));
-    bytes += std::to_string(t.cur_col == nullptr ? -1 : t.cur_col - t.col_array);
-    for (int i = 0; i < t.num_cols; ++i) {
-      TEVPF_COLUMN copy = t.col_array[i];
-      bytes += copy.def.description == nullptr ? "-" : copy.def.description;
-      copy.def.description = nullptr;
-      add(&copy, offsetof(TEVPF_COLUMN, idx_ptr));
-      add(&copy.desc_flag, 1);
-      if (copy.def.idx_flag != 0) add(index_entries(t.col_array[i]), rows * 4);
-    }
-    add(t.row_data, rows * static_cast<std::size_t>(t.row_wid));
-    add(t.dft_row, static_cast<std::size_t>(t.row_wid));
-    return bytes;
-  }
 };
 
 }  // namespace tevpf

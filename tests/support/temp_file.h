@@ -3,24 +3,23 @@
 
 #include <gtest/gtest.h>
 
-#include <cstdio>
 #include <string>
 
 #include "core/directory.h"
-#include "include/tevpf.h"
+#include "support/error_texts.h"
+#include "support/state.h"
+#include "support/temp_dir.h"
 
-class TempFileTest : public ::testing::Test {
+class TempFileTest : public testing::Test {
  protected:
   TempFileTest() {
-    const auto* const test = ::testing::UnitTest::GetInstance()->current_test_info();
-    path_ = ::testing::TempDir() + "tevpf_" + test->test_suite_name() + "_" + test->name() + ".tpf";
-    std::remove(path_.c_str());
     TEV8R1_PF_init();
     EXPECT_EQ(TEV8R1_PF_open(path_.c_str()), PF_NEWFILE);
+    set_error_texts();
   }
   ~TempFileTest() override {
-    TEV8R1_PF_close(0);
-    std::remove(path_.c_str());
+    while (TEV8R1_PF_close(0) == PF_NORMAL) {
+    }
     TEV8R1_PF_set_memory_allocation(0, 0);
     TEV8R1_turn_off_interactive();
   }
@@ -32,9 +31,10 @@ class TempFileTest : public ::testing::Test {
 
   static TEVPF_LIST& list(const std::string& name) {
     TEVPF_LIST* found = nullptr;
-    if (TEV8R1_get_list_ptr(name.c_str(), &found) != PF_NORMAL) std::abort();
+    EXPECT_EQ(TEV8R1_get_list_ptr(name.c_str(), &found), PF_NORMAL);
     return *found;
   }
 
-  std::string path_;
+  TempDir dir_;
+  const std::string path_ = dir_ / "file";
 };

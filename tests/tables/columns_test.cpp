@@ -72,12 +72,12 @@ TEST_F(Columns, RefusedDefinitionsChangeNothing) {
       {"too wide", col("x", kText, INT32_MAX), PF_BADWIDTH, {"2147483647", "x"}},
       {"too wide with others", col("x", kText, INT32_MAX - 8), PF_BADWIDTH, {"2147483639", "x"}},
   };
-  std::string before = snapshot();
+  std::string before = snapshot(true);
   for (const auto& [label, def, status, texts] : define_refusals) {
     SCOPED_TRACE(label);
     EXPECT_EQ(TEV8R1_PF_def_column("t", def), status);
     EXPECT_EQ(error_texts(), texts);
-    EXPECT_EQ(snapshot(), before);
+    EXPECT_EQ(snapshot(true), before);
   }
 
   define({col("same", kText, 3)});
@@ -97,13 +97,13 @@ TEST_F(Columns, RefusedDefinitionsChangeNothing) {
       {"r", indexed(col("r", kReal, 8, {-10, 10, 6}), true), PF_NOTUNIQUE, kEmpty},
       {"same", indexed(col("same", kText, 3), true), PF_NOTUNIQUE, kEmpty},
   };
-  before = snapshot();
+  before = snapshot(true);
   for (const auto& [name, def, status, texts] : redefine_refusals) {
     SCOPED_TRACE(testing::Message() << name << " to " << def.name << ", " << status);
     set_error_texts();
     EXPECT_EQ(redefine(name, def), status);
     EXPECT_EQ(error_texts(), texts);
-    EXPECT_EQ(snapshot(), before);
+    EXPECT_EQ(snapshot(true), before);
   }
   EXPECT_EQ(index_entries(column(3)), nullptr);
 }
