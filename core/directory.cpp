@@ -1,5 +1,5 @@
-// The directory of the current file. Lists and tables go by the same rules, so that every operation is
-// written once, over what Kind says of each.
+// The directory of the current file. Lists and tables go by the same rules, so that every operation
+// is written once, over what Kind says of each.
 #include "core/directory.h"
 
 #include <cstring>
@@ -59,8 +59,8 @@ struct Kind<TEVPF_TABLE> {
   }
 };
 
-// Whether the hashed names are those of the directory; builds them when they are not. A directory of
-// a few elements is walked instead.
+// Whether the hashed names are those of the directory; builds them when they are not. A directory
+// of a few elements is walked instead.
 template <class Record>
 bool names_are_hashed(TEVPF_FILE& file) noexcept {
   const std::int32_t count = file.*Kind<Record>::kCount;
@@ -105,8 +105,8 @@ template <class Record>
   return PF_NORMAL;
 }
 
-// Every operation starts here, and mostly with the element of the last one and a short name: that case
-// calls nothing.
+// Every operation starts here, and mostly with the element of the last one and a short name: that
+// case calls nothing.
 template <class Record>
 TEVPF_STATUS find_element(const char* name, Record** element_out) noexcept {
   if (library.current_file != nullptr) {

@@ -1,8 +1,8 @@
 // Builds elements from their stored form.
 //
-// The shape of a body is checked before its element is created; what does not hold together is refused.
-// A failure behind that leaves the element in the directory with the parameters or columns built so
-// far, which is a state like any other: sizes, counts and indexes agree.
+// The shape of a body is checked before its element is created; what does not hold together is
+// refused. A failure behind that leaves the element in the directory with the parameters or columns
+// built so far, which is a state like any other: sizes, counts and indexes agree.
 #pragma once
 
 #include "core/element.h"

@@ -32,8 +32,8 @@ bool must_fail(std::uint64_t bytes) noexcept {
 constexpr bool must_fail(std::uint64_t) noexcept { return false; }
 #endif
 
-// Asks for a large block in large pages: fresh memory then costs one fault for 2 MB instead of 512, and
-// rows reached at random hardly ever miss in the address cache. Only a hint.
+// Asks for a large block in large pages: fresh memory then costs one fault for 2 MB instead of 512,
+// and rows reached at random hardly ever miss in the address cache. Only a hint.
 void* in_large_pages(void* block, [[maybe_unused]] std::size_t bytes) noexcept {
 #ifdef __linux__
   constexpr std::size_t kLarge = std::size_t{4} << 20;

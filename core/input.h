@@ -1,5 +1,6 @@
-// Where stored bytes come from: a stream, read once from front to back. What a file says about itself
-// is a claim; Input tells whether the rest of the stream can hold it, before anything is allocated.
+// Where stored bytes come from: a stream, read once from front to back. What a file says about
+// itself is a claim; Input tells whether the rest of the stream can hold it, before anything is
+// allocated.
 #pragma once
 
 #include <cstdint>

@@ -64,8 +64,8 @@ struct StoredParams {
   std::int32_t known = 0;  // those in front of the first one of an unknown type
 };
 
-// Takes the parameters off the body, up to the first one of an unknown type, whose size nobody knows.
-// False when they do not fill the body.
+// Takes the parameters off the body, up to the first one of an unknown type, whose size nobody
+// knows. False when they do not fill the body.
 bool parse_records(ByteReader body, StoredParams& params) noexcept {
   for (; params.known < params.count; ++params.known) {
     switch (parse_param(body, params.records[static_cast<std::size_t>(params.known)])) {

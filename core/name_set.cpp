@@ -74,7 +74,8 @@ void remove_name(NameSet& set, const TEVPF_ELEM_HEADER* element) noexcept {
     if (set.slots[hole].element == nullptr) return drop_names(set);  // its name was changed
     hole = (hole + 1) & set.mask;
   }
-  // Close the gap: a later slot moves into the hole unless its own first choice lies behind the hole.
+  // Close the gap: a later slot moves into the hole unless its own first choice lies behind the
+  // hole.
   for (std::uint32_t i = (hole + 1) & set.mask; set.slots[i].element != nullptr;
        i = (i + 1) & set.mask) {
     const std::uint32_t probed = (i - set.slots[i].hash) & set.mask;

@@ -1,6 +1,6 @@
 // Element names of one kind in one file, hashed by the 19 characters that are kept of a name: an
-// accelerator beside the directory, which stays the truth. It may be dropped at any time and is built
-// again when it is needed; without memory for it, callers walk the directory.
+// accelerator beside the directory, which stays the truth. It may be dropped at any time and is
+// built again when it is needed; without memory for it, callers walk the directory.
 #pragma once
 
 #include <cstdint>

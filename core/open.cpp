@@ -18,8 +18,9 @@ struct OpenedStream {
   bool created;
 };
 
-// For update where that is allowed, else for reading; a file that is not there, or gives neither right,
-// is made anew. Any other failure is no reason to empty a file that may be there: it may pass.
+// For update where that is allowed, else for reading; a file that is not there, or gives neither
+// right, is made anew. Any other failure is no reason to empty a file that may be there: it may
+// pass.
 OpenedStream open_or_create(const char* name) noexcept {
   if (std::FILE* stream = std::fopen(name, "r+b")) return {stream, false, false};
   if (access_denied(errno)) {

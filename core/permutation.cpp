@@ -21,8 +21,8 @@ bool few_reach_all(const std::int32_t* entries, std::uint32_t count) noexcept {
   return reached == ~std::uint64_t{0} >> (kBits - count);
 }
 
-// One byte a number: a plain store for each entry, none of which waits for the one before, as it would
-// where neighbours share a word.
+// One byte a number: a plain store for each entry, none of which waits for the one before, as it
+// would where neighbours share a word.
 bool reach_all(const std::int32_t* entries, std::uint32_t count, unsigned char* reached) noexcept {
   for (std::uint32_t i = 0; i < count; ++i) {
     const auto entry = static_cast<std::uint32_t>(entries[i]);

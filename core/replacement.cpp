@@ -48,8 +48,8 @@ class Descriptor {
   int fd_;
 };
 
-// What is known of a file that can be replaced: it may be written in place, is a regular one, and has
-// no other name.
+// What is known of a file that can be replaced: it may be written in place, is a regular one, and
+// has no other name.
 bool describe(const char* path, struct stat& facts) noexcept {
   const Descriptor file(open(path, O_WRONLY | O_CLOEXEC | O_NONBLOCK));
   return file.get() >= 0 && fstat(file.get(), &facts) == 0 && S_ISREG(facts.st_mode) &&
@@ -70,7 +70,8 @@ bool reached_disk(int fd) noexcept {
   return fsync(fd) == 0 || errno == EINVAL || errno == ENOTSUP || errno == EROFS;
 }
 
-// The system does not allow a file beside this one, or in its place; nothing is wrong with the disk.
+// The system does not allow a file beside this one, or in its place; nothing is wrong with the
+// disk.
 bool may_be_written_plainly(int error_number) noexcept {
   return error_number == EACCES || error_number == EPERM || error_number == EROFS ||
          error_number == EBUSY || error_number == EXDEV || error_number == ENAMETOOLONG;

@@ -1,10 +1,10 @@
 // Saving without a moment in which the file on the disk is neither the old one nor the new one: the
 // new image is written beside the file, flushed to the disk, and then put in its place in one step.
 //
-// Not every file can be replaced so: the folder must be writable, the file a regular one of a single
-// name whose owner and mode the image can take over. A file that may not be written is not replaced
-// either. Then the caller writes it plainly. On Windows, where an open file cannot be replaced, that is
-// always so.
+// Not every file can be replaced so: the folder must be writable, the file a regular one of a
+// single name whose owner and mode the image can take over. A file that may not be written is not
+// replaced either. Then the caller writes it plainly. On Windows, where an open file cannot be
+// replaced, that is always so.
 #pragma once
 
 #include <cstdio>

@@ -19,8 +19,8 @@ void adopt_stream(TEVPF_FILE& file, std::FILE* stream) noexcept {
   file.fp = stream;
 }
 
-// Empties the file on the disk and writes it again. The old stream goes first: what a failed write has
-// left in its buffer must not end up in the new file.
+// Empties the file on the disk and writes it again. The old stream goes first: what a failed write
+// has left in its buffer must not end up in the new file.
 TEVPF_STATUS overwrite(TEVPF_FILE& file) noexcept {
   adopt_stream(file, nullptr);
   adopt_stream(file, std::fopen(file.file_name, "wb"));

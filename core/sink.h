@@ -1,5 +1,5 @@
-// Where stored bytes go: a large buffer in front of a stream, so that many small records leave in few
-// large writes. Remembers that a write failed.
+// Where stored bytes go: a large buffer in front of a stream, so that many small records leave in
+// few large writes. Remembers that a write failed.
 #pragma once
 
 #include <cstdint>
@@ -18,8 +18,8 @@ class Sink {
 
   static constexpr std::size_t kMaxRecord = 512;  // what `record` can give room for
 
-  // How far behind a record its caller may write, so that what varies in size is copied as if it were of
-  // the largest size.
+  // How far behind a record its caller may write, so that what varies in size is copied as if it
+  // were of the largest size.
   static constexpr std::size_t kSlack = 32;
 
   // Room for a record of so many bytes, which the caller fills at once.

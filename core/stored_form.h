@@ -1,11 +1,12 @@
-// The file format, written down once: the stored fields of each record in stored order. Sizes, reader
-// and writer follow from these tables. Little-endian, without padding; the stored form is the same
-// whatever the size of a pointer.
+// The file format, written down once: the stored fields of each record in stored order. Sizes,
+// reader and writer follow from these tables. Little-endian, without padding; the stored form is
+// the same whatever the size of a pointer.
 //
-//   element      list head, or table head; then btf - 12, or btf - 24 bytes of parameters or columns
+//   element      header, then btf bytes: list head or table head, and its parameters or columns
 //   parameter    kParamFields, type part, [description and terminator]
-//                type part: the first param_part bytes of `part`; strings: then the text and terminator
-//   column       kColumnFields, the first column_part bytes of `limits`, [description and terminator]
+//                type part: the first param_part bytes of `part`; strings: text and terminator, too
+//   column       kColumnFields, the first column_part bytes of `limits`, [description and
+//                terminator]
 //   behind       list: name index; table: the index of each indexed column, then the rows
 #pragma once
 

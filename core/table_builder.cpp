@@ -53,8 +53,8 @@ bool lies_as_stated(Layout& layout, const TEVPF_COLUMN& column) noexcept {
   return place_column(layout, column.def) == column.offset && layout.row_wid <= kMaxRowWidth;
 }
 
-// Whether the columns fill the body and the row, up to the first one of an unknown type, whose sizes
-// nobody knows.
+// Whether the columns fill the body and the row, up to the first one of an unknown type, whose
+// sizes nobody knows.
 bool is_well_formed(ByteReader body, std::int32_t num_cols, std::int32_t row_wid) noexcept {
   if (num_cols > body.left() / stored_size(kColumnFields)) return false;  // whatever their types
   Layout layout;
@@ -114,7 +114,8 @@ TEVPF_STATUS build_columns(TEVPF_TABLE& table, ByteReader body, std::int32_t num
   return status;
 }
 
-// Reads a column's index of `count` entries. One that is none is left out, to be built from the rows.
+// Reads a column's index of `count` entries. One that is none is left out, to be built from the
+// rows.
 TEVPF_STATUS read_index(TEVPF_COLUMN& column, std::int32_t count, Input& input) noexcept {
   Owned<unsigned char> block;
   const auto bytes = static_cast<std::uint64_t>(count) * sizeof(std::int32_t);

@@ -23,8 +23,8 @@ void terminate_field(char (&field)[N]) noexcept {
   field[N - 1] = '\0';
 }
 
-// Whether a field holds exactly this text, which has fewer than 8 characters; false when it is longer. Most
-// names are short, and a call costs as much as eight steps.
+// Whether a field holds exactly this text, which has fewer than 8 characters; false when it is
+// longer. Most names are short, and a call costs as much as eight steps.
 template <std::size_t N>
 bool holds_short_text(const char (&field)[N], const char* text) noexcept {
   static_assert(N >= 8);

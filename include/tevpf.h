@@ -193,7 +193,8 @@ typedef struct TEVPF_COL_DEF {
 
 /* Initialises the library, once, before anything else: files that are open already are forgotten,
  * neither written nor closed. Reads the environment variable TEV8R1_debug (defined, even empty:
- * dumps show internal fields); without this call the library works, with debug output off.
+ * dumps show internal fields, and moving a column prints the new places to standard output);
+ * without this call the library works, with debug output off.
  *   PF_INITDONE  it was initialised before: files stay open, TEV8R1_debug was looked at again */
 TEVPF_API TEVPF_STATUS TEV8R1_PF_init(void) TEVPF_NOEXCEPT;
 
@@ -575,8 +576,9 @@ TEVPF_API int32_t TEV8R1_calc_col_width(int32_t width, int32_t name_length) TEVP
  * whose order positions then follow. The cursor (current row, next row) holds positions.
  * Value checks: PF_RANGE (a value outside its column's bounds, give or take the column's
  * tolerance) and PF_DUPLICATE (a unique column already holds it); interactive mode switches them
- * off where said. Adding and deleting cost O(log n) comparisons and O(n) moves of entries per index,
- * and O(n) moves of rows; appending moves no row, and no entry where its value is the greatest. */
+ * off where said. Adding and deleting cost O(log n) comparisons and O(n) moves of entries per
+ * index, and O(n) moves of rows; appending moves no row, and no entry where its value is the
+ * greatest. */
 
 /* Appends a row; inserts it in front of a row number (PF_END_POS or beyond the last: at the end;
  * negative: at the front); or appends it after filling every column whose entry in `supplied` is 0

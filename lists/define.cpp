@@ -1,5 +1,5 @@
-// Adding parameters and replacing their definitions. Each operation has every block it needs before it
-// changes the list.
+// Adding parameters and replacing their definitions. Each operation has every block it needs before
+// it changes the list.
 #include <algorithm>
 #include <cstring>
 #include <limits>
@@ -34,7 +34,8 @@ bool make_room(TEVPF_LIST& list, std::int64_t slots) noexcept {
   return true;
 }
 
-// Full arrays get the documented number of spare slots, counted whatever the blocks behind them hold.
+// Full arrays get the documented number of spare slots, counted whatever the blocks behind them
+// hold.
 TEVPF_STATUS ensure_free_slot(TEVPF_LIST& list) noexcept {
   if (list.free_params > 0) return PF_NORMAL;
   const std::int32_t increment = library.alloc_increment;

@@ -1,8 +1,9 @@
-// Lists and their parameters as records, and what holds whole records together: their release and copy.
+// Lists and their parameters as records, and what holds whole records together: their release and
+// copy.
 //
-// Invariants: index_ptr[0 .. num_params - 1] holds each position once, ordered by name; no two names
-// compare equal; header.btf = 12 + the stored sizes of all parameters; for strings, length is the
-// length of value; description and string value are blocks of the record's own.
+// Invariants: index_ptr[0 .. num_params - 1] holds each position once, ordered by name; no two
+// names compare equal; header.btf = 12 + the stored sizes of all parameters; for strings, length is
+// the length of value; description and string value are blocks of the record's own.
 #pragma once
 
 #include <cstddef>
@@ -62,8 +63,8 @@ namespace tevpf {
 // Releases everything that the list owns, and the record; half-built ones too.
 void release_list(TEVPF_LIST* list) noexcept;
 
-// Gives `copy`, a new empty list, all that `source` holds but its name; false when memory runs out, and
-// then `copy` is still empty.
+// Gives `copy`, a new empty list, all that `source` holds but its name; false when memory runs out,
+// and then `copy` is still empty.
 [[nodiscard]] bool copy_list_body(const TEVPF_LIST& source, TEVPF_LIST& copy) noexcept;
 
 // Gives a new list its first spare slots; false when memory runs out.

@@ -13,8 +13,8 @@
 namespace tevpf {
 namespace {
 
-// A name to search for. Plain ones are compared eight bytes at a time, which takes them as a field of
-// their own, zero behind the end; of a name too long for a field, as much as one holds.
+// A name to search for. Plain ones are compared eight bytes at a time, which takes them as a field
+// of their own, zero behind the end; of a name too long for a field, as much as one holds.
 struct Wanted {
   explicit Wanted(const char* name) noexcept : pattern(make_pattern(name)) {
     std::memcpy(field, name, std::min(std::strlen(name), sizeof field));
@@ -26,8 +26,8 @@ struct Wanted {
 
 int first_bit(std::uint64_t word) noexcept { return word == 0 ? 64 : std::countr_zero(word); }
 
-// The order of a record's name and a wanted one, as strcmp gives it. Reads whole fields: what stands
-// behind a terminator does not count, because the lowest byte that differs or ends decides.
+// The order of a record's name and a wanted one, as strcmp gives it. Reads whole fields: what
+// stands behind a terminator does not count, because the lowest byte that differs or ends decides.
 int compare_fields(const char (&name)[TEVPF_NAME_SIZE],
                    const char (&wanted)[TEVPF_NAME_SIZE]) noexcept {
   for (const std::size_t offset : {std::size_t{0}, std::size_t{8}, sizeof name - 8}) {
@@ -50,8 +50,8 @@ int order_of(const TEVPF_PARAM& param, const Wanted& wanted) noexcept {
                                : compare_fields(param.def.name, wanted.field);
 }
 
-// Searches `count` entries; entry(place) gives the position there. Several names can match: once one
-// has been met, the search goes on among those before it, for the first one.
+// Searches `count` entries; entry(place) gives the position there. Several names can match: once
+// one has been met, the search goes on among those before it, for the first one.
 template <class Entry>
 NamePlace search(const TEVPF_PARAM* params, std::int32_t count, const Wanted& wanted,
                  Entry entry) noexcept {

@@ -1,5 +1,5 @@
-// The name index of a list: the positions of its parameters, ordered by name. Besides the reader, the
-// writer and what holds whole records together, these are the only functions that look into it.
+// The name index of a list: the positions of its parameters, ordered by name. Besides the reader,
+// the writer and what holds whole records together, these are the only functions that look into it.
 //
 // Terms: a position counts parameters as the list presents them; a place counts them in name order.
 #pragma once
@@ -27,8 +27,8 @@ TEVPF_API TEVPF_STATUS TEV8R1_remove_param_from_index(TEVPF_LIST* list,
 
 namespace tevpf {
 
-// The position of the parameter that the name, or pattern, finds. Exact names cost O(1) once looking
-// up has paid for it.
+// The position of the parameter that the name, or pattern, finds. Exact names cost O(1) once
+// looking up has paid for it.
 //   PF_NOPARAM  none; texts: the name
 [[nodiscard]] TEVPF_STATUS find_param(TEVPF_LIST& list, const char* name,
                                       std::int32_t& position) noexcept;
@@ -42,8 +42,8 @@ struct NamePlace {
 // count as if it were not there.
 NamePlace search_others(const TEVPF_LIST& list, std::int32_t without, const char* name) noexcept;
 
-// Takes up a parameter whose record stands at `position`, before num_params counts it. The positions
-// from there on go up by one.
+// Takes up a parameter whose record stands at `position`, before num_params counts it. The
+// positions from there on go up by one.
 void index_param(TEVPF_LIST& list, std::int32_t position, std::int32_t place) noexcept;
 
 // Puts the entry at place `from` to the place that it has among the others.

@@ -12,8 +12,8 @@ constexpr std::int32_t kFewNames = 16;         // fewer are found as fast in the
 constexpr std::int32_t kLookupsPerTable = 16;  // n / 16 look-ups pay for a table of n names
 constexpr std::size_t kLongestName = TEVPF_NAME_SIZE - 1;
 
-// The name as three words, zero behind its end; each word is mixed in by a multiplication whose upper
-// half is folded back.
+// The name as three words, zero behind its end; each word is mixed in by a multiplication whose
+// upper half is folded back.
 std::uint32_t hash_name(const char* name, std::size_t length) noexcept {
   constexpr std::uint64_t kOdd = 0x9E3779B97F4A7C15u;
   std::uint64_t words[3] = {};

@@ -11,7 +11,8 @@
 
 extern "C" {
 
-// Replaces the texts that the record points to by heap copies of its own, and gives its stored size.
+// Replaces the texts that the record points to by heap copies of its own, and gives its stored
+// size.
 //   PF_NOMEM, PF_BADTYPE  the record is as it was
 TEVPF_API TEVPF_STATUS TEV8R1_construct_param(TEVPF_PARAM* param, std::int32_t* bytes_out) noexcept;
 }
@@ -31,8 +32,8 @@ std::int8_t description_place(const TEVPF_PARAM_DEF& definition) noexcept;
 // Whether btf can change by that many bytes and still fit its 31 bits.
 bool btf_can_change(const TEVPF_LIST& list, std::int64_t bytes) noexcept;
 
-// A copy of a caller's definition as records hold them: name and units terminated, the absent string
-// value an empty text, length that of the value. The texts still are the caller's.
+// A copy of a caller's definition as records hold them: name and units terminated, the absent
+// string value an empty text, length that of the value. The texts still are the caller's.
 //   PF_NOMEM  the value is longer than 31 bits can say
 [[nodiscard]] TEVPF_STATUS normalise(TEVPF_PARAM_DEF& definition) noexcept;
 
@@ -51,20 +52,20 @@ inline void copy_value(const TEVPF_PARAM_DEF& definition, void* value_out) noexc
 // Releases the texts that the definition owns and leaves null pointers.
 void release_texts(TEVPF_PARAM_DEF& definition) noexcept;
 
-// Replaces the texts that the definition points to by heap copies; false when memory runs out, and then
-// the definition is as it was.
+// Replaces the texts that the definition points to by heap copies; false when memory runs out, and
+// then the definition is as it was.
 [[nodiscard]] bool own_texts(TEVPF_PARAM_DEF& definition) noexcept;
 
-// A text on its way into a record: the record's old block is kept when it is large enough, else a new
-// one is there before anything changes.
+// A text on its way into a record: the record's old block is kept when it is large enough, else a
+// new one is there before anything changes.
 class NewText {
  public:
-  // `text`, of `length` characters, is to replace what stands in a block of `capacity` bytes; null for
-  // no text. false when memory runs out.
+  // `text`, of `length` characters, is to replace what stands in a block of `capacity` bytes; null
+  // for no text. false when memory runs out.
   [[nodiscard]] bool prepare(const char* text, std::size_t length, std::size_t capacity) noexcept;
 
-  // Writes it into the old block, or into the new one and releases the old; gives the block that holds
-  // it, null for no text.
+  // Writes it into the old block, or into the new one and releases the old; gives the block that
+  // holds it, null for no text.
   char* commit(char* old) noexcept;
 
  private:

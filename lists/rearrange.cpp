@@ -1,4 +1,5 @@
-// Deleting, renaming and moving parameters: nothing here allocates, so after the checks nothing fails.
+// Deleting, renaming and moving parameters: nothing here allocates, so after the checks nothing
+// fails.
 #include <algorithm>
 #include <cstring>
 

@@ -1,5 +1,5 @@
-// Definitions of parameters and columns as the dumps show them: the fields that both have in common,
-// and the whole line of a column.
+// Definitions of parameters and columns as the dumps show them: the fields that both have in
+// common, and the whole line of a column.
 #pragma once
 
 #include <cstdint>
@@ -38,8 +38,8 @@ constexpr const TypeText& type_text(std::int32_t type) noexcept {
   return kTypeTexts[type - PF_TYPE_INT];
 }
 
-// Write to lists and tables alike: name and units; a number right-aligned (reals and doubles with so
-// many digits); precision, maximum and minimum.
+// The fields that lists and tables show alike: name and units; a number right-aligned (reals and
+// doubles with so many digits); precision, maximum and minimum.
 void write_name_and_units(TextOut& out, const char (&name)[TEVPF_NAME_SIZE],
                           const char (&units)[TEVPF_UNITS_SIZE]) noexcept;
 

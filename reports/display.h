@@ -10,8 +10,8 @@
 
 extern "C" {
 
-// Writes a text; what is longer than `width` (at least 3) is broken at white space, and lines that go
-// on end with a continuation character. No newline follows the last one.
+// Writes a text; what is longer than `width` (at least 3) is broken at white space, and lines that
+// go on end with a continuation character. No newline follows the last one.
 //   first   not 0: the first line is written where the caller's line stands, without the indent
 //   indent  stands in front of every further line
 //   PF_NOMORE  the text took several lines

@@ -1,4 +1,5 @@
-// Display formats: how wide a column and a row are shown, and the printf format of a column's values.
+// Display formats: how wide a column and a row are shown, and the printf format of a column's
+// values.
 #pragma once
 
 #include <cstdint>
@@ -12,7 +13,8 @@ extern "C" {
 TEVPF_API TEVPF_STATUS TEV8R1_make_col_format(TEVPF_COLUMN* column,
                                               std::int32_t* width_out) noexcept;
 
-// Remakes the formats of all columns and the table's display width; the status is the last column's.
+// Remakes the formats of all columns and the table's display width; the status is the last
+// column's.
 TEVPF_API TEVPF_STATUS TEV8R1_make_table_format(TEVPF_TABLE* table) noexcept;
 }
 

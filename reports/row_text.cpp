@@ -83,7 +83,8 @@ char* write_number_cell(char* out, const char* value, const Cell& cell) noexcept
   return align_right(out, end, cell.width);
 }
 
-// An empty text shows a marker; one that ends in white space gets it behind, so that it can be seen.
+// An empty text shows a marker; one that ends in white space gets it behind, so that it can be
+// seen.
 char* write_string_cell(char* out, const char* value, const Cell& cell) noexcept {
   const std::size_t length = strnlen(value, static_cast<std::size_t>(cell.length));
   if (length == 0) return align_left(out, write_marker(out), cell.empty_width);

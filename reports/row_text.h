@@ -26,7 +26,8 @@ TEVPF_API TEVPF_STATUS TEV8R1_review_row(const TEVPF_COLUMN* first, const TEVPF_
 
 namespace tevpf {
 
-// Dumps pad strings to the display width, but for the last column; listings pad to the declared width.
+// Dumps pad strings to the display width, but for the last column; listings pad to the declared
+// width.
 enum class StringPadding { kDump, kListing };
 
 struct Cell {

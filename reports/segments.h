@@ -1,5 +1,6 @@
 // Lines that are too wide for a page, cut into segments of whole columns. A segment's lines are
-// indented by a tab more than those of the segment before, by two at most, and may be so much shorter.
+// indented by a tab more than those of the segment before, by two at most, and may be so much
+// shorter.
 #pragma once
 
 #include <cstdint>

@@ -1,5 +1,5 @@
 #!/usr/bin/env bash
-# check.sh [format|layers|tidy|cppcheck|shell...]: the static checks, all of them unless some are named.
+# check.sh [format|layers|tidy|cppcheck|shell...]: the static checks, all unless some are named.
 set -euo pipefail
 cd "$(dirname "${BASH_SOURCE[0]}")/.."
 

@@ -1,9 +1,9 @@
 #!/usr/bin/env python3
 """check_layers.py [--draw]: holds the includes against the layers of docs/design.md.
 
-An include points at its own layer or at one below it, and no two files include each other, directly
-or around a corner. A header and the source of its name count as one file. --draw prints who includes
-whom.
+An include points at its own layer or at one below it, and no two files include each other,
+directly or around a corner. A header and the source of its name count as one file. --draw prints
+who includes whom.
 """
 
 import fnmatch

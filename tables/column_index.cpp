@@ -30,11 +30,11 @@ std::int64_t readable_bytes(const TEVPF_TABLE& table, const TEVPF_COLUMN& column
   return std::int64_t{table.row_wid} - column.offset;
 }
 
-// ---- Searching -----------------------------------------------------------------------------------
+// ---- Searching ----------------------------------------------------------------------------------
 
-// Integers: the first entry that is not less. Their order is total, so the answer is that of the probes
-// below. Three probes a step, which wait for memory together, quarter what is left; no branch depends on
-// a value.
+// Integers: the first entry that is not less. Their order is total, so the answer is that of the
+// probes below. Three probes a step, which wait for memory together, quarter what is left; no
+// branch depends on a value.
 template <class T>
 TEVPF_STATUS search_entries(const Values& values, const std::int32_t* entries, std::int32_t count,
                             const NumberKey<T>& key, std::int32_t& pos) noexcept
@@ -70,7 +70,8 @@ std::int32_t first_equal(const Values& values, const std::int32_t* entries, std:
 }
 
 // Texts that are equal stand together, so many of them are halved. A stored text that is a pattern
-// stands in front of what it matches and may part a few equal ones: nearby it is one step at a time.
+// stands in front of what it matches and may part a few equal ones: nearby it is one step at a
+// time.
 template <bool kWide>
 std::int32_t first_equal(const Values& values, const std::int32_t* entries, std::int32_t low,
                          std::int32_t found, const TextKey<kWide>& key) noexcept {
@@ -88,8 +89,8 @@ std::int32_t first_equal(const Values& values, const std::int32_t* entries, std:
   return found;
 }
 
-// Reals, doubles and texts: these probes and no others, because equality within a tolerance chains and
-// what is not a number equals everything.
+// Reals, doubles and texts: these probes and no others, because equality within a tolerance chains
+// and what is not a number equals everything.
 template <class Key>
 TEVPF_STATUS search_entries(const Values& values, const std::int32_t* entries, std::int32_t count,
                             const Key& key, std::int32_t& pos) noexcept {
@@ -111,10 +112,10 @@ TEVPF_STATUS search_entries(const Values& values, const std::int32_t* entries, s
   return PF_NOTFOUND;
 }
 
-// ---- Sorting -------------------------------------------------------------------------------------
+// ---- Sorting ------------------------------------------------------------------------------------
 
-// Numbers as unsigned keys in the order of their values; 0.0 and -0.0 are one value, and what is not a
-// number stands behind everything.
+// Numbers as unsigned keys in the order of their values; 0.0 and -0.0 are one value, and what is
+// not a number stands behind everything.
 std::uint32_t sort_key(std::int32_t value) noexcept {
   return static_cast<std::uint32_t>(value) ^ 0x80000000u;
 }
@@ -211,9 +212,10 @@ struct SortContext {
 };
 SortContext sort_context{{nullptr, 0}, PF_TYPE_INT, 0.0};
 
-// ---- Blocks --------------------------------------------------------------------------------------
+// ---- Blocks -------------------------------------------------------------------------------------
 
-// A block of `room` entries, those from `used` on zero; room 0: none. False when there is no memory.
+// A block of `room` entries, those from `used` on zero; room 0: none. False when there is no
+// memory.
 bool make_block(std::int64_t used, std::int64_t room, NewIndex& out) noexcept {
   out = NewIndex{};
   if (room <= 0) return true;
@@ -241,7 +243,7 @@ bool reserve_entries(TEVPF_COLUMN& column, std::int64_t needed) noexcept {
   return true;
 }
 
-// ---- Passes over entries, written so that the compiler makes vectors of them ---------------------
+// ---- Passes over entries, written so that the compiler makes vectors of them --------------------
 
 constexpr std::int32_t kBlock = 64;
 
@@ -258,8 +260,8 @@ std::int32_t find_entry(const std::int32_t* entries, std::int32_t first, std::in
   return at;
 }
 
-// Lowers by one every entry above `row` up to the entry that is `row`, and returns its position; count
-// when there is none.
+// Lowers by one every entry above `row` up to the entry that is `row`, and returns its position;
+// count when there is none.
 std::int32_t lower_up_to(std::int32_t* entries, std::int32_t count, std::int32_t row) noexcept {
   std::int32_t at = 0;
   for (; count - at >= kBlock; at += kBlock) {
@@ -313,7 +315,7 @@ void move_entries(std::int32_t* to, const std::int32_t* from, std::int32_t count
 
 }  // namespace
 
-// ---- Whole indexes -------------------------------------------------------------------------------
+// ---- Whole indexes ------------------------------------------------------------------------------
 
 bool build_index(const TEVPF_TABLE& table, const TEVPF_COLUMN& column, std::int64_t room,
                  NewIndex& out) noexcept {
@@ -362,7 +364,7 @@ bool reserve_index_entries(TEVPF_TABLE& table, std::int32_t rows) noexcept {
   return true;
 }
 
-// ---- Entries -------------------------------------------------------------------------------------
+// ---- Entries ------------------------------------------------------------------------------------
 
 TEVPF_STATUS search_index(const TEVPF_TABLE& table, const TEVPF_COLUMN& column, std::int32_t first,
                           std::int32_t count, const void* key, std::int32_t& pos) noexcept {

@@ -9,8 +9,8 @@
 extern "C" {
 
 // Completes a record whose definition has just been filled in: its own copy of the description, an
-// empty format, the tolerance; raises *mod to a number's value size and gives the stored size and the
-// value size. After a failure the description is the record's own, or null.
+// empty format, the tolerance; raises *mod to a number's value size and gives the stored size and
+// the value size. After a failure the description is the record's own, or null.
 //   PF_BADTYPE, PF_NOMEM
 TEVPF_API TEVPF_STATUS TEV8R1_construct_column(TEVPF_COLUMN* column, std::int32_t* btf_out,
                                                std::int32_t* size_out, std::int16_t* mod) noexcept;

@@ -1,5 +1,5 @@
-// Defining, deleting and moving columns. Each operation checks, acquires every block that it needs, and
-// only then changes the table, by steps that cannot fail. Redefining stands in redefine.cpp.
+// Defining, deleting and moving columns. Each operation checks, acquires every block that it needs,
+// and only then changes the table, by steps that cannot fail. Redefining stands in redefine.cpp.
 #include "tables/columns.h"
 
 #include <cstdio>
@@ -91,8 +91,8 @@ TEVPF_STATUS construct_new_column(const TEVPF_TABLE& table, const TEVPF_COL_DEF&
   return PF_NORMAL;
 }
 
-// Room in the table for the column's record, index, values and default value. What stays of it after a
-// failure does not show.
+// Room in the table for the column's record, index, values and default value. What stays of it
+// after a failure does not show.
 bool acquire_room(TEVPF_TABLE& table, NewColumn& column) noexcept {
   const TEVPF_COL_DEF& def = column.record.def;
   if (!acquire_column_slot(table, column.larger)) return false;
@@ -142,8 +142,8 @@ void append_column(TEVPF_TABLE& table, NewColumn column) noexcept {
   set_layout(table, column.layout);
 }
 
-// Gives a column the next place of a new layout and notes which bytes of a row move there; returns the
-// new number of runs.
+// Gives a column the next place of a new layout and notes which bytes of a row move there; returns
+// the new number of runs.
 std::int32_t place_again(Layout& layout, TEVPF_COLUMN& column, Run* runs,
                          std::int32_t num_runs) noexcept {
   const auto offset = static_cast<std::int32_t>(place_column(layout, column.def));

@@ -12,8 +12,8 @@ bool has_position(const TEVPF_TABLE& table, std::int32_t position) noexcept {
   return position >= 0 && position < table.num_rows;
 }
 
-// In search order rows lie anywhere: ask for one some positions ahead, so that it is there in time. As a
-// function of its own it would have no effect that the compiler knows of, and be left out.
+// In search order rows lie anywhere: ask for one some positions ahead, so that it is there in time.
+// As a function of its own it would have no effect that the compiler knows of, and be left out.
 [[gnu::always_inline]] inline void fetch_ahead(const TEVPF_TABLE& table,
                                                std::int32_t position) noexcept {
   if (table.cur_col == nullptr || table.num_rows - position <= kRowsAhead) return;

@@ -1,5 +1,5 @@
-// The default row: one row of the table's layout that holds every column's min, strings the empty text,
-// until a caller sets other values. Bytes without a value are zero.
+// The default row: one row of the table's layout that holds every column's min, strings the empty
+// text, until a caller sets other values. Bytes without a value are zero.
 #pragma once
 
 #include "core/heap.h"

@@ -1,5 +1,5 @@
-// What callers need to know about columns to build rows: definitions, names, places. All that is handed
-// out is the caller's own.
+// What callers need to know about columns to build rows: definitions, names, places. All that is
+// handed out is the caller's own.
 #include "core/directory.h"
 #include "core/heap.h"
 #include "core/status.h"

@@ -71,8 +71,8 @@ TEVPF_STATUS check_redefinition(const TEVPF_TABLE& table, const TEVPF_COLUMN& co
   return width > kMaxRowWidth ? PF_BADWIDTH : PF_NORMAL;
 }
 
-// The index as the redefinition leaves it: built when it is switched on, and built anew when a finer
-// tolerance puts entries out of order. Uniqueness is judged under the old tolerance.
+// The index as the redefinition leaves it: built when it is switched on, and built anew when a
+// finer tolerance puts entries out of order. Uniqueness is judged under the old tolerance.
 TEVPF_STATUS prepare_index(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
                            Redefinition& next) noexcept {
   const TEVPF_COL_DEF& def = next.record.def;

@@ -9,8 +9,9 @@
 namespace tevpf {
 namespace {
 
-// Zeroes the same bytes of many rows in one pass over them, or in one for each kMost. A gap is a few
-// bytes, so each is a word of the row with a mask over it: a call to memset costs more than the rest.
+// Zeroes the same bytes of many rows in one pass over them, or in one for each kMost. A gap is a
+// few bytes, so each is a word of the row with a mask over it: a call to memset costs more than the
+// rest.
 class Eraser {
  public:
   Eraser(unsigned char* rows, std::int64_t count, std::int64_t row_wid) noexcept

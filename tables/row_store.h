@@ -21,8 +21,8 @@ inline const unsigned char* row_at(const TEVPF_TABLE& table, std::int64_t row) n
   return table.row_data + row * table.row_wid;
 }
 
-// Copies a row's bytes. Rows up to kShortRow go by 16 bytes, the last ones over those before, without a
-// call: reading row by row is copying short rows.
+// Copies a row's bytes. Rows up to kShortRow go by 16 bytes, the last ones over those before,
+// without a call: reading row by row is copying short rows.
 inline void copy_row_bytes(void* to, const unsigned char* row, std::int32_t row_wid) noexcept {
   constexpr std::int32_t kStep = 16, kShortRow = 128;
   auto* const out = static_cast<unsigned char*>(to);
@@ -56,8 +56,8 @@ inline const unsigned char* column_base(const TEVPF_TABLE& table,
 void open_row_gap(TEVPF_TABLE& table, std::int32_t row) noexcept;
 void close_row_gap(TEVPF_TABLE& table, std::int32_t row) noexcept;
 
-// Zeroes the padding of some rows of this table's layout and puts a terminator into the last byte of
-// each of their string values: for rows that callers or files hand in. They may lie anywhere.
+// Zeroes the padding of some rows of this table's layout and puts a terminator into the last byte
+// of each of their string values: for rows that callers or files hand in. They may lie anywhere.
 void clean_rows(const TEVPF_TABLE& table, unsigned char* rows, std::int64_t count) noexcept;
 
 // Give the row block back, or replace it by one of `room` bytes; num_rows and free_rows stay.

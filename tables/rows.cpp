@@ -20,7 +20,7 @@ namespace {
 
 constexpr std::int32_t kMaxFreeRows = std::numeric_limits<std::int16_t>::max();
 
-// ---- Rows that callers hand in -------------------------------------------------------------------
+// ---- Rows that callers hand in ------------------------------------------------------------------
 
 bool all_texts_end(const TEVPF_TABLE& table, const unsigned char* row) noexcept {
   for (std::int32_t i = 0; i < table.num_cols; ++i) {
@@ -61,7 +61,7 @@ void store_row(TEVPF_TABLE& table, const void* row, std::int32_t row_number) noe
   clean_rows(table, slot, 1);
 }
 
-// ---- Insertion and removal -----------------------------------------------------------------------
+// ---- Insertion and removal ----------------------------------------------------------------------
 
 // Puts a row into its place, for which there is a spare slot; the indexes know its number as a gap.
 void open_slot(TEVPF_TABLE& table, const void* row, std::int32_t row_number) noexcept {
@@ -142,7 +142,7 @@ TEVPF_STATUS move_row(TEVPF_TABLE& table, std::int32_t from, std::int32_t to) no
   return status;
 }
 
-// ---- Replacement ---------------------------------------------------------------------------------
+// ---- Replacement --------------------------------------------------------------------------------
 
 bool values_differ(const TEVPF_COLUMN& column, const unsigned char* stored_row,
                    const unsigned char* new_row) noexcept {

@@ -10,8 +10,8 @@ extern "C" {
 //   PF_NOMEM  texts empty; the table is as it was
 TEVPF_API TEVPF_STATUS TEV8R1_get_space(TEVPF_TABLE* table) noexcept;
 
-// Gives a row that num_rows does not count yet its entries in all indexes, which have room for them.
-// Always PF_NORMAL.
+// Gives a row that num_rows does not count yet its entries in all indexes, which have room for
+// them. Always PF_NORMAL.
 TEVPF_API TEVPF_STATUS TEV8R1_update_indexes(TEVPF_TABLE* table, const void* row,
                                              std::int32_t row_number) noexcept;
 }

@@ -20,9 +20,9 @@ namespace {
 constexpr std::int8_t kExact = 0;
 constexpr std::int8_t kNearest = 1;
 
-// The first position from `first` on whose row has a value equal to the key, walking in storage order
-// (order null) or through an index; num_rows when there is none. At the speed of memory: one typed
-// comparison a row.
+// The first position from `first` on whose row has a value equal to the key, walking in storage
+// order (order null) or through an index; num_rows when there is none. At the speed of memory: one
+// typed comparison a row.
 template <class Key>
 std::int32_t walk(const TEVPF_TABLE& table, const TEVPF_COLUMN& column, const std::int32_t* order,
                   std::int32_t first, const Key& key) noexcept {

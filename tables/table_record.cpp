@@ -65,7 +65,8 @@ bool copy_default_row(const TEVPF_TABLE& source, TEVPF_TABLE& copy) noexcept {
   return copy.dft_row != nullptr;
 }
 
-// The storage behind the figures of a table; without columns there is none but of rows without bytes.
+// The storage behind the figures of a table; without columns there is none but of rows without
+// bytes.
 bool copy_storage(const TEVPF_TABLE& source, TEVPF_TABLE& copy) noexcept {
   if (source.num_rows > 0 && !copy_rows(source, copy)) return false;
   if (source.num_cols == 0) return true;

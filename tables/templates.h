@@ -1,5 +1,5 @@
-// The column templates of a table: five definitions, one a value type in type order, that callers set
-// and read. They exist in memory only, from their first use on.
+// The column templates of a table: five definitions, one a value type in type order, that callers
+// set and read. They exist in memory only, from their first use on.
 #pragma once
 
 #include "tables/table.h"
@@ -14,8 +14,8 @@ namespace tevpf {
 
 void release_templates(TEVPF_TABLE& table) noexcept;
 
-// Gives `copy`, which has none, the templates of `source`; false when memory runs out, and then `copy`
-// still has none.
+// Gives `copy`, which has none, the templates of `source`; false when memory runs out, and then
+// `copy` still has none.
 [[nodiscard]] bool copy_templates(const TEVPF_TABLE& source, TEVPF_TABLE& copy) noexcept;
 
 }  // namespace tevpf

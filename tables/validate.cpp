@@ -20,7 +20,8 @@ bool is_in_range(const TEVPF_COLUMN& column, const void* value) noexcept {
   });
 }
 
-// The check of one value; for a unique column that does not hold it, `point` is its place in the index.
+// The check of one value; for a unique column that does not hold it, `point` is its place in the
+// index.
 TEVPF_STATUS check_value(const TEVPF_TABLE& table, const TEVPF_COLUMN& column, const void* value,
                          std::int32_t& point) noexcept {
   if (!is_in_range(column, value)) {

@@ -7,7 +7,8 @@
 
 extern "C" {
 
-// Checks one value of the column's type. PF_DUPLICATE leaves the row that holds it in library.dup_row.
+// Checks one value of the column's type. PF_DUPLICATE leaves the row that holds it in
+// library.dup_row.
 TEVPF_API TEVPF_STATUS TEV8R1_validate_value(const TEVPF_TABLE* table, const TEVPF_COLUMN* column,
                                              const void* value) noexcept;
 }

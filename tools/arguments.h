@@ -5,8 +5,8 @@
 
 namespace tool {
 
-// Reads what stands behind the command's name. Prints help, or what is wrong, and returns false with
-// the exit status when there is nothing to run.
+// Reads what stands behind the command's name. Prints help, or what is wrong, and returns false
+// with the exit status when there is nothing to run.
 bool read_arguments(const Command& command, int argc, const char* const* argv, Arguments& arguments,
                     ExitStatus& status);
 

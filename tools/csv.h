@@ -1,4 +1,5 @@
-// Comma-separated values as RFC 4180 describes them: a header row, fields in quotes where they need them.
+// Comma-separated values as RFC 4180 describes them: a header row, fields in quotes where they need
+// them.
 #pragma once
 
 #include <cstddef>
@@ -14,8 +15,8 @@ struct CsvRecord {
 };
 
 // Reads records one after the other. Lines end with LF, CRLF or CR, the last one may have no end; a
-// byte order mark in front and empty lines are skipped. Throws Failure, with the line number, at what
-// is no CSV.
+// byte order mark in front and empty lines are skipped. Throws Failure, with the line number, at
+// what is no CSV.
 class CsvReader {
  public:
   // `text` and `name` (for messages) must outlive the reader.

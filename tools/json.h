@@ -1,4 +1,5 @@
-// Values and texts as JSON. What JSON cannot hold becomes null (numbers) or a replacement character.
+// Values and texts as JSON. What JSON cannot hold becomes null (numbers) or a replacement
+// character.
 #pragma once
 
 #include <nlohmann/json.hpp>

@@ -74,7 +74,8 @@ std::string filled(std::string_view pattern, std::string_view first, std::string
   return result;
 }
 
-// The first text of a damaged file names an element, or the part behind its body that was being read.
+// The first text of a damaged file names an element, or the part behind its body that was being
+// read.
 std::string place(std::string_view item, const std::string& last_list,
                   const std::string& last_table) {
   static constexpr std::string_view kIndex = " index";

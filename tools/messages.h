@@ -1,5 +1,5 @@
-// The message texts that the library leaves to its callers: one sentence for a status and the two texts
-// that came with it.
+// The message texts that the library leaves to its callers: one sentence for a status and the two
+// texts that came with it.
 #pragma once
 
 #include <string>
@@ -18,8 +18,8 @@ Failure library_failure(TEVPF_STATUS status, const std::string& file, const std:
 // Throws that when the status is a failure.
 void require(TEVPF_STATUS status, const std::string& file, const char* doing);
 
-// What is wrong with a file that could not be loaded, and where. The last list and the last table that
-// were loaded are the ones in which loading may have stopped.
+// What is wrong with a file that could not be loaded, and where. The last list and the last table
+// that were loaded are the ones in which loading may have stopped.
 std::string damage(TEVPF_STATUS status, const std::string& last_list,
                    const std::string& last_table);
 

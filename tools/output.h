@@ -1,5 +1,5 @@
-// Where a command's result goes: standard output, or the file that -o names, which appears only when
-// everything has been written.
+// Where a command's result goes: standard output, or the file that -o names, which appears only
+// when everything has been written.
 #pragma once
 
 #include <cstdio>

@@ -25,14 +25,14 @@ struct FreeBlock {
 template <class T>
 using Block = std::unique_ptr<T[], FreeBlock>;
 
-// The library would take a leading "$" for the name of an environment variable; the shell has expanded
-// those already.
+// The library would take a leading "$" for the name of an environment variable; the shell has
+// expanded those already.
 std::string library_name(const std::string& path) {
   return path.starts_with('$') ? "./" + path : path;
 }
 
-// Opening with the library creates a file that is not there, and empties one that it may write but not
-// read. Neither may happen by looking at it.
+// Opening with the library creates a file that is not there, and empties one that it may write but
+// not read. Neither may happen by looking at it.
 void check_readable(const std::string& path) {
   std::error_code error;
   const fs::file_status status = fs::status(path, error);

@@ -1,5 +1,5 @@
-// What the standard library does not say about terminals, pipes and files. The only file with a branch
-// for Windows.
+// What the standard library does not say about terminals, pipes and files. The only file with a
+// branch for Windows.
 #pragma once
 
 #include <filesystem>
@@ -14,7 +14,8 @@ bool stdout_is_terminal();
 // Standard output is redirected to this very file.
 bool stdout_is(const std::filesystem::path& file);
 
-// Creates an empty file that was not there, whatever stands in the way; private: for its owner alone.
+// Creates an empty file that was not there, whatever stands in the way; private: for its owner
+// alone.
 bool create_exclusively(const std::filesystem::path& file, bool is_private);
 
 // What was written to the file is on the disk. False when it could not be brought there.

@@ -39,8 +39,8 @@ int significant_digits(double number) {
                                         mantissa.end(), is_digit));
 }
 
-// Digits that a number would lose make a text: leading zeros, and integers beyond what a double tells
-// apart.
+// Digits that a number would lose make a text: leading zeros, and integers beyond what a double
+// tells apart.
 bool would_lose_digits(std::string_view text) {
   if (text.front() == '-' || text.front() == '+') text.remove_prefix(1);
   if (text.size() > 1 && text[0] == '0' && is_digit(text[1])) return true;

@@ -1,5 +1,5 @@
-// Rows from CSV into a table of the open file. Columns are found by the names in the header row; for a
-// table that is not there, or has no columns, they are made to fit what the fields hold.
+// Rows from CSV into a table of the open file. Columns are found by the names in the header row;
+// for a table that is not there, or has no columns, they are made to fit what the fields hold.
 #pragma once
 
 #include <cstddef>

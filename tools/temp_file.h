@@ -1,4 +1,5 @@
-// A file under construction: it takes its final name only when it is whole, and is removed otherwise.
+// A file under construction: it takes its final name only when it is whole, and is removed
+// otherwise.
 #pragma once
 
 #include <filesystem>

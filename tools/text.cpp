@@ -8,8 +8,8 @@ namespace {
 
 bool is_continuation(char byte) { return (static_cast<unsigned char>(byte) & 0xC0) == 0x80; }
 
-// Bytes of the printable UTF-8 sequence at the front of a text, 0 when there is none. Overlong forms
-// and surrogates fail by their second byte, as do the control characters U+0080 to U+009F.
+// Bytes of the printable UTF-8 sequence at the front of a text, 0 when there is none. Overlong
+// forms and surrogates fail by their second byte, as do the control characters U+0080 to U+009F.
 std::size_t printable_sequence(std::string_view text) {
   const auto lead = static_cast<unsigned char>(text[0]);
   if (lead < 0x80) return lead >= 0x20 && lead != 0x7F ? 1 : 0;

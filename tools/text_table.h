@@ -1,4 +1,5 @@
-// Text in aligned columns: numbers to the right, everything else to the left, two blanks between them.
+// Text in aligned columns: numbers to the right, everything else to the left, two blanks between
+// them.
 #pragma once
 
 #include <cstddef>
@@ -16,8 +17,8 @@ class TextTable {
   enum class Align { kLeft, kRight };
   void add_column(std::string heading, Align align);
 
-  // Writes the headings (unless all are empty) and `rows` rows; `cell` is asked twice for each cell,
-  // row by row, so that nothing is kept but the widths. Texts are made visible here.
+  // Writes the headings (unless all are empty) and `rows` rows; `cell` is asked twice for each
+  // cell, row by row, so that nothing is kept but the widths. Texts are made visible here.
   using Cell = std::function<std::string(std::size_t row, std::size_t column)>;
   void write(Output& output, std::size_t rows, const Cell& cell);
 

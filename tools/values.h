@@ -1,4 +1,5 @@
-// Values of the five types outside the library: read from and written as text that reads back exactly.
+// Values of the five types outside the library: read from and written as text that reads back
+// exactly.
 #pragma once
 
 #include <cstdint>
@@ -19,8 +20,8 @@ Value load_value(std::int32_t type, const void* bytes);
 
 enum class Parsed { kValue, kNotANumber, kOutOfRange };
 
-// Reads text as a value of the type. Numbers may have blanks around them and a sign; "nan" and "inf"
-// are numbers of the floating types.
+// Reads text as a value of the type. Numbers may have blanks around them and a sign; "nan" and
+// "inf" are numbers of the floating types.
 Parsed parse_value(std::int32_t type, std::string_view text, Value& value);
 
 // The shortest text that reads back as the same value.

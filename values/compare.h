@@ -1,8 +1,9 @@
-// How values are ordered and matched: every index, range check, uniqueness check and search compares
-// through here.
+// How values are ordered and matched: every index, range check, uniqueness check and search
+// compares through here.
 //
-// A search prepares its key once (with_key) and then compares stored values with it, without a look at
-// the type at each step. The stored value is always the left side, so that only a key can be a pattern.
+// A search prepares its key once (with_key) and then compares stored values with it, without a look
+// at the type at each step. The stored value is always the left side, so that only a key can be a
+// pattern.
 #pragma once
 
 #include <cstddef>
@@ -14,8 +15,8 @@
 
 namespace tevpf {
 
-// a against b: negative, 0 or positive. Reals and doubles that lie within the tolerance are equal, and
-// so is anything compared with what is not a number.
+// a against b: negative, 0 or positive. Reals and doubles that lie within the tolerance are equal,
+// and so is anything compared with what is not a number.
 template <class T>
 int compare_numbers(T a, T b, [[maybe_unused]] double tolerance) noexcept {
   if constexpr (kIsFloating<T>) {

@@ -1,5 +1,5 @@
-// Values as text and text as values. Nothing here reads the locale but the white-space class and, in
-// formats that the caller brings, printf itself.
+// Values as text and text as values. Nothing here reads the locale but the white-space class and,
+// in formats that the caller brings, printf itself.
 #include <cctype>
 #include <cfloat>
 #include <charconv>
@@ -24,8 +24,8 @@ TEVPF_STATUS bad_type(std::int32_t type) noexcept { return fail(PF_BADTYPE, "val
 bool is_space(char c) noexcept { return std::isspace(static_cast<unsigned char>(c)) != 0; }
 bool is_digit(char c) noexcept { return c >= '0' && c <= '9'; }
 
-// A whole text as an integer; empty text is 0. A text longer than `longest` is out of range, leading
-// zeros and blanks included.
+// A whole text as an integer; empty text is 0. A text longer than `longest` is out of range,
+// leading zeros and blanks included.
 template <class T>
 TEVPF_STATUS convert_integer(const char* text, std::int32_t type, std::size_t longest,
                              T& result) noexcept {

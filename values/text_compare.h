@@ -6,8 +6,8 @@
 
 namespace tevpf {
 
-// What texts are compared with. Examined once, used for a whole search; it points to the text it was
-// made from.
+// What texts are compared with. Examined once, used for a whole search; it points to the text it
+// was made from.
 struct TextPattern {
   const char* text;
   std::size_t length;  // of the text; of a prefix: without the "*"
@@ -23,8 +23,8 @@ inline TextPattern make_pattern(const char* text) noexcept {
   return {text, std::strlen(text), false};
 }
 
-// Below 0, 0 or above 0 for a text before, equal to or after the pattern. Bytes are unsigned; a text
-// stands before its extensions.
+// Below 0, 0 or above 0 for a text before, equal to or after the pattern. Bytes are unsigned; a
+// text stands before its extensions.
 inline int compare_text(const char* text, const TextPattern& pattern) noexcept {
   return pattern.prefix ? std::strncmp(text, pattern.text, pattern.length)
                         : std::strcmp(text, pattern.text);

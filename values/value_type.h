@@ -1,7 +1,7 @@
 // The five value types: the one place that knows them by their codes.
 //
-// What differs by a number is a table (value_type); what differs by code is one dispatch with a typed
-// tag (with_number); strings are the fifth type and always stand beside the four numbers.
+// What differs by a number is a table (value_type); what differs by code is one dispatch with a
+// typed tag (with_number); strings are the fifth type and always stand beside the four numbers.
 #pragma once
 
 #include <cstdint>
@@ -48,8 +48,8 @@ constexpr std::int64_t value_size(std::int32_t type, std::int32_t width) noexcep
 template <class T>
 inline constexpr bool kIsFloating = std::is_floating_point_v<T>;
 
-// Calls f with a value of the C++ type behind a number's type code: int32_t, float, double or int16_t.
-// The type must be one of the four numbers.
+// Calls f with a value of the C++ type behind a number's type code: int32_t, float, double or
+// int16_t. The type must be one of the four numbers.
 template <class F>
 decltype(auto) with_number(std::int32_t type, F&& f) {
   switch (type) {
