@@ -682,7 +682,10 @@ TEVPF_API TEVPF_STATUS TEV8R1_PF_get_value(const char* table_name, const char* c
 TEVPF_API int32_t TEV8R1_convert_row(const char* table_name, int32_t pos) TEVPF_NOEXCEPT;
 
 /* ---- Reports --------------------------------------------------------------------------------
- * Text files for people to read, created or emptied. Write errors are not reported.
+ * Text files for people to read, created or emptied. Write errors are not reported. In them, "@"
+ * stands for a field without a value, "\0" for the end of a text that is empty or ends in a blank;
+ * a backslash at the end of a line says that the next one goes on; INT, SHT, REAL, DBL and STG are
+ * the value types.
  *   PF_OPENFAIL  the path cannot be written
  *   PF_NOFILE, PF_NOELEM  as above; the text file is then there and empty */
 
