@@ -91,6 +91,8 @@ unsigned char* new_row(std::int32_t number = 999) {
   std::memset(row, 0, sizeof row);
   std::memcpy(row, &number, sizeof number);
   std::memset(row + sizeof number, 'x', 9);
+  TEV8R1_from_char(PF_TYPE_REAL, "0.1", row + 16);
+  TEV8R1_from_char(PF_TYPE_DOUBLE, "98.7654321", row + 24);
   return row;
 }
 

@@ -95,6 +95,11 @@ TEST_F(OperationsTest, ElementsAreThoseOfTheCurrentFile) {
   EXPECT_GT(without_element, 80);
 }
 
+// Every build writes the bytes of the stored file: 64-bit, 32-bit, with and without sanitizers.
+TEST_F(OperationsTest, TheFileIsTheSameFromEveryBuild) {
+  EXPECT_TRUE(read_file(dir_ / "other") == read_file(TEVPF_ELEMENTS_FILE));
+}
+
 // Each request of each operation fails once: it says so, nothing but spare slots has changed, and the same call
 // then succeeds as if nothing had been; or it can do without and nobody notices.
 TEST_F(OperationsTest, EveryRequestForMemoryFailsOnce) {
