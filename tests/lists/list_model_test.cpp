@@ -9,8 +9,6 @@
 #include <map>
 #include <random>
 
-#include "support/error_texts.h"
-#include "support/list_check.h"
 #include "support/param_def.h"
 #include "support/temp_file.h"
 
@@ -51,32 +49,14 @@ class ListModel : public TempFileTest {
  protected:
   void run(unsigned seed, int steps) {
     using M = ListModel;
-    static constexpr void (M::*operations[])() = {&M::add,
-                                                  &M::add,
-                                                  &M::add,
-                                                  &M::add,
-                                                  &M::add,
-                                                  &M::remove,
-                                                  &M::redefine,
-                                                  &M::redefine,
-                                                  &M::rename,
-                                                  &M::move,
-                                                  &M::change_value,
-                                                  &M::change_value,
-                                                  &M::get_value,
-                                                  &M::next_value,
-                                                  &M::next_def,
-                                                  &M::previous_def,
-                                                  &M::def_by_name,
-                                                  &M::def_by_position,
-                                                  &M::sizes,
-                                                  &M::inquire,
-                                                  &M::set_cursor,
-                                                  &M::reset,
-                                                  &M::inquire_default,
-                                                  &M::set_default,
-                                                  &M::replace_by_copy,
-                                                  &M::reopen};
+    // clang-format off
+    static constexpr void (M::*operations[])() = {
+        &M::add, &M::add, &M::add, &M::add, &M::add, &M::remove, &M::redefine, &M::redefine,
+        &M::rename, &M::move, &M::change_value, &M::change_value, &M::get_value, &M::next_value,
+        &M::next_def, &M::previous_def, &M::def_by_name, &M::def_by_position, &M::sizes,
+        &M::inquire, &M::set_cursor, &M::reset, &M::inquire_default, &M::set_default,
+        &M::replace_by_copy, &M::reopen};
+    // clang-format on
     random_.seed(seed);
     lists_.clear();
     for (const char* name : {"alpha", "beta"}) {
@@ -318,8 +298,7 @@ class ListModel : public TempFileTest {
   void get_value() {
     const std::string name = known_name();
     const std::int32_t position = find_in_model(name);
-    std::vector<char> value(
-        static_cast<std::size_t>(position < 0 ? 1 : value_size(model_->at(position))));
+    std::vector<char> value = buffer_for_value(position);
     const TEVPF_STATUS actual = TEV8R1_PF_get_param_value(list_name(), name.c_str(), value.data());
     expect(actual, find(name) < 0 ? PF_NOPARAM : PF_NORMAL);
     if (position < 0) return;
@@ -329,8 +308,7 @@ class ListModel : public TempFileTest {
   void next_value() {
     const std::int32_t position = next();
     char name[TEVPF_NAME_SIZE] = "?";
-    std::vector<char> value(
-        static_cast<std::size_t>(position < 0 ? 1 : value_size(model_->at(position))));
+    std::vector<char> value = buffer_for_value(position);
     expect(TEV8R1_PF_get_next_param(list_name(), name, value.data()),
            position < 0 ? PF_NOMORE : PF_NORMAL);
     ++model_->cursor;

@@ -11,8 +11,6 @@
 #include "lists/name_index.h"
 #include "lists/param_check.h"
 #include "lists/param_record.h"
-#include "support/error_texts.h"
-#include "support/list_check.h"
 #include "support/param_def.h"
 #include "support/temp_file.h"
 

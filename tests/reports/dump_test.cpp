@@ -1,3 +1,5 @@
+#include <functional>
+
 #include "reports/list_dump.h"
 #include "reports/row_text.h"
 #include "reports/table_dump.h"
@@ -24,33 +26,27 @@ TEST_F(Dump, WithoutAHeaderListTheBlockIsShortAndTheTextsStay) {
   EXPECT_STREQ(err_value, "TEVPF_FILE_HEADER");
 }
 
+// The file is opened for writing before anything is looked for; without a current file it is left alone.
 TEST_F(Dump, RefusalsAndWhatTheyLeave) {
   const char names[1][TEVPF_NAME_SIZE] = {"x"};
-  EXPECT_EQ(TEV8R1_PF_dump_list("No", "list.txt"), PF_NOELEM);
-  EXPECT_EQ(read_file("list.txt"), "");
-  EXPECT_EQ(TEV8R1_PF_dump_table("No", "table.txt"), PF_NOELEM);
-  EXPECT_EQ(read_file("table.txt"), "");
-  EXPECT_EQ(TEV8R1_PF_print_table("No", "print.txt", 1, 1, names, 0, 1), PF_NOELEM);
-  EXPECT_EQ(read_file("print.txt"), "");
-  EXPECT_STREQ(err_item, "table");
-  EXPECT_STREQ(err_value, "No");
-  const std::string nowhere = "no/such/directory";
-  for (int op = 0; op < 4; ++op) {
-    std::strcpy(err_value, "old");
-    EXPECT_EQ(op == 0   ? TEV8R1_PF_dump_file(nowhere.c_str())
-              : op == 1 ? TEV8R1_PF_dump_list("No", nowhere.c_str())
-              : op == 2 ? TEV8R1_PF_dump_table("No", nowhere.c_str())
-                        : TEV8R1_PF_print_table("No", nowhere.c_str(), 0, 1, names, 0, 1),
-              PF_OPENFAIL);
-    EXPECT_EQ(err_item, nowhere);
-    EXPECT_STREQ(err_value, "");
+  using Report = std::function<TEVPF_STATUS(const char*)>;
+  const Report reports[] = {
+      TEV8R1_PF_dump_file,
+      [](const char* path) { return TEV8R1_PF_dump_list("No", path); },
+      [](const char* path) { return TEV8R1_PF_dump_table("No", path); },
+      [&](const char* path) { return TEV8R1_PF_print_table("No", path, 1, 1, names, 0, 1); },
+  };
+  for (const Report& report : reports) {
+    set_error_texts();
+    EXPECT_EQ(report("no/such/directory"), PF_OPENFAIL);
+    EXPECT_EQ(error_texts(), (ErrorTexts{"no/such/directory", ""}));
+    write_file("out.txt", "old");
+    EXPECT_EQ(report("out.txt"), &report == reports ? PF_NORMAL : PF_NOELEM);
+    EXPECT_EQ(read_file("out.txt").empty(), &report != reports);
   }
   ASSERT_EQ(TEV8R1_PF_close(0), PF_NORMAL);
-  std::strcpy(err_item, "left");
   EXPECT_EQ(TEV8R1_PF_dump_file("none.txt"), PF_NOFILE);
-  EXPECT_STREQ(err_item, "left");
   EXPECT_FALSE(std::filesystem::exists("none.txt"));
-  EXPECT_EQ(TEV8R1_PF_dump_list("No", "list.txt"), PF_NOFILE);
 }
 
 TEST_F(Dump, ATableOfMixedColumnsInStorageOrder) {

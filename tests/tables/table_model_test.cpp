@@ -2,7 +2,6 @@
 // indexes kept by the documented rules in the simplest way. After every step the status, both texts of
 // a refusal, every row, index, default value and the cursor are compared, and the invariants checked.
 #include <gtest/gtest.h>
-#include <unistd.h>
 
 #include <array>
 #include <cmath>
@@ -10,10 +9,7 @@
 #include <random>
 #include <utility>
 
-#include "core/directory.h"
-#include "core/library.h"
-#include "support/error_texts.h"
-#include "support/table_check.h"
+#include "support/temp_file.h"
 
 namespace {
 
@@ -400,55 +396,47 @@ std::string text(const Row& row) {
   return all;
 }
 
-class Pair {
- public:
-  explicit Pair(unsigned seed) : random_(seed) {
-    path_ =
-        testing::TempDir() + "table_model_" + std::to_string(getpid()) + "_" + std::to_string(seed);
-    std::remove(path_.c_str());
-    EXPECT_EQ(TEV8R1_PF_open(path_.c_str()), PF_NEWFILE);
+class TableModelTest : public TempFileTest, public testing::WithParamInterface<unsigned> {
+ protected:
+  TableModelTest() : random_(GetParam()) {
     EXPECT_EQ(TEV8R1_PF_create_elem("t", "model", PF_ELEM_TABLE), PF_NORMAL);
     TEV8R1_PF_set_memory_allocation(Model::kInitial, Model::kIncrement);
     model_.dup_row = tevpf::library.dup_row;
     table_named("t")->RESERVED[7] = 'r';
-    set_error_texts();
     define_column();
   }
-  ~Pair() {
-    TEV8R1_turn_off_interactive();
-    TEV8R1_PF_set_memory_allocation(0, 0);
-    EXPECT_EQ(TEV8R1_PF_close(0), PF_NORMAL);
-    std::remove(path_.c_str());
-  }
+
+  std::string last_;  // the operation of the last step
 
   void step() {
+    using Self = TableModelTest;
     set_error_texts();
     static constexpr struct {
       int weight;
-      void (Pair::*run)();
+      void (Self::*run)();
     } kOperations[] = {
-        {24, &Pair::add_row},
-        {10, &Pair::insert_row},
-        {4, &Pair::add_with_defaults},
-        {12, &Pair::replace_row},
-        {10, &Pair::delete_row},
-        {5, &Pair::move_row},
-        {8, &Pair::next_row},
-        {6, &Pair::row_by_pos},
-        {1, &Pair::reset},
-        {10, &Pair::row_by_value},
-        {3, &Pair::get_value},
-        {3, &Pair::define_search},
-        {3, &Pair::set_defaults},
-        {1, &Pair::interactive},
-        {2, &Pair::define_column},
-        {5, &Pair::redefine_column},
-        {1, &Pair::delete_column},
-        {2, &Pair::move_column},
-        {1, &Pair::copy},
-        {1, &Pair::reopen},
-        {2, &Pair::column_values},
-        {2, &Pair::check_value},
+        {24, &Self::add_row},
+        {10, &Self::insert_row},
+        {4, &Self::add_with_defaults},
+        {12, &Self::replace_row},
+        {10, &Self::delete_row},
+        {5, &Self::move_row},
+        {8, &Self::next_row},
+        {6, &Self::row_by_pos},
+        {1, &Self::reset},
+        {10, &Self::row_by_value},
+        {3, &Self::get_value},
+        {3, &Self::define_search},
+        {3, &Self::set_defaults},
+        {1, &Self::interactive},
+        {2, &Self::define_column},
+        {5, &Self::redefine_column},
+        {1, &Self::delete_column},
+        {2, &Self::move_column},
+        {1, &Self::copy},
+        {1, &Self::reopen},
+        {2, &Self::column_values},
+        {2, &Self::check_value},
     };
     int total = 0;
     for (const auto& operation : kOperations) total += operation.weight;
@@ -484,8 +472,6 @@ class Pair {
     return "";
   }
 
-  std::string last;  // the operation of the last step
-
  private:
   int below(int n) { return n < 1 ? 0 : int(random_() % unsigned(n)); }
   bool chance(int percent) { return below(100) < percent; }
@@ -506,7 +492,7 @@ class Pair {
   }
 
   void expect(const std::string& operation, const Result& expected, TEVPF_STATUS status) {
-    last = operation;
+    last_ = operation;
     char code[64];
     std::snprintf(code, sizeof code, ": status %08x, not %08x", status, expected.status);
     if (status != expected.status) complaint_ = operation + code;
@@ -790,20 +776,15 @@ class Pair {
   }
 
   std::mt19937 random_;
-  std::string path_;
   Model model_;
   std::string complaint_;
   int names_ = 0;
 };
 
-class TableModelTest : public testing::TestWithParam<unsigned> {};
-
 TEST_P(TableModelTest, RandomSequencesEqualAPlainModel) {
-  const unsigned seed = GetParam();
-  Pair pair(seed);
   for (int i = 0; i < 1500; ++i) {
-    pair.step();
-    ASSERT_EQ(pair.difference(), "") << "seed " << seed << ", step " << i << ": " << pair.last;
+    step();
+    ASSERT_EQ(difference(), "") << "step " << i << ": " << last_;
   }
 }
 
