@@ -33,7 +33,7 @@ TEVPF_STATUS put_param(Sink& sink, const TEVPF_PARAM& param) noexcept {
   } else {
     status = fail(PF_BADTYPE, "parameter", Text(def.type));
   }
-  constexpr std::int32_t kHead = stored_size(kParamFields);
+  constexpr std::size_t kHead = stored_size(kParamFields);
   static_assert(sizeof def.part <= Sink::kSlack);
   unsigned char* const place =
       sink.record(std::size_t{kHead} + static_cast<std::size_t>(part_bytes));

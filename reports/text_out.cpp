@@ -4,6 +4,7 @@
 
 namespace tevpf {
 
+// cppcheck-suppress uninitMemberVar; a buffer
 TextOut::TextOut(std::FILE* stream, Size size) noexcept
     : stream_(stream), buffer_(line_), room_(kLineBuffer) {
   if (size != Size::kReport) return;

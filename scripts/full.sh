@@ -1,0 +1,32 @@
+#!/usr/bin/env bash
+# full.sh [SECONDS]: everything that is examined before a release: the static checks, all builds with all
+# tests, a save disturbed at each of its system calls, and each fuzz target for SECONDS (1800 unless
+# said otherwise). About 20 minutes and twice SECONDS on two cores. What fuzzing finds is kept in
+# build/fuzz/found; copied to tests/fuzz/corpus it is tested for ever.
+set -euo pipefail
+cd "$(dirname "${BASH_SOURCE[0]}")/.."
+
+case ${1:-} in
+  -h | --help) sed -n '2,/^set /{/^set /d;s/^# \{0,1\}//;p}' "${BASH_SOURCE[0]}"; exit ;;
+esac
+seconds=${1:-1800}
+[[ $seconds =~ ^[0-9]+$ ]] || { echo "full.sh: '$seconds' is no number of seconds" >&2; exit 2; }
+
+scripts/check.sh
+scripts/test.sh
+
+scripts/install-packages.sh build test full fuzz
+echo "== kill sweep"
+cmake --build --preset dev --target save_once
+tests/robustness/kill_sweep.py build/dev/tests/robustness/save_once
+
+cmake --preset fuzz
+cmake --build --preset fuzz
+mkdir -p build/fuzz/found
+for target in file text; do
+  echo "== fuzzing: $target, $seconds seconds"
+  mkdir -p "build/fuzz/$target"
+  build/fuzz/tests/fuzz/"${target}_fuzz" -max_total_time="$seconds" -timeout=10 -rss_limit_mb=1024 \
+    -print_final_stats=1 -artifact_prefix=build/fuzz/found/ \
+    "build/fuzz/$target" "tests/fuzz/corpus/$target"
+done
