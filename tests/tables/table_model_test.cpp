@@ -420,6 +420,7 @@ class TableModelTest : public TempFileTest, public testing::WithParamInterface<u
         {4, &Self::add_with_defaults},
         {12, &Self::replace_row},
         {10, &Self::delete_row},
+        {1, &Self::delete_all_rows},
         {5, &Self::move_row},
         {8, &Self::next_row},
         {6, &Self::row_by_pos},
@@ -581,6 +582,16 @@ class TableModelTest : public TempFileTest, public testing::WithParamInterface<u
     }
     expect("delete row", expected, TEV8R1_PF_delete_row("t"));
   }
+  // What was reserved for rows stays, while columns without rows may become any others.
+  void delete_all_rows() {
+    if (chance(70)) return;
+    while (model_.count() > 0 && complaint_.empty()) {
+      model_.at_position(0, PF_BADPOS);
+      TEV8R1_PF_get_row_by_pos("t", 0, row_buffer().data());
+      delete_row();
+    }
+    for (int i = 0; i < 3 && complaint_.empty(); ++i) redefine_column();
+  }
   void move_row() {
     if (model_.search >= 0 && chance(60)) {
       model_.search = -1;
@@ -707,7 +718,8 @@ class TableModelTest : public TempFileTest, public testing::WithParamInterface<u
     const int place = any_column();
     const std::string name = model_.col(place).def.name;
     const TEVPF_COL_DEF& old = model_.col(place).def;
-    Column c = random_column(chance(10) ? PF_TYPE_INT + below(5) : old.type);
+    Column c =
+        random_column(chance(model_.rows.empty() ? 50 : 10) ? PF_TYPE_INT + below(5) : old.type);
     if (chance(70)) std::strcpy(c.def.name, old.name);
     if (c.is_text() && !model_.rows.empty()) c.def.width = old.width;
     if (chance(60)) c.def.idx_flag = old.idx_flag;
