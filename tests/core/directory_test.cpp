@@ -7,6 +7,7 @@
 #include <random>
 #include <vector>
 
+#include "core/heap.h"
 #include "support/temp_file.h"
 
 namespace {
@@ -237,6 +238,23 @@ TEST_F(DirectoryTest, AnAnswerIsNeverStale) {
   ASSERT_EQ(TEV8R1_modify_elem_name(PF_ELEM_LIST, "A", "C"), PF_NORMAL);
   EXPECT_EQ(kKinds[0].find("A"), -1);
   EXPECT_EQ(kKinds[0].find("C"), 0);
+}
+
+TEST_F(DirectoryTest, WhatWasHandedOutBeforeMemoryRanOutIsTheCallers) {
+  for (const Kind& kind : kKinds) ASSERT_EQ(kind.create("A"), PF_NORMAL);
+  for (int n = 0; n <= 4; ++n) {
+    char name[TEVPF_FILE_NAME_SIZE];
+    std::int32_t lists, tables;
+    char(*names[2])[TEVPF_NAME_SIZE] = {};
+    char(*descs[2])[TEVPF_DESC_SIZE] = {};
+    tevpf::heap_fail_at(n);
+    const TEVPF_STATUS status = TEV8R1_PF_inq_file_elements(name, &lists, &names[0], &descs[0],
+                                                            &tables, &names[1], &descs[1]);
+    EXPECT_EQ(status, tevpf::heap_fail_off() ? PF_NOMEM : PF_NORMAL);
+    void* const blocks[] = {names[0], descs[0], names[1], descs[1]};
+    EXPECT_EQ(std::count(blocks, blocks + 4, nullptr), 4 - n);
+    for (void* block : blocks) std::free(block);
+  }
 }
 
 }  // namespace
