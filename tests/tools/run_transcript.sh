@@ -2,7 +2,8 @@
 # run_transcript.sh TRANSCRIPT PROGRAM...: runs the lines of a transcript that start with "$ " in an
 # empty folder, and compares what they print, errors included, and their exit status with what stands
 # behind them. Lines that start with "# " are comments. The programs are called by their file names.
-# Of a Markdown text the console blocks are run; they find the folder of examples beside the text.
+# Of a Markdown text the console blocks are run; they find the examples beside the
+# text, and the programs behind the first one as if they had been built in the folder.
 set -uo pipefail
 export LC_ALL=C.UTF-8
 transcript=$(realpath "$1")
@@ -12,7 +13,7 @@ trap 'rm -rf "$folder" "$folder".{expected,actual}' EXIT
 cd "$folder" || exit 1
 
 if [[ $transcript == *.md ]]; then
-  ln -s "$(dirname "$transcript")/examples" .
+  ln -s "$(dirname "$transcript")/examples" "${@:3}" .
   awk '/^```/ { inside = $0 == "```console"; next } inside' "$transcript"
 else
   cat "$transcript"
