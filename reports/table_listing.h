@@ -1,9 +1,9 @@
 // The listing of chosen columns and rows of a table.
 #pragma once
 
+#include <cstdint>
 #include <cstdio>
 
-#include "reports/text_out.h"
 #include "tables/table.h"
 
 extern "C" {

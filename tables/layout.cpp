@@ -34,15 +34,6 @@ void set_layout(TEVPF_TABLE& table, const Layout& layout) noexcept {
   table.extra_bytes = layout.extra_bytes;
 }
 
-bool has_proper_layout(const TEVPF_TABLE& table) noexcept {
-  Layout layout;
-  for (std::int32_t i = 0; i < table.num_cols; ++i) {
-    const TEVPF_COLUMN& column = table.col_array[i];
-    if (place_column(layout, column.def) != column.offset) return false;
-  }
-  return layout.row_wid == table.row_wid;
-}
-
 bool lay_out_columns(TEVPF_TABLE& table) noexcept {
   Layout layout;
   bool changed = false;

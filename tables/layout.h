@@ -46,10 +46,6 @@ inline std::int32_t column_size(const TEVPF_COLUMN& column) noexcept {
 Layout layout_of(const TEVPF_TABLE& table) noexcept;
 void set_layout(TEVPF_TABLE& table, const Layout& layout) noexcept;
 
-// True when the offsets and the row width of the table are what laying its columns out gives. The
-// columns' types are valid and their widths not negative.
-bool has_proper_layout(const TEVPF_TABLE& table) noexcept;
-
 // Lays the columns out afresh: offsets, row width, mod and padding. True when any offset or the row
 // width has changed. The row is known to fit.
 bool lay_out_columns(TEVPF_TABLE& table) noexcept;
