@@ -4,6 +4,7 @@
 #include <sys/stat.h>
 
 #include <array>
+#include <cerrno>
 #include <csignal>
 #include <cstdio>
 #include <cstring>
@@ -84,7 +85,12 @@ bool stdout_is(const std::filesystem::path& file) {
 
 bool create_exclusively(const std::filesystem::path& file, bool is_private) {
   const int made = open_file(file.string().c_str(), kCreate, is_private ? kPrivate : kShared);
-  return made >= 0 && sync_and_close(made);
+  if (made < 0) return false;
+  if (sync_and_close(made)) return true;
+  const int reason = errno;  // for the message
+  (void)remove_name(file.string().c_str());
+  errno = reason;
+  return false;
 }
 
 bool flush_to_disk(const std::filesystem::path& file) {
