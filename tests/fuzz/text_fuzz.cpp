@@ -8,14 +8,9 @@
 #include <vector>
 
 #include "include/tevpf.h"
+#include "support/drive.h"
 
 namespace {
-
-void require(bool truth, const char* what) {
-  if (truth) return;
-  std::fprintf(stderr, "broken: %s\n", what);
-  std::abort();
-}
 
 void escape_and_back(const std::string& text) {
   std::int32_t size = static_cast<std::int32_t>(text.size()) + 1, length = 0;

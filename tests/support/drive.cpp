@@ -6,11 +6,13 @@
 #include <cstring>
 #include <fstream>
 #include <functional>
-#include <memory>
-#include <stdexcept>
+#include <span>
 #include <vector>
 
-#include "include/tevpf.h"
+#include "core/file.h"
+#include "core/library.h"
+#include "support/list_check.h"
+#include "support/table_check.h"
 
 std::uint8_t Choices::next() {
   if (bytes.empty()) return 0;
@@ -19,41 +21,20 @@ std::uint8_t Choices::next() {
   return choice;
 }
 
-void require(bool truth, const char* what) {
-  if (!truth) throw std::logic_error(what);
-}
-
 namespace {
 
 constexpr int kMostElements = 6, kMostEntries = 12;
 
-struct FreeBlock {
-  void operator()(void* block) const { std::free(block); }
-};
-template <class T>
-using Block = std::unique_ptr<T, FreeBlock>;
-using Name = char[TEVPF_NAME_SIZE];
-using Desc = char[TEVPF_DESC_SIZE];
-
-struct Names {
-  std::vector<std::string> lists, tables;
-};
-
-Names element_names() {
-  char file[TEVPF_FILE_NAME_SIZE];
-  std::int32_t num_lists = 0, num_tables = 0;
-  Name *lists = nullptr, *tables = nullptr;
-  Desc *list_descs = nullptr, *table_descs = nullptr;
-  TEV8R1_PF_inq_file_elements(file, &num_lists, &lists, &list_descs, &num_tables, &tables,
-                              &table_descs);
-  const Block<Name> a(lists), b(tables);
-  const Block<Desc> d(list_descs), e(table_descs);
-  Names names;
-  for (int i = 0; lists != nullptr && i < std::min(num_lists, kMostElements); ++i)
-    names.lists.emplace_back(lists[i]);
-  for (int i = 0; tables != nullptr && i < std::min(num_tables, kMostElements); ++i)
-    names.tables.emplace_back(tables[i]);
-  return names;
+// Not all of them, where a file holds many.
+template <class Element>
+std::span<Element* const> some(Element* const* elements, std::int32_t count) {
+  return {elements, static_cast<std::size_t>(std::min(count, kMostElements))};
+}
+std::span<TEVPF_LIST* const> lists() {
+  return some(tevpf::library.current_file->list_ptr, tevpf::library.current_file->num_lists);
+}
+std::span<TEVPF_TABLE* const> tables() {
+  return some(tevpf::library.current_file->table_ptr, tevpf::library.current_file->num_tables);
 }
 
 void read_list(const char* list) {
@@ -80,27 +61,21 @@ void read_list(const char* list) {
   }
 }
 
-struct Table {
-  std::int32_t columns = 0, rows = 0, row_wid = 0, dsp_wid = 0, current = 0;
-  explicit Table(const char* name) {
-    TEV8R1_PF_inq_table_info(name, &columns, &rows, &row_wid, &dsp_wid, &current);
-  }
-  std::vector<unsigned char> row() const {
-    return std::vector<unsigned char>(static_cast<std::size_t>(row_wid) + 1);
-  }
-};
+std::vector<unsigned char> row_buffer(const TEVPF_TABLE& table) {
+  return std::vector<unsigned char>(static_cast<std::size_t>(table.row_wid) + 1);
+}
 
-void read_table(const char* table) {
-  const Table info(table);
-  std::vector<unsigned char> row = info.row();
-  for (int c = -1; c < std::min(info.columns, kMostEntries); ++c) {
+void read_table(const TEVPF_TABLE& info) {
+  const char* const table = info.header.elem_name;
+  std::vector<unsigned char> row = row_buffer(info);
+  for (int c = -1; c < std::min(info.num_cols, kMostEntries); ++c) {
     TEVPF_COL_DEF def{};
     if (c >= 0)
       require(TEV8R1_PF_inq_col_def_by_pos(table, c, &def) == PF_NORMAL, "a column by position");
-    const Block<char> description(def.description);
     TEV8R1_PF_define_table_search(table, c < 0 ? nullptr : def.name);
+    std::free(def.description);
     TEV8R1_PF_reset_table(table);
-    for (int r = 0; r < std::min(info.rows, kMostEntries); ++r) {
+    for (int r = 0; r < std::min(info.num_rows, kMostEntries); ++r) {
       require(TEV8R1_PF_get_next_row(table, row.data()) == PF_NORMAL, "a row that is counted");
       TEV8R1_convert_row(table, r);
     }
@@ -135,23 +110,11 @@ TEVPF_COL_DEF some_column(Choices& choose) {
   return def;
 }
 
-std::string any_param(const char* list, Choices& choose) {
-  std::int32_t count = 0, type, value_size, desc_size;
-  TEV8R1_PF_inq_num_params(list, &count);
-  char name[TEVPF_NAME_SIZE] = "p*";
-  const std::int32_t pos = count > 0 ? choose.next() % count : 0;
-  if (choose.next() % 4 != 0 &&
-      TEV8R1_PF_inq_param_size_by_pos(list, pos, &type, &value_size, &desc_size) == PF_NORMAL) {
-    std::vector<char> value(static_cast<std::size_t>(value_size));
-    TEV8R1_PF_reset_param(list);
-    if (pos > 0) TEV8R1_set_cur_param(list, pos - 1);
-    TEV8R1_PF_get_next_param(list, name, value.data());
-  }
-  return name;
-}
-
-void change_list(const char* list, Choices& choose) {
-  const std::string name = any_param(list, choose);
+void change_list(const TEVPF_LIST& info, Choices& choose) {
+  const char* const list = info.header.elem_name;
+  const std::int32_t pos = info.num_params > 0 ? choose.next() % info.num_params : 0;
+  const bool pick = choose.next() % 4 != 0 && info.num_params > 0;
+  const std::string name = pick ? info.param_ptr[pos].def.name : "p*";
   const TEVPF_PARAM_DEF def = some_param(choose);
   const std::int32_t where = choose.next() % 2 != 0 ? PF_END_POS : choose.next() - 5;
   const double value[4] = {choose.next() * 0.5, 0, 0, 0};
@@ -168,19 +131,15 @@ void change_list(const char* list, Choices& choose) {
   changes[choose.next() % std::size(changes)]();
 }
 
-std::string any_column(const char* table, Choices& choose) {
-  std::int32_t count = 0;
-  Name* names = nullptr;
-  TEV8R1_PF_inq_col_names(table, &count, &names);
-  const Block<Name> owner(names);
-  return count == 0 || names == nullptr ? "c1" : names[choose.next() % count];
+std::string any_column(const TEVPF_TABLE& table, Choices& choose) {
+  return table.num_cols == 0 ? "c1" : table.col_array[choose.next() % table.num_cols].def.name;
 }
 
-void change_table(const char* table, Choices& choose) {
-  const Table info(table);
-  std::vector<unsigned char> row = info.row();
+void change_table(const TEVPF_TABLE& info, Choices& choose) {
+  const char* const table = info.header.elem_name;
+  std::vector<unsigned char> row = row_buffer(info);
   TEV8R1_PF_inq_dft_row(table, row.data());
-  const std::string name = any_column(table, choose), other = any_column(table, choose);
+  const std::string name = any_column(info, choose), other = any_column(info, choose);
   const char* const column = name.c_str();
   TEVPF_COL_DEF def = some_column(choose);
   for (int i = choose.next() % 8; i > 0; --i) row[choose.next() % row.size()] = choose.next();
@@ -214,20 +173,27 @@ void change_table(const char* table, Choices& choose) {
       },
   };
   // Rows of a table without columns are not stored.
-  changes[info.columns == 0 ? 0 : choose.next() % std::size(changes)]();
+  changes[info.num_cols == 0 ? 0 : choose.next() % std::size(changes)]();
+}
+
+// An index is in the order that the file says; all other invariants are kept whatever it says.
+void require_kept(const char* broken_rule) {
+  if (broken_rule != nullptr) require(std::strstr(broken_rule, "order") != nullptr, broken_rule);
 }
 
 void read_everything(const std::string& text) {
-  const Names names = element_names();
   TEV8R1_PF_dump_file(text.c_str());
-  for (const std::string& list : names.lists) {
-    read_list(list.c_str());
-    TEV8R1_PF_dump_list(list.c_str(), text.c_str());
+  for (const TEVPF_LIST* list : lists()) {
+    require_kept(broken_rule(*list));
+    read_list(list->header.elem_name);
+    TEV8R1_PF_dump_list(list->header.elem_name, text.c_str());
   }
-  for (const std::string& table : names.tables) {
-    read_table(table.c_str());
-    TEV8R1_PF_dump_table(table.c_str(), text.c_str());
-    TEV8R1_PF_print_table(table.c_str(), text.c_str(), 1, PF_END_POS, nullptr, -1, PF_END_POS);
+  for (const TEVPF_TABLE* table : tables()) {
+    const char* const name = table->header.elem_name;
+    require_kept(tevpf_test::broken_rule(*table));
+    read_table(*table);
+    TEV8R1_PF_dump_table(name, text.c_str());
+    TEV8R1_PF_print_table(name, text.c_str(), 1, PF_END_POS, nullptr, -1, PF_END_POS);
   }
   std::remove(text.c_str());
 }
@@ -263,12 +229,11 @@ void drive_current_file(const std::string& folder, Choices choose) {
   read_everything(folder + "/text");
   save_and_compare(folder);
   while (!choose.bytes.empty()) {
-    const Names names = element_names();
     const std::uint8_t which = choose.next();
-    if (which % 2 != 0 && !names.lists.empty())
-      change_list(names.lists[which / 2 % names.lists.size()].c_str(), choose);
-    if (which % 2 == 0 && !names.tables.empty())
-      change_table(names.tables[which / 2 % names.tables.size()].c_str(), choose);
+    if (which % 2 != 0 && !lists().empty())
+      change_list(*lists()[which / 2 % lists().size()], choose);
+    if (which % 2 == 0 && !tables().empty())
+      change_table(*tables()[which / 2 % tables().size()], choose);
     if (which == 255) TEV8R1_PF_create_elem("made", "", 1 + choose.next() % 2);
   }
   read_everything(folder + "/text");

@@ -3,6 +3,7 @@
 #pragma once
 
 #include <cstdint>
+#include <stdexcept>
 #include <string>
 #include <string_view>
 
@@ -12,7 +13,9 @@ struct Choices {
   std::string_view bytes;
 };
 
-void require(bool truth, const char* what);
+inline void require(bool truth, const char* what) {
+  if (!truth) throw std::logic_error(what);
+}
 
 // Reports, saves, opens and compares what the current file holds, before and after the changes.
 void drive_current_file(const std::string& folder, Choices choose);
