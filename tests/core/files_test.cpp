@@ -13,27 +13,14 @@
 #include <filesystem>
 #include <functional>
 
-#include "core/file.h"
-#include "core/library.h"
-#include "include/tevpf.h"
-#include "support/error_texts.h"
-#include "support/temp_dir.h"
+#include "support/temp_file.h"
 
 namespace {
 
 namespace fs = std::filesystem;
 
-class FilesTest : public testing::Test {
+class FilesTest : public LibraryTest {
  protected:
-  FilesTest() {
-    TEV8R1_PF_init();
-    set_error_texts();
-  }
-  ~FilesTest() override {
-    while (TEV8R1_PF_close(0) == PF_NORMAL) {
-    }
-  }
-
   std::string at(const std::string& name) const { return dir_ / name; }
   static TEVPF_STATUS open(const std::string& name) { return TEV8R1_PF_open(name.c_str()); }
 
@@ -51,8 +38,6 @@ class FilesTest : public testing::Test {
     ASSERT_EQ(TEV8R1_PF_create_elem(list, "", PF_ELEM_LIST), PF_NORMAL);
     ASSERT_EQ(TEV8R1_PF_close(1), PF_NORMAL);
   }
-
-  TempDir dir_;
 };
 
 // Calls in a child process, as an ordinary user when the tests run as root.
@@ -70,24 +55,21 @@ int in_child(const std::function<void()>& body, bool as_user) {
 }
 
 TEST_F(FilesTest, ClosingMakesTheNeighbourCurrent) {
-  struct Case {
-    const char* opened;
-    char current;
-    const char* then;  // current after each close; "" at the end
-  };
-  for (const Case& c : {Case{"ABC", 'B', "AC"}, Case{"ABC", 'A', "BC"}, Case{"ABC", 'C', "BA"},
-                        Case{"A", 'A', ""}, Case{"AB", 'A', "B"}}) {
-    SCOPED_TRACE(std::string(c.opened) + c.current);
-    for (const char* name = c.opened; *name != 0; ++name) {
-      EXPECT_EQ(open(at({*name})), PF_NEWFILE);
-      EXPECT_EQ(current(), std::string{*name});
+  // The files opened, the one made current, and those current after each close.
+  const std::string cases[][3] = {
+      {"ABC", "B", "AC"}, {"ABC", "A", "BC"}, {"ABC", "C", "BA"}, {"A", "A", ""}, {"AB", "A", "B"}};
+  for (const auto& [opened, chosen, then] : cases) {
+    SCOPED_TRACE(opened + chosen);
+    for (const char name : opened) {
+      EXPECT_EQ(open(at({name})), PF_NEWFILE);
+      EXPECT_EQ(current(), std::string{name});
     }
     set_error_texts();
-    EXPECT_EQ(TEV8R1_PF_change_file(at({c.current}).c_str()), PF_NORMAL);
+    EXPECT_EQ(TEV8R1_PF_change_file(at(chosen).c_str()), PF_NORMAL);
     EXPECT_EQ(error_texts(), kEmpty);
-    for (const char* then = c.then; *then != 0; ++then) {
+    for (const char name : then) {
       EXPECT_EQ(TEV8R1_PF_close(0), PF_NORMAL);
-      EXPECT_EQ(current(), std::string{*then});
+      EXPECT_EQ(current(), std::string{name});
     }
     EXPECT_EQ(TEV8R1_PF_close(0), PF_NORMAL);
     EXPECT_EQ(tevpf::library.num_files, 0);
@@ -120,11 +102,10 @@ TEST_F(FilesTest, AnOpenFileIsNotOpenedAgain) {
   EXPECT_EQ(error_texts(), (ErrorTexts{dir_.path(), ""}));
 }
 
-TEST_F(FilesTest, VariablesStandForFolders) {
-  EXPECT_EQ(open("$PFDIR/a"), PF_OPENFAIL);
-  EXPECT_EQ(error_texts(), (ErrorTexts{"$PFDIR/a", kUntouched.value}));
+TEST_F(FilesTest, NamesAreLookedUpAndHaveUpTo257Characters) {
   setenv("PFDIR", "/nowhere", 1);  // the "$" is part of the name
   EXPECT_EQ(open("$PFDIR/a"), PF_OPENFAIL);
+  EXPECT_EQ(error_texts(), (ErrorTexts{"$PFDIR/a", kUntouched.value}));
   setenv("$PFDIR", dir_.path().c_str(), 1);
   EXPECT_EQ(open("$PFDIR/a"), PF_NEWFILE);
   EXPECT_EQ(TEV8R1_PF_change_file(at("a").c_str()), PF_NORMAL);
@@ -138,16 +119,12 @@ TEST_F(FilesTest, VariablesStandForFolders) {
   EXPECT_EQ(error_texts(), (ErrorTexts{std::string(256, 'v'), ""}));
   unsetenv("$PFDIR");
   unsetenv("PFDIR");
-}
 
-TEST_F(FilesTest, NamesHaveUpTo257Characters) {
   const std::string folder = at(std::string(100, 'd'));
   fs::create_directory(folder);
   const std::string longest = folder + "/" + std::string(256 - folder.size(), 'f');
   EXPECT_EQ(open(longest), PF_NEWFILE);
-  char name[TEVPF_FILE_NAME_SIZE];
-  EXPECT_EQ(TEV8R1_PF_inq_current_file(name), PF_NORMAL);
-  EXPECT_EQ(name, longest);
+  EXPECT_EQ(current(), fs::path(longest).filename());
   EXPECT_EQ(open(longest + "f"), PF_OPENFAIL);
   EXPECT_EQ(error_texts(), (ErrorTexts{longest.substr(0, 256), ""}));
   EXPECT_EQ(TEV8R1_PF_save(nullptr), PF_NORMAL);
@@ -173,31 +150,14 @@ TEST_F(FilesTest, InitialisingTwiceKeepsTheFiles) {
 }
 
 TEST_F(FilesTest, AllocationSettings) {
-  const auto settings = [] {
-    return std::pair(tevpf::library.alloc_initial, tevpf::library.alloc_increment);
-  };
-  EXPECT_EQ(TEV8R1_PF_set_memory_allocation(-1, 5), PF_BADARG);
-  EXPECT_EQ(settings(), std::pair(25, 5));
-  EXPECT_EQ(TEV8R1_PF_set_memory_allocation(3, INT32_MIN), PF_BADARG);
-  EXPECT_EQ(settings(), std::pair(3, 5));
-  EXPECT_EQ(error_texts(), kUntouched);
-  EXPECT_EQ(TEV8R1_PF_set_memory_allocation(0, 0), PF_NORMAL);
-  EXPECT_EQ(settings(), std::pair(25, 10));
-}
-
-TEST_F(FilesTest, ACopyLeavesTheFileAsItIs) {
-  EXPECT_EQ(open(at("a")), PF_NEWFILE);
-  ASSERT_EQ(TEV8R1_PF_create_elem("L", "", PF_ELEM_LIST), PF_NORMAL);
-  EXPECT_EQ(TEV8R1_PF_save(at("copy").c_str()), PF_NORMAL);
-  EXPECT_EQ(read_file(at("copy")).size(), 120u);
-  EXPECT_EQ(read_file(at("a")), "");
-  for (const std::string& path : {at("no/folder"), dir_.path(), std::string("/dev/full")}) {
-    EXPECT_EQ(TEV8R1_PF_save(path.c_str()), PF_OPENFAIL);
-    EXPECT_EQ(error_texts(), (ErrorTexts{path, ""}));
+  const std::int32_t cases[][4] = {{-1, 5, 25, 5}, {3, INT32_MIN, 3, 5}, {0, 0, 25, 10}};
+  for (const auto& [initial, increment, initial_then, increment_then] : cases) {
+    EXPECT_EQ(TEV8R1_PF_set_memory_allocation(initial, increment),
+              initial < 0 || increment < 0 ? PF_BADARG : PF_NORMAL);
+    EXPECT_EQ(tevpf::library.alloc_initial, initial_then);
+    EXPECT_EQ(tevpf::library.alloc_increment, increment_then);
+    EXPECT_EQ(error_texts(), kUntouched);
   }
-  EXPECT_EQ(TEV8R1_PF_close(0), PF_NORMAL);
-  EXPECT_EQ(dir_.entries(), std::set<std::string>{"copy"});
-  EXPECT_EQ(open(at("copy")), PF_NORMAL);
 }
 
 TEST_F(FilesTest, AReadOnlyFileStaysOpenRatherThanBeSaved) {
@@ -338,37 +298,38 @@ TEST_F(FilesTest, AFullDiskKeepsTheOldFile) {
   }
 }
 
-// The name stands for another file by now; what is in memory is what the name shall hold.
-TEST_F(FilesTest, AFileReplacedUnderneathIsReplacedAgain) {
+// The name stands for another file, for none, for a folder: what is in memory is what it shall hold.
+TEST_F(FilesTest, AFileChangedUnderneathIsWrittenAgain) {
   make(at("a"), "L");
   const std::string own = read_file(at("a"));
+  ASSERT_EQ(own.size(), 120u);
   ASSERT_EQ(open(at("a")), PF_NORMAL);
   write_file(at("other"), "other");
   fs::rename(at("other"), at("a"));
   EXPECT_EQ(TEV8R1_PF_save(nullptr), PF_NORMAL);
   EXPECT_EQ(read_file(at("a")), own);
   fs::remove(at("a"));
+  EXPECT_EQ(TEV8R1_PF_save(nullptr), PF_NORMAL);
+  EXPECT_EQ(read_file(at("a")), own);
+  fs::remove(at("a"));
   fs::create_directory(at("a"));
-  EXPECT_EQ(TEV8R1_PF_save(nullptr), PF_OPENFAIL);
-  EXPECT_EQ(error_texts(), (ErrorTexts{at("a"), ""}));
+  for (const std::string& path : {at("a"), at("no/folder"), std::string("/dev/full")}) {
+    EXPECT_EQ(TEV8R1_PF_save(path == at("a") ? nullptr : path.c_str()), PF_OPENFAIL);
+    EXPECT_EQ(error_texts(), (ErrorTexts{path, ""}));
+  }
   EXPECT_EQ(TEV8R1_PF_save(at("copy").c_str()), PF_NORMAL);
   EXPECT_EQ(read_file(at("copy")), own);
-  EXPECT_EQ(dir_.entries(), (std::set<std::string>{"a", "copy"}));
-}
-
-TEST_F(FilesTest, AFileRemovedUnderneathIsWrittenAgain) {
-  make(at("a"), "L");
-  ASSERT_EQ(open(at("a")), PF_NORMAL);
-  fs::remove(at("a"));
-  EXPECT_EQ(TEV8R1_PF_save(nullptr), PF_NORMAL);
-  EXPECT_EQ(read_file(at("a")).size(), 120u);
+  // A new file whose folder is gone: tried once, and not deleted at its end.
   const std::string away = at("folder");
   fs::create_directory(away);
   ASSERT_EQ(open(away + "/b"), PF_NEWFILE);
+  EXPECT_EQ(TEV8R1_PF_save(at("empty").c_str()), PF_NORMAL);
+  EXPECT_EQ(tevpf::library.current_file->new_file, 1);  // a copy leaves the file as it is
   fs::remove_all(away);
   EXPECT_EQ(TEV8R1_PF_save(nullptr), PF_OPENFAIL);
   EXPECT_EQ(tevpf::library.current_file->new_file, 0);
   EXPECT_EQ(TEV8R1_PF_close(0), PF_NORMAL);
+  EXPECT_EQ(dir_.entries(), (std::set<std::string>{"a", "copy", "empty"}));
 }
 
 }  // namespace

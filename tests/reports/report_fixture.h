@@ -11,7 +11,7 @@
 #include "core/error_context.h"
 #include "support/param_def.h"
 #include "support/table_fixture.h"
-#include "support/temp_dir.h"
+#include "support/temp_file.h"
 
 namespace tevpf {
 

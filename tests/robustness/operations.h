@@ -7,7 +7,7 @@
 #include <string_view>
 #include <vector>
 
-#include "support/temp_dir.h"
+#include "support/temp_file.h"
 
 using Numbers = const std::int32_t*;
 

@@ -1,27 +1,79 @@
-// A parameter file of its own for each test: open and new at the start, closed and gone at the end.
+// Files and folders of a test, and bytes as tests write them down.
 #pragma once
 
 #include <gtest/gtest.h>
+#include <stdlib.h>
 
+#include <filesystem>
+#include <fstream>
+#include <iterator>
+#include <set>
 #include <string>
 
 #include "core/directory.h"
 #include "support/error_texts.h"
 #include "support/state.h"
-#include "support/temp_dir.h"
 
-class TempFileTest : public testing::Test {
+// A folder that goes away with the test.
+class TempDir {
+ public:
+  TempDir() : path_(testing::TempDir() + "tevpf_XXXXXX") {
+    if (mkdtemp(path_.data()) == nullptr) ADD_FAILURE() << "no folder " << path_;
+  }
+  ~TempDir() {
+    std::error_code ignored;
+    std::filesystem::remove_all(path_, ignored);
+  }
+  TempDir(const TempDir&) = delete;
+  TempDir& operator=(const TempDir&) = delete;
+
+  const std::string& path() const { return path_; }
+  std::string operator/(const std::string& name) const { return path_ + "/" + name; }
+  std::set<std::string> entries() const {
+    std::set<std::string> names;
+    for (const auto& entry : std::filesystem::directory_iterator(path_)) {
+      names.insert(entry.path().filename().string());
+    }
+    return names;
+  }
+
+ private:
+  std::string path_;
+};
+
+inline std::string read_file(const std::string& path) {
+  std::ifstream in(path, std::ios::binary);
+  return {std::istreambuf_iterator<char>(in), {}};
+}
+
+inline void write_file(const std::string& path, const std::string& bytes) {
+  if (std::filesystem::is_regular_file(path)) std::filesystem::remove(path);
+  std::ofstream(path, std::ios::binary) << bytes;
+}
+
+// The library with no file open, at the start and at the end.
+class LibraryTest : public testing::Test {
  protected:
-  TempFileTest() {
+  LibraryTest() {
     TEV8R1_PF_init();
-    EXPECT_EQ(TEV8R1_PF_open(path_.c_str()), PF_NEWFILE);
     set_error_texts();
   }
-  ~TempFileTest() override {
+  ~LibraryTest() override {
     while (TEV8R1_PF_close(0) == PF_NORMAL) {
     }
     TEV8R1_PF_set_memory_allocation(0, 0);
     TEV8R1_turn_off_interactive();
+  }
+
+  TempDir dir_;
+};
+
+// A parameter file of its own for each test: open and new at the start.
+class TempFileTest : public LibraryTest {
+ protected:
+  TempFileTest() {
+    EXPECT_EQ(TEV8R1_PF_open(path_.c_str()), PF_NEWFILE);
+    set_error_texts();
   }
 
   void save_and_reopen() {
@@ -35,6 +87,5 @@ class TempFileTest : public testing::Test {
     return *found;
   }
 
-  TempDir dir_;
   const std::string path_ = dir_ / "file";
 };
