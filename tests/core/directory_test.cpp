@@ -38,12 +38,11 @@ struct Kind {
     std::int32_t pos = -1;
     TEVPF_LIST* list = nullptr;
     TEVPF_TABLE* table = nullptr;
-    if (type == PF_ELEM_LIST) {
-      const bool found = TEV8R1_get_list_ptr(name.c_str(), &list) == PF_NORMAL;
-      EXPECT_EQ(found, found && TEV8R1_get_list_array_pos(list, &pos) == PF_NORMAL);
-    } else {
-      const bool found = TEV8R1_get_table_ptr(name.c_str(), &table) == PF_NORMAL;
-      EXPECT_EQ(found, found && TEV8R1_get_table_array_pos(table, &pos) == PF_NORMAL);
+    if (type == PF_ELEM_LIST && TEV8R1_get_list_ptr(name.c_str(), &list) == PF_NORMAL) {
+      EXPECT_EQ(TEV8R1_get_list_array_pos(list, &pos), PF_NORMAL);
+    }
+    if (type == PF_ELEM_TABLE && TEV8R1_get_table_ptr(name.c_str(), &table) == PF_NORMAL) {
+      EXPECT_EQ(TEV8R1_get_table_array_pos(table, &pos), PF_NORMAL);
     }
     return pos;
   }

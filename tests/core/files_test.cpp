@@ -24,6 +24,11 @@ class FilesTest : public LibraryTest {
   std::string at(const std::string& name) const { return dir_ / name; }
   static TEVPF_STATUS open(const std::string& name) { return TEV8R1_PF_open(name.c_str()); }
 
+  // Refused, and the error context names the file.
+  static void expect_refused(TEVPF_STATUS got, TEVPF_STATUS expected, const std::string& file) {
+    EXPECT_EQ(got, expected);
+    EXPECT_EQ(error_texts(), (ErrorTexts{file, ""}));
+  }
   // The current file's name without its folder; "" when none is current.
   std::string current() const {
     char name[TEVPF_FILE_NAME_SIZE] = "";
@@ -94,12 +99,10 @@ TEST_F(FilesTest, AnOpenFileIsNotOpenedAgain) {
   EXPECT_EQ(read_file(at("empty")), "");
   // A file that is none: closed again, not deleted, and its neighbour is current.
   write_file(at("text"), "Dear reader");
-  EXPECT_EQ(open(at("text")), PF_BADFILE);
-  EXPECT_EQ(error_texts(), (ErrorTexts{at("text"), ""}));
+  expect_refused(open(at("text")), PF_BADFILE, at("text"));
   EXPECT_EQ(current(), "b");
   EXPECT_EQ(read_file(at("text")), "Dear reader");
-  EXPECT_EQ(open(dir_.path()), PF_OPENFAIL);
-  EXPECT_EQ(error_texts(), (ErrorTexts{dir_.path(), ""}));
+  expect_refused(open(dir_.path()), PF_OPENFAIL, dir_.path());
 }
 
 TEST_F(FilesTest, NamesAreLookedUpAndHaveUpTo257Characters) {
@@ -115,8 +118,7 @@ TEST_F(FilesTest, NamesAreLookedUpAndHaveUpTo257Characters) {
   EXPECT_EQ(open("$PFDIR"), PF_NEWFILE);
   EXPECT_EQ(current(), "whole");
   setenv("$PFDIR", std::string(300, 'v').c_str(), 1);
-  EXPECT_EQ(open("$PFDIR/a"), PF_OPENFAIL);
-  EXPECT_EQ(error_texts(), (ErrorTexts{std::string(256, 'v'), ""}));
+  expect_refused(open("$PFDIR/a"), PF_OPENFAIL, std::string(256, 'v'));
   unsetenv("$PFDIR");
   unsetenv("PFDIR");
 
@@ -125,8 +127,7 @@ TEST_F(FilesTest, NamesAreLookedUpAndHaveUpTo257Characters) {
   const std::string longest = folder + "/" + std::string(256 - folder.size(), 'f');
   EXPECT_EQ(open(longest), PF_NEWFILE);
   EXPECT_EQ(current(), fs::path(longest).filename());
-  EXPECT_EQ(open(longest + "f"), PF_OPENFAIL);
-  EXPECT_EQ(error_texts(), (ErrorTexts{longest.substr(0, 256), ""}));
+  expect_refused(open(longest + "f"), PF_OPENFAIL, longest.substr(0, 256));
   EXPECT_EQ(TEV8R1_PF_save(nullptr), PF_NORMAL);
 }
 
@@ -176,14 +177,12 @@ TEST_F(FilesTest, AReadOnlyFileStaysOpenRatherThanBeSaved) {
     };
     for (const auto& save : saves) {
       set_error_texts();
-      EXPECT_EQ(save(), PF_NOPRIV);
-      EXPECT_EQ(error_texts(), (ErrorTexts{at("a"), ""}));
+      expect_refused(save(), PF_NOPRIV, at("a"));
       EXPECT_EQ(current(), "a");
     }
     EXPECT_EQ(TEV8R1_PF_save(at("copy").c_str()), PF_NORMAL);
     chmod(at("copy").c_str(), 0444);
-    EXPECT_EQ(TEV8R1_PF_save(at("copy").c_str()), PF_NOPRIV);
-    EXPECT_EQ(error_texts(), (ErrorTexts{at("copy"), ""}));
+    expect_refused(TEV8R1_PF_save(at("copy").c_str()), PF_NOPRIV, at("copy"));
     EXPECT_EQ(TEV8R1_PF_close(0), PF_NORMAL);
     // What may be written but not read is emptied and new.
     write_file(at("blind"), "Dear reader");
@@ -245,8 +244,7 @@ TEST_F(FilesTest, AFileThatMayNotBeWrittenIsNotReplaced) {
     ASSERT_EQ(TEV8R1_PF_create_elem("L", "", PF_ELEM_LIST), PF_NORMAL);
     chmod(at("mine").c_str(), 0444);
     for (int i = 0; i < 2; ++i) {
-      EXPECT_EQ(TEV8R1_PF_save(nullptr), PF_OPENFAIL);
-      EXPECT_EQ(error_texts(), (ErrorTexts{at("mine"), ""}));
+      expect_refused(TEV8R1_PF_save(nullptr), PF_OPENFAIL, at("mine"));
       EXPECT_EQ(read_file(at("mine")), "");
     }
     chmod(at("mine").c_str(), 0644);
@@ -279,8 +277,7 @@ TEST_F(FilesTest, AFullDiskKeepsTheOldFile) {
       ASSERT_EQ(TEV8R1_PF_create_elem(std::to_string(i).c_str(), "", PF_ELEM_TABLE), PF_NORMAL);
     }
     for (int i = 0; i < 2; ++i) {
-      EXPECT_EQ(TEV8R1_PF_save(nullptr), PF_OPENFAIL);
-      EXPECT_EQ(error_texts(), (ErrorTexts{at("disk/a"), ""}));
+      expect_refused(TEV8R1_PF_save(nullptr), PF_OPENFAIL, at("disk/a"));
       EXPECT_EQ(read_file(at("disk/a")), old);
       EXPECT_EQ(std::distance(fs::directory_iterator(at("disk")), {}), 1);
     }
@@ -314,8 +311,7 @@ TEST_F(FilesTest, AFileChangedUnderneathIsWrittenAgain) {
   fs::remove(at("a"));
   fs::create_directory(at("a"));
   for (const std::string& path : {at("a"), at("no/folder"), std::string("/dev/full")}) {
-    EXPECT_EQ(TEV8R1_PF_save(path == at("a") ? nullptr : path.c_str()), PF_OPENFAIL);
-    EXPECT_EQ(error_texts(), (ErrorTexts{path, ""}));
+    expect_refused(TEV8R1_PF_save(path == at("a") ? nullptr : path.c_str()), PF_OPENFAIL, path);
   }
   EXPECT_EQ(TEV8R1_PF_save(at("copy").c_str()), PF_NORMAL);
   EXPECT_EQ(read_file(at("copy")), own);

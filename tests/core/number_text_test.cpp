@@ -15,21 +15,14 @@ namespace {
 double any_number(std::mt19937_64& random) {
   const auto whole = static_cast<double>(random() % 2000000);
   const double power = std::pow(10, static_cast<int>(random() % 60) - 30);
-  switch (random() % 6) {
-    case 0:
-      return std::bit_cast<double>(random());
-    case 1:
-      return std::ldexp(whole + 0.5, static_cast<int>(random() % 60) - 30);
-    case 2:
-      return -whole * power;
-    case 3:
-      return std::nextafter(power, random() % 2 == 0 ? 0 : 1e300);
-    case 4:
-      return static_cast<float>(whole / 1000);
-    default:
-      return std::ldexp(static_cast<double>(random() >> 11),
-                        static_cast<int>(random() % 220) - 163);
-  }
+  const double numbers[] = {
+      std::bit_cast<double>(random()),
+      std::ldexp(whole + 0.5, static_cast<int>(random() % 60) - 30),
+      -whole * power,
+      std::nextafter(power, random() % 2 == 0 ? 0 : 1e300),
+      static_cast<float>(whole / 1000),
+      std::ldexp(static_cast<double>(random() >> 11), static_cast<int>(random() % 220) - 163)};
+  return numbers[random() % std::size(numbers)];
 }
 
 TEST(NumberText, GeneralGivesTheBytesOfPrintf) {
