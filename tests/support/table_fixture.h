@@ -56,6 +56,7 @@ class TableTest : public TempFileTest {
   static void new_table() {
     TEV8R1_PF_delete_table("t");
     EXPECT_EQ(TEV8R1_PF_create_elem("t", "", PF_ELEM_TABLE), PF_NORMAL);
+    set_error_texts();
   }
   static TEVPF_TABLE& table(const char* name = "t") {
     TEVPF_TABLE* found = nullptr;
