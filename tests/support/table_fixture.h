@@ -1,4 +1,4 @@
-// A table "t" in a new file, filled and read as text, its invariants checked with each look at it.
+// Column definitions, and a table "t" in a new file; each look at it checks its invariants.
 #pragma once
 
 #include <cstring>
@@ -70,43 +70,9 @@ class TableTest : public TempFileTest {
     return {entries, entries + table().num_rows};
   }
 
-  static void define(std::initializer_list<TEVPF_COL_DEF> defs) {
-    for (const TEVPF_COL_DEF& def : defs) ASSERT_OK(TEV8R1_PF_def_column("t", def)) << def.name;
-  }
   static TEVPF_STATUS redefine(const char* name, const TEVPF_COL_DEF& def) {
     return TEV8R1_PF_modify_col_def("t", name, def);
   }
-
-  static void add_rows(std::initializer_list<std::vector<const char*>> rows) {
-    for (const auto& values : rows) {
-      std::string row(static_cast<std::size_t>(table().row_wid), '\x55');
-      for (int i = 0; i < table().num_cols; ++i) {
-        char* place = &row[static_cast<std::size_t>(column(i).offset)];
-        ASSERT_OK(TEV8R1_from_char(column(i).def.type, values[static_cast<std::size_t>(i)], place));
-      }
-      ASSERT_OK(TEV8R1_PF_add_row("t", row.data()));
-    }
-  }
-
-  // The values of a row, separated by blanks; all rows in storage order, separated by slashes.
-  static std::string text_of(const TEVPF_TABLE& t, const void* row) {
-    std::string text;
-    for (int i = 0; i < t.num_cols; ++i) {
-      const TEVPF_COLUMN& c = t.col_array[i];
-      char value[500];
-      std::int32_t length = 0;
-      TEV8R1_to_char(c.def.type, nullptr, static_cast<const char*>(row) + c.offset, value, &length);
-      text += (i > 0 ? " " : "") + std::string(value);
-    }
-    return text;
-  }
-  static std::string rows_text(const char* name = "t") {
-    const TEVPF_TABLE& t = table(name);
-    std::string text;
-    for (int i = 0; i < t.num_rows; ++i) text += (i > 0 ? "/" : "") + text_of(t, row_at(t, i));
-    return text;
-  }
-  static std::string default_text() { return text_of(table(), table().dft_row); }
 };
 
 }  // namespace tevpf

@@ -1,8 +1,11 @@
 // Random sequences of all table operations on the library and on a plain model: vectors of values, and
 // indexes kept by the documented rules in the simplest way. After every step the status, both texts of
 // a refusal, every row, index, default value and the cursor are compared, and the invariants checked.
+#include <algorithm>
 #include <cmath>
+#include <numeric>
 #include <random>
+#include <utility>
 
 #include "support/table_fixture.h"
 
@@ -110,8 +113,8 @@ struct Model {
   }
 
   std::vector<int> sorted(int column) {
-    std::vector<int> index;
-    for (int i = 0; i < count(); ++i) index.push_back(i);
+    std::vector<int> index(rows.size());
+    std::iota(index.begin(), index.end(), 0);
     std::stable_sort(index.begin(), index.end(), [&](int a, int b) {
       return compare_values(col(column), at(a, column), at(b, column), 0) < 0;
     });
@@ -243,7 +246,7 @@ struct Model {
     columns.push_back(column);
     Column& added = columns.back();
     if (!def.idx_flag) added.def.unq_flag = 0;
-    added.def.spare_byte = 0;
+    added.def.desc_byte = added.def.spare_byte = 0;
     for (Row& row : rows) row.push_back(least(added));
     defaults.push_back(least(added));
     if (def.idx_flag) added.index = sorted(int(columns.size()) - 1);
@@ -254,12 +257,9 @@ struct Model {
   }
 
   bool any_neighbours(int column, const std::vector<int>& index, double tolerance, int order) {
-    for (size_t i = 0; i + 1 < index.size(); ++i) {
-      const int answer =
-          compare_values(col(column), at(index[i], column), at(index[i + 1], column), tolerance);
-      if (answer == order) return true;
-    }
-    return false;
+    return std::adjacent_find(index.begin(), index.end(), [&](int a, int b) {
+             return compare_values(col(column), at(a, column), at(b, column), tolerance) == order;
+           }) != index.end();
   }
 
   Result redefine(int place, const Column& changed) {
@@ -280,6 +280,7 @@ struct Model {
     const bool finer = changed.tolerance < old.tolerance;
     const bool new_width = def.width != old.def.width;
     old = changed;
+    old.def.desc_byte = 0;
     if (new_width && interactive) remake_formats();
     if (finer && any_neighbours(place, index, old.tolerance, 1)) index = sorted(place);
     old.index = index;
@@ -622,7 +623,8 @@ class TableModelTest : public TableTest, public testing::WithParamInterface<unsi
     TEVPF_COL_DEF def =
         described(col(name.c_str(), type, 1 + below(12), bounds), kDescriptions[below(4)]);
     std::snprintf(def.units, sizeof def.units, "u%d", names_ % 100);
-    def.spare_byte = std::int8_t(below(3));
+    def.desc_byte = def.spare_byte = std::int8_t(below(3));
+    def.spare = std::uint32_t(below(3));
     def.idx_flag = std::int8_t(chance(60));
     def.unq_flag = std::int8_t(chance(30));
     return {def, bounds, is_floating_type(type) ? std::pow(10.0, -(bounds.precision + 1)) : 0, {}};
@@ -681,6 +683,7 @@ class TableModelTest : public TableTest, public testing::WithParamInterface<unsi
     model_.cur = model_.search = -1;
     model_.next = model_.free_rows = model_.free_cols = 0;
     model_.reset_defaults();
+    for (Column& c : model_.columns) c.def.spare = 0;  // never stored
   }
   void column_values() {
     const int column = any_column();

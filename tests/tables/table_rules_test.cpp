@@ -1,0 +1,348 @@
+// Single rules of tables that random sequences do not reach: refused definitions, formats, tolerances
+// and values that are no numbers, the probes of a search, stored patterns, and limits of counts.
+#include <cmath>
+#include <limits>
+
+#include "reports/formats.h"
+#include "support/table_fixture.h"
+#include "tables/cursor.h"
+#include "tables/layout.h"
+#include "tables/rows.h"
+
+namespace tevpf {
+namespace {
+
+constexpr auto kLess = static_cast<TEVPF_STATUS>(-1);
+constexpr TEVPF_STATUS kGreater = 1;
+const double kNan = std::numeric_limits<double>::quiet_NaN();
+const double kInfinity = std::numeric_limits<double>::infinity();
+
+// The status and both texts that a call leaves.
+#define EXPECT_REFUSED(call, status, ...)               \
+  do {                                                  \
+    set_error_texts();                                  \
+    EXPECT_EQ(call, TEVPF_STATUS{status});              \
+    EXPECT_EQ(error_texts(), (ErrorTexts __VA_ARGS__)); \
+  } while (0)
+
+void put_value(char* place, const char* text) { std::strcpy(place, text); }
+void put_value(char* place, auto number) { store(place, number); }
+
+class TableRules : public TableTest {
+ protected:
+  static void define(std::initializer_list<TEVPF_COL_DEF> defs) {
+    for (const TEVPF_COL_DEF& def : defs) ASSERT_OK(TEV8R1_PF_def_column("t", def)) << def.name;
+  }
+  // A row of values of the columns' types.
+  template <class... T>
+  static TEVPF_STATUS add(T... values) {
+    std::string row(std::size_t(table().row_wid), '\0');
+    int i = 0;
+    (put_value(&row[std::size_t(column(i++).offset)], values), ...);
+    return TEV8R1_PF_add_row("t", row.data());
+  }
+  // Number (indexed), name (described), real (indexed; the search column), three rows.
+  static void fill() {
+    define({indexed(col("n", kInt)), described(col("name", kText, 4), "a name"),
+            indexed(col("r", kReal, 8, {-10, 10, 2}))});
+    ASSERT_OK(add(30, "c", 0.5F));
+    ASSERT_OK(add(10, "a", 0.5004F));
+    ASSERT_OK(add(20, "bb", -1.0F));
+    ASSERT_OK(TEV8R1_PF_define_table_search("t", "r"));
+  }
+};
+
+// ---- Columns -------------------------------------------------------------------------------------
+
+TEST_F(TableRules, PlaceBehindARowThatIsPadded) {
+  std::int16_t extra = 6, mod = 8;
+  std::int32_t pad = 0;
+  TEVPF_COLUMN column{};
+  EXPECT_EQ(TEV8R1_adjust_col(16, kInt, 4, &extra, &mod, &column, &pad), PF_NORMAL);
+  EXPECT_EQ(column.offset, 12);
+  EXPECT_EQ(pad, -4);
+  EXPECT_EQ(extra, 0);
+}
+
+TEST_F(TableRules, RefusedDefinitionsChangeNothing) {
+  fill();
+  define({col("same", kText, 3)});
+  const struct {
+    const char* changed;  // null: a new column
+    TEVPF_COL_DEF def;
+    TEVPF_STATUS status;
+    ErrorTexts texts;
+  } kRefusals[] = {
+      {nullptr, col(" n", kInt, 0), PF_BADNAME, kEmpty},
+      {nullptr, col("n", kInt, 0, {5, 4}), PF_DUPLICATE, {"column n", "table t"}},
+      {nullptr, indexed(col("x", 99, 0), true), PF_BADUNIQUE, kEmpty},
+      {nullptr, col("x", 16, 0), PF_BADTYPE, {"column", "16"}},
+      {nullptr, col("x", kShort, 0, {5, 4}), PF_BADRANGE, {"5", ""}},
+      {nullptr, col("x", kReal, 0, {1.5, 1.25}), PF_BADRANGE, {"1.5", ""}},
+      {nullptr, col("x", kReal, 5, {1, kNan}), PF_BADRANGE, {"1", ""}},
+      {nullptr, col("x", kDouble, 5, {kNan, 1, 0}), PF_BADPREC, {"0", "x"}},
+      {nullptr, col("x", kReal, 0, {1, 1, -2}), PF_BADPREC, {"-2", "x"}},
+      {nullptr, col("x", kInt, 0), PF_BADWIDTH, {"0", "x"}},
+      {nullptr, col("x", kText, INT32_MAX), PF_BADWIDTH, {"2147483647", "x"}},
+      {nullptr, col("x", kText, INT32_MAX - 8), PF_BADWIDTH, {"2147483639", "x"}},
+      {"x", col("n", kInt), PF_NOCOLUMN, {"x", ""}},
+      {"n", col(" m", kText), PF_BADNAME, kEmpty},
+      {"n", col("r", kText), PF_DUPLICATE, {"column r", "table t"}},
+      {"n", col("n", 99), PF_TYPECHG, kUntouched},
+      {"n", col("n", kInt, 6, {21, 20}), PF_BADRANGE, {"21", ""}},
+      {"r", col("r", kReal, 6, {1, 2, 0}), PF_BADPREC, {"0", "r"}},
+      {"n", col("n", kInt, 6, {0, 29}), PF_RANGE, {"30", ""}},
+      {"r", col("r", kReal, 6, {0.6, 1, 2}), PF_RANGE, {"0.5", ""}},
+      {"n", col("n", kInt, 0, {11, 20}), PF_BADWIDTH, {"30", ""}},  // as the value check left it
+      {"n", col("n", kInt, 0), PF_BADWIDTH, kUntouched},
+      {"name", col("name", kText, 5), PF_BADCOLCHG, kEmpty},
+      {"name", col("name", kText, 0), PF_BADCOLCHG, kEmpty},
+      {"r", indexed(col("r", kReal, 8, {-10, 10, 6}), true), PF_NOTUNIQUE, kEmpty},
+      {"same", indexed(col("same", kText, 3), true), PF_NOTUNIQUE, kEmpty},
+  };
+  const std::string before = snapshot(true);
+  for (const auto& [name, def, status, texts] : kRefusals) {
+    SCOPED_TRACE(testing::Message() << (name ? name : "new") << " to " << def.name << status);
+    EXPECT_REFUSED(name ? redefine(name, def) : TEV8R1_PF_def_column("t", def), status, {texts});
+    EXPECT_EQ(snapshot(true), before);
+  }
+  EXPECT_EQ(index_entries(column(3)), nullptr);
+}
+
+TEST_F(TableRules, FormatsAreRemadeWhereTheirWidthChangesInInteractiveMode) {
+  fill();
+  ASSERT_OK(TEV8R1_make_table_format(&table()));
+  EXPECT_EQ(table().dsp_wid, 6 + 2 + 4 + 2 + 8 + 1);
+  ASSERT_OK(redefine("n", col("n", kInt, 7)));
+  ASSERT_OK(TEV8R1_set_interactive_table("t"));
+  ASSERT_OK(redefine("n", col("long number", kInt, 7)));
+  EXPECT_STREQ(column(0).format, "%6d");
+  ASSERT_OK(redefine("long number", col("long number", kInt, 8)));
+  EXPECT_STREQ(column(0).format, "%11d");
+  ASSERT_OK(redefine("r", col("r", kReal, INT32_MAX, {-10, 10, INT32_MAX})));
+  EXPECT_STREQ(column(2).format, "%2147483647.2147483647g");
+  EXPECT_EQ(table().dsp_wid, INT32_MAX);
+
+  // Without rows a column may change its type, and its format has to be made anew.
+  new_table();
+  define({col("n", kInt), col("s", kShort)});
+  ASSERT_OK(TEV8R1_make_table_format(&table()));
+  ASSERT_OK(redefine("n", col("n", kText)));
+  EXPECT_STREQ(column(0).format, "");
+}
+
+TEST_F(TableRules, MovesAreShownWhenDebugging) {
+  fill();
+  library.debug_value = "";
+  testing::internal::CaptureStdout();
+  EXPECT_EQ(TEV8R1_PF_move_col("t", "r", "n"), PF_NORMAL);
+  EXPECT_EQ(TEV8R1_PF_move_col("t", "r", "x"), PF_NOCOLUMN);
+  library.debug_value = nullptr;
+  EXPECT_EQ(testing::internal::GetCapturedStdout(),
+            "0. name = n type=11  size = 4  new_pos = 1\n"
+            "1. name = name type=13  size = 5  new_pos = 2\n"
+            "2. name = r type=12  size = 4  new_pos = 0\n");
+}
+
+TEST_F(TableRules, InquiriesHandOutCopies) {
+  char(*names)[TEVPF_NAME_SIZE] = nullptr;
+  std::int32_t* offsets = nullptr;
+  std::int32_t count = -1;
+  ASSERT_OK(TEV8R1_PF_inq_col_names("t", &count, &names));
+  EXPECT_EQ(count, 0);
+  EXPECT_EQ(names, nullptr);
+
+  fill();
+  ASSERT_OK(TEV8R1_PF_set_col_dft("t", described(col("x", kText, 40), "template")));
+  ASSERT_OK(TEV8R1_PF_copy_table("t", "copy"));
+  new_table();
+  ASSERT_OK(TEV8R1_PF_inq_col_names("copy", &count, &names));
+  ASSERT_OK(TEV8R1_PF_inq_col_offsets("copy", &count, &offsets));
+  EXPECT_EQ(count, 3);
+  EXPECT_STREQ(names[1], "name");
+  EXPECT_EQ(offsets[2], 12);
+  std::free(names);
+  std::free(offsets);
+
+  TEVPF_COL_DEF def{};
+  ASSERT_OK(TEV8R1_PF_inq_col_def("copy", "name", &def));
+  def.description[0] = 'A';
+  EXPECT_STREQ(table("copy").col_array[1].def.description, "a name");
+  std::free(def.description);
+  EXPECT_REFUSED(TEV8R1_PF_inq_col_def_by_pos("copy", 3, &def), PF_BADPOS, {"3", "3"});
+  EXPECT_REFUSED(TEV8R1_PF_inq_col_dft("copy", 16, &def), PF_BADTYPE, {"function call", "16"});
+  const std::int32_t widths[] = {11, 13, 40, 23, 6};
+  for (std::int32_t i = 0; i < 5; ++i) {
+    ASSERT_OK(TEV8R1_get_col_type("copy", "r", &count));
+    ASSERT_OK(TEV8R1_PF_inq_col_dft("copy", kInt + i, &def));
+    EXPECT_EQ(def.width, widths[i]);
+    EXPECT_STREQ(def.description, i == 2 ? "template" : nullptr);
+    std::free(def.description);
+  }
+  EXPECT_EQ(count, kReal);
+  EXPECT_EQ(def.limits.i16.min, -32768);
+}
+
+// ---- Values and searches --------------------------------------------------------------------------
+
+TEST(CompareTest, RealsWithinTheToleranceAreEqual) {
+  const struct {
+    double a, b, tolerance;
+    TEVPF_STATUS answer;
+  } kCases[] = {
+      {1.00000005, 1.0, 1e-7, PF_NORMAL}, {1.0000002, 1.0, 1e-7, kGreater},
+      {0.9999998, 1.0, 1e-7, kLess},      {1.5, 1.0, 0.5, PF_NORMAL},
+      {1.0, 1.5, 0.5, PF_NORMAL},         {2.0, 1.0, 0, kGreater},
+      {-0.0, 0.0, 0, PF_NORMAL},          {kNan, 1.0, 1e-7, PF_NORMAL},
+      {1.0, kNan, 0, PF_NORMAL},          {kInfinity, kInfinity, 0.5, PF_NORMAL},
+      {-kInfinity, 3, 0.5, kLess},        {1.0, 2.0, -5, kLess},
+  };
+  for (const auto& c : kCases) {
+    const auto a = static_cast<float>(c.a), b = static_cast<float>(c.b);
+    EXPECT_EQ(TEV8R1_compare(PF_TYPE_DOUBLE, &c.a, &c.b, c.tolerance), c.answer) << c.a << c.b;
+    if (c.tolerance > 1e-6) {
+      EXPECT_EQ(TEV8R1_compare(PF_TYPE_REAL, &a, &b, c.tolerance), c.answer) << c.a << c.b;
+    }
+  }
+  const std::int32_t five = 5, seven = 7;
+  EXPECT_EQ(TEV8R1_compare(PF_TYPE_INT, &five, &seven, 100), kLess);
+  const std::int16_t minus = -1, one = 1;
+  EXPECT_EQ(TEV8R1_compare(PF_TYPE_SHORT, &one, &minus, 100), kGreater);
+  EXPECT_REFUSED(TEV8R1_compare(16, &five, &seven, 0), PF_BADTYPE, {"value", "16"});
+  EXPECT_REFUSED(TEV8R1_compare(10, &five, &seven, 0), PF_BADTYPE, {"value", "10"});
+}
+
+TEST(SearchTest, ProbesOfNumbers) {
+  static const struct {
+    std::vector<double> values;
+    double tolerance, key;
+    TEVPF_STATUS status;
+    std::int32_t pos;
+  } kCases[] = {
+      {{}, 0, 1, PF_NOTFOUND, 0},
+      {{10, 20, 20, 30}, 0, 20, PF_NORMAL, 1},
+      {{10, 20, 20, 30}, 0, 25, PF_NOTFOUND, 3},
+      {{10, 20, 20, 30}, 0, 40, PF_NOTFOUND, 4},
+      {{10, 20, 20, 30}, 0, 5, PF_NOTFOUND, 0},
+      // Equality chains: the step back ends at the first entry that is less.
+      {{0, 0.6, 1.2, 1.8, 2.4}, 1, 1.5, PF_NORMAL, 1},
+      // An entry that is equal stands in front of one that is less: only the probes count.
+      {{0.9, 0, 1.75}, 1, 1.85, PF_NORMAL, 2},
+      // What is not a number equals everything.
+      {{1, 2, kNan, kNan, 9}, 0, 5, PF_NORMAL, 2},
+      {{1, 2, 3}, 0, kNan, PF_NORMAL, 0},
+  };
+  for (const auto& c : kCases) {
+    const auto count = static_cast<std::int32_t>(c.values.size());
+    std::vector<std::int32_t> index(c.values.size());
+    for (std::int32_t i = 0; i < count; ++i) index[std::size_t(i)] = i;
+    std::int32_t pos = -1;
+    EXPECT_EQ(TEV8R1_binary_search(PF_TYPE_DOUBLE, c.tolerance, count, 8, index.data(),
+                                   c.values.data(), &c.key, &pos),
+              c.status)
+        << c.key;
+    EXPECT_EQ(pos, c.pos) << c.key;
+  }
+  std::int32_t pos = -7;
+  const std::int32_t zero = 0;
+  EXPECT_REFUSED(TEV8R1_binary_search(16, 0, 1, 4, &zero, &zero, &zero, &pos), PF_CMPFAIL,
+                 {kUntouched});
+  EXPECT_EQ(pos, -7);
+}
+
+// Stored patterns stand in front of what they match and can part equal texts: the first equal one is
+// that of the run which the probes hit.
+TEST(SearchTest, AStoredPatternPartsEqualTexts) {
+  const char rows[][3] = {"A", "A", "A*", "A", "A", "A", "A", "A"};
+  const std::int32_t index[] = {0, 1, 2, 3, 4, 5, 6, 7};
+  std::int32_t pos = -1;
+  EXPECT_EQ(TEV8R1_binary_search(PF_TYPE_STRING, 0, 8, 3, index, rows, "A", &pos), PF_NORMAL);
+  EXPECT_EQ(pos, 3);
+  EXPECT_EQ(TEV8R1_binary_search(PF_TYPE_STRING, 0, 8, 3, index, rows, "A*", &pos), PF_NORMAL);
+  EXPECT_EQ(pos, 0);
+}
+
+// ---- Rows ----------------------------------------------------------------------------------------
+
+TEST_F(TableRules, BoundsHoldGiveOrTakeTheTolerance) {
+  define({col("d", kDouble, 8, {0, 10})});
+  EXPECT_EQ(add(10.00000005), PF_NORMAL);
+  EXPECT_EQ(add(-0.00000005), PF_NORMAL);
+  EXPECT_EQ(add(kNan), PF_NORMAL);
+  EXPECT_REFUSED(add(10.0000002), PF_RANGE, {"10", ""});
+  EXPECT_REFUSED(add(-kInfinity), PF_RANGE, {"-inf", ""});
+}
+
+TEST_F(TableRules, APatternIsADuplicateOfWhatItMatches) {
+  define({indexed(col("name", kText, 300), true)});
+  EXPECT_EQ(add("ABC"), PF_NORMAL);
+  EXPECT_REFUSED(add("AB*"), PF_DUPLICATE, {"value AB*", "column name"});
+  EXPECT_EQ(library.dup_row, 0);
+  EXPECT_EQ(add("AB"), PF_NORMAL);
+  const std::string longest(300, 'x');
+  EXPECT_EQ(add(longest.c_str()), PF_NORMAL);
+  EXPECT_REFUSED(add(longest.c_str()), PF_DUPLICATE,
+                 {("value " + longest).substr(0, 256), "column name"});
+  EXPECT_EQ(library.dup_row, 2);
+  // The duplicate passes as a default row, but its context stays.
+  std::vector<char> row(std::size_t(table().row_wid));
+  std::strcpy(row.data(), "A*");
+  EXPECT_REFUSED(TEV8R1_PF_set_dft_row("t", row.data()), PF_NORMAL, {"value A*", "column name"});
+}
+
+TEST_F(TableRules, AnIndexBuiltIsOrderedExactly) {
+  define({col("d", kDouble, 8, {0, 10})});
+  TEV8R1_set_interactive_table("t");
+  for (const double d : {3.0, -kNan, -0.0, 1.00000004, 0.0, 1.0, kInfinity, -kInfinity}) add(d);
+  TEVPF_COL_DEF def = table().col_array[0].def;
+  def.idx_flag = 1;
+  def.limits.f64 = {kInfinity, -kInfinity, 6};
+  ASSERT_EQ(TEV8R1_PF_modify_col_def("t", "d", def), PF_NORMAL);
+  EXPECT_EQ(order(0), (std::vector{7, 2, 4, 5, 3, 0, 6, 1}));
+  EXPECT_GE(table().col_array[0].index_room, table().num_rows + table().free_rows);
+
+  // The sort's comparison speaks of the column whose index was built last, within its tolerance.
+  TEVPF_COLUMN& column = table().col_array[0];
+  ASSERT_EQ(TEV8R1_create_index(&table(), &column), PF_NORMAL);
+  const std::int32_t low = 7, near = 3, one = 5, high = 0;
+  EXPECT_LT(TEV8R1_sort_comp(&low, &high), 0);
+  EXPECT_GT(TEV8R1_sort_comp(&high, &near), 0);
+  EXPECT_EQ(TEV8R1_sort_comp(&near, &one), 0);
+}
+
+TEST_F(TableRules, WithoutRowsAndColumns) {
+  char row[8];
+  std::int32_t value = 7, number = 0;
+  void* pointer = row;
+  EXPECT_REFUSED(TEV8R1_PF_get_value("t", "x", &value, &value), PF_NORMAL, {kUntouched});
+  EXPECT_EQ(value, 7);
+  EXPECT_REFUSED(TEV8R1_PF_get_row_by_value("t", 0, "x", &value, row), PF_NOTFOUND, {});
+  EXPECT_EQ(TEV8R1_get_next_row_ptr(&table(), &pointer, &number), PF_NORMAL);
+  EXPECT_EQ(pointer, nullptr);
+  EXPECT_EQ(TEV8R1_convert_row("t", -5), -5);
+  EXPECT_EQ(TEV8R1_convert_row("other", 3), -1);
+  define({indexed(col("a", kInt, 5, {0, 1e6}))});
+  EXPECT_REFUSED(TEV8R1_PF_get_value("t", "x", &value, &value), PF_NOTFOUND, {});
+  add(std::int32_t{4});
+  value = 4;
+  EXPECT_REFUSED(TEV8R1_PF_get_value("t", "x", &value, &number), PF_NOCOLUMN, {"x", ""});
+}
+
+TEST_F(TableRules, SlotsAreCountedUpToTheLargestCount) {
+  define({indexed(col("a", kInt, 5, {0, 1e6}))});
+  for (std::int32_t i = 0; i < 3; ++i) EXPECT_EQ(add(i), PF_NORMAL);
+  TEV8R1_PF_set_memory_allocation(0, 100000);
+  table().free_rows = 0;
+  EXPECT_EQ(TEV8R1_get_space(&table()), PF_NORMAL);
+  EXPECT_EQ(table().free_rows, 32767);
+  std::int32_t row;
+  EXPECT_EQ(TEV8R1_PF_get_next_row("t", &row), PF_NORMAL);
+  EXPECT_EQ(TEV8R1_PF_delete_row("t"), PF_NORMAL);
+  EXPECT_EQ(table().free_rows, 32767);
+  EXPECT_EQ(TEV8R1_PF_move_row("t", 0, 3), PF_NORMAL);
+  EXPECT_EQ(table().free_rows, 32767);
+  TEV8R1_PF_set_memory_allocation(0, 0);
+}
+
+}  // namespace
+}  // namespace tevpf
