@@ -317,6 +317,7 @@ TEST_F(TableRules, WithoutRowsAndColumns) {
   EXPECT_REFUSED(TEV8R1_PF_get_value("t", "x", &value, &value), PF_NORMAL, {kUntouched});
   EXPECT_EQ(value, 7);
   EXPECT_REFUSED(TEV8R1_PF_get_row_by_value("t", 0, "x", &value, row), PF_NOTFOUND, {});
+  EXPECT_REFUSED(TEV8R1_PF_get_col_values("t", "x", row), PF_NOMORE, {kUntouched});
   EXPECT_EQ(TEV8R1_get_next_row_ptr(&table(), &pointer, &number), PF_NORMAL);
   EXPECT_EQ(pointer, nullptr);
   EXPECT_EQ(TEV8R1_convert_row("t", -5), -5);
