@@ -118,6 +118,9 @@ TEST_F(FormatTest, AFileCutAnywhereKeepsWhatCameBefore) {
     ASSERT_NE(current(), nullptr);
     EXPECT_EQ(current()->num_lists, size >= kNameIndex ? 1 : 0);
     EXPECT_EQ(current()->num_tables, size >= kColumnIndex ? 1 : 0);
+    if (size >= kColumnIndex) {
+      EXPECT_EQ(current()->table_ptr[0]->num_rows, size < example_.size() ? 0 : 3);
+    }
     if (status == PF_NORMAL) {
       EXPECT_EQ(saved_bytes(), example_.substr(0, size));
     }
