@@ -104,29 +104,23 @@ TEVPF_PARAM_DEF* buffers() {
   return &def;
 }
 
+void release(void* block) { std::free(block); }
+void release(TEVPF_COL_DEF& def) { std::free(def.description); }
+void release(TEVPF_PARAM_DEF& def) {
+  std::free(def.description);
+  if (def.type == PF_TYPE_STRING) std::free(def.part.str.value);
+}
 // What operations hand out, released at the end of the call's expression.
 template <class T>
 struct Handed {
-  ~Handed() { std::free(block); }
-  T** to() { return &block; }
-  T* block = nullptr;
+  ~Handed() { release(made); }
+  T* to() { return &made; }
+  T made{};
 };
-struct HandedParam {
-  explicit HandedParam(std::int32_t type = 0) { def.type = type; }
-  ~HandedParam() {
-    std::free(def.description);
-    if (def.type == PF_TYPE_STRING) std::free(def.part.str.value);
-  }
-  TEVPF_PARAM_DEF* to() { return &def; }
-  TEVPF_PARAM_DEF def{};
-};
-struct HandedColumn {
-  ~HandedColumn() { std::free(def.description); }
-  TEVPF_COL_DEF* to() { return &def; }
-  TEVPF_COL_DEF def{};
-};
-using Names = Handed<char[TEVPF_NAME_SIZE]>;
-using Descs = Handed<char[TEVPF_DESC_SIZE]>;
+using HandedParam = Handed<TEVPF_PARAM_DEF>;
+using HandedColumn = Handed<TEVPF_COL_DEF>;
+using Names = Handed<char (*)[TEVPF_NAME_SIZE]>;
+using Descs = Handed<char (*)[TEVPF_DESC_SIZE]>;
 
 template <class T>
 const T* at(const T& temporary) {
@@ -247,16 +241,16 @@ void add_value_calls(std::vector<Call>& calls) {
     MORE(string_compare, kNoStatus, ("a", "b")),
     CALL(memcpy, (std::min(n[0], 9), long_text, text_out), 4),
     {"strdup", {}, [](Numbers) {
-       const Handed<char> copy{TEV8R1_strdup(long_text)};
-       if (copy.block == nullptr) set_error_texts(kEmpty);
-       return copy.block == nullptr ? PF_NOMEM : PF_NORMAL;
+       const Handed<char*> copy{TEV8R1_strdup(long_text)};
+       if (copy.made == nullptr) set_error_texts(kEmpty);
+       return copy.made == nullptr ? PF_NOMEM : PF_NORMAL;
      }},
-    CALL(allocate_elem, (n[0], n[1], n[2], Handed<void>().to(), &found_row), 0, 3, 4),
+    CALL(allocate_elem, (n[0], n[1], n[2], Handed<void*>().to(), &found_row), 0, 3, 4),
     CALL(insert_index_value, (entries, 3, n[0], n[1]), 2, 7),
     CALL(remove_index, (entries, n[0], 3), 1),
     CALL(binary_search, (n[0], 0, std::min(n[1], 3), 4, index, index, n + 2, out), PF_TYPE_INT, 3, 1),
-    CALL(adjust_index, (n[0], std::int16_t(n[1]), Handed<std::int32_t>().to()), 5, 3),
-    CALL(adjust_default, (Handed<void>().to(), 12, at(column("x", n)), 4, 8), PF_TYPE_INT, 5, 9, 1, 0, 0, 0),
+    CALL(adjust_index, (n[0], std::int16_t(n[1]), Handed<std::int32_t*>().to()), 5, 3),
+    CALL(adjust_default, (Handed<void*>().to(), 12, at(column("x", n)), 4, 8), PF_TYPE_INT, 5, 9, 1, 0, 0, 0),
   });
 }
 
@@ -274,11 +268,10 @@ void add_list_calls(std::vector<Call>& calls) {
          TEVPF_PARAM made{};
          made.def = param("new", n);
          const TEVPF_STATUS status = TEV8R1_construct_param(&made, out);
-         HandedParam owner;
-         if (status == PF_NORMAL) owner.def = made.def;
+         if (status == PF_NORMAL) release(made.def);
          return status;
        }},
-      CALL(store_param_value, (n[0], "12", HandedParam(n[0]).to()), type),
+      CALL(store_param_value, (n[0], "12", HandedParam{{n[0], "", "", nullptr, {}}}.to()), type),
       CALL(PF_inq_param_dft, ("list", n[0], HandedParam().to()), type),
       CALL(calc_param_bytes, (n[0], long_text, n[1], out), type, 7),
       CALL(adjust_param_size_btf, (n[0], n[1], out), type, PF_TYPE_INT),
@@ -290,9 +283,9 @@ void add_list_calls(std::vector<Call>& calls) {
     CALL(PF_modify_param, ("list", "string", std::string(200, 'v').c_str())),
     CALL(PF_get_param_value, ("list", "str*", text_out)),
     {"load_param_dft", {}, [](Numbers) {
-       Handed<TEVPF_PARAM_DEF> made;
+       Handed<TEVPF_PARAM_DEF*> made;
        const TEVPF_STATUS status = TEV8R1_load_param_dft(made.to());
-       if (status == PF_NORMAL) std::free(made.block[PF_TYPE_STRING - PF_TYPE_INT].part.str.value);
+       if (status == PF_NORMAL) std::free(made.made[PF_TYPE_STRING - PF_TYPE_INT].part.str.value);
        return status;
      }},
     MORE(PF_inq_param_dft, kPartStays, ("none", n[0], HandedParam().to()), PF_TYPE_STRING),
@@ -359,7 +352,7 @@ void add_column_calls(std::vector<Call>& calls) {
     CALL(PF_inq_col_def, ("t", "string", HandedColumn().to())),
     CALL(PF_inq_col_def_by_pos, ("t", n[0], HandedColumn().to()), 1),
     CALL(PF_inq_col_names, ("t", out, Names().to())),
-    CALL(PF_inq_col_offsets, ("t", out, Handed<std::int32_t>().to())),
+    CALL(PF_inq_col_offsets, ("t", out, Handed<std::int32_t*>().to())),
     CALL(load_col_dft, (&table("empty"))), CALL(get_col_type, ("t", "real", out)),
     CALL(get_col_ptr, (&table(), "real", &found_column)),
     CALL(check_unique_column, (&table(), "real")),
@@ -444,8 +437,8 @@ void add_report_calls(std::vector<Call>& calls, const TempDir& dir) {
     CALL(make_table_format, (&table())),
     CALL(review_row, (table().col_array, table().col_array + 4, table().row_data, text_out, out)),
     {"remove_escape_chars", {8}, [](Numbers n) {
-       Handed<char> text{static_cast<char*>(std::malloc(8))};
-       std::strcpy(text.block, "\t\t\t\t\t\t\t");
+       Handed<char*> text{static_cast<char*>(std::malloc(8))};
+       std::strcpy(text.made, "\t\t\t\t\t\t\t");
        std::int32_t size = std::min(n[0], 8);
        return TEV8R1_remove_escape_chars(&size, text.to());
      }},
