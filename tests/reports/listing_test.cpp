@@ -5,27 +5,20 @@ namespace {
 
 class Listing : public ReportTest {
  protected:
-  void SetUp() override {
-    ReportTest::SetUp();
-    fill_mixed_table();
-    ASSERT_EQ(TEV8R1_PF_define_table_search("Mixed", "id"), PF_NORMAL);
+  Listing() {
+    mixed_table();
+    EXPECT_EQ(TEV8R1_PF_define_table_search("t", "id"), PF_NORMAL);
   }
 };
 
-TEST_F(Listing, ChosenColumnsInSearchOrder) {
+TEST_F(Listing, ColumnsOfChoiceInSearchOrder) {
   EXPECT_EQ(listing({"t", "id", "a_rather_long_name"}, -5, PF_END_POS, 1),
             golden("listing_chosen"));
   EXPECT_EQ(status_, PF_NORMAL);
-  EXPECT_EQ(table_->cur_row, -1);
-}
-
-TEST_F(Listing, MoreColumnsThanThereAreMeansAll) {
-  ASSERT_EQ(TEV8R1_PF_print_table("Mixed", "out.txt", 0, INT32_MAX, nullptr, 1, 3), PF_NORMAL);
-  EXPECT_EQ(read_file("out.txt"), golden("listing_all"));
-}
-
-TEST_F(Listing, ColumnsMayRepeatAndStorageOrderHoldsWithoutASearchColumn) {
-  ASSERT_EQ(TEV8R1_PF_define_table_search("Mixed", nullptr), PF_NORMAL);
+  EXPECT_EQ(table().cur_row, -1);
+  ASSERT_OK(TEV8R1_PF_print_table("t", "out.txt", 0, INT32_MAX, nullptr, 1, 3));
+  EXPECT_EQ(read_file("out.txt"), golden("listing_all")) << "more columns than there are mean all";
+  ASSERT_OK(TEV8R1_PF_define_table_search("t", nullptr));
   EXPECT_EQ(data_of(listing({"s", "s"}, 0, 1)),
             ". s    s\n.---------\n\n   7    7\n -32768  -32768\n");
 }
@@ -41,7 +34,7 @@ TEST_F(Listing, RangesWithoutRowsEndBehindTheHeading) {
                {0, -1, "0"}};
   for (const auto& c : cases) {
     EXPECT_EQ(listing({"s"}, c.first, c.last),
-              " Table name:  Mixed\n Description:  stored 30, 10, 20\n.Number of columns:  1\n"
+              " Table name:  t\n Description:  stored 30, 10, 20\n.Number of columns:  1\n"
               ".Number of rows:  " +
                   std::string(c.rows) + "\n\n!\n\n.    \t\t\t\tTABLE DATA\n\n");
     EXPECT_EQ(status_, PF_NORMAL);
@@ -51,14 +44,12 @@ TEST_F(Listing, RangesWithoutRowsEndBehindTheHeading) {
 TEST_F(Listing, RefusalsWriteNothing) {
   EXPECT_EQ(listing({"id", "nowhere", "nobody"}), "");
   EXPECT_EQ(status_, PF_NOCOLUMN);
-  EXPECT_STREQ(err_item, "nowhere");
-  EXPECT_STREQ(err_value, "");
+  EXPECT_EQ(error_texts(), (ErrorTexts{"nowhere", ""}));
   for (const std::int32_t count : {0, -3}) {
-    std::strcpy(err_value, "old");
-    EXPECT_EQ(TEV8R1_PF_print_table("Mixed", "out.txt", 0, count, nullptr, 0, 1), PF_BADARG);
+    set_error_texts();
+    EXPECT_EQ(TEV8R1_PF_print_table("t", "out.txt", 0, count, nullptr, 0, 1), PF_BADARG);
     EXPECT_EQ(read_file("out.txt"), "");
-    EXPECT_EQ(err_item, std::to_string(count));
-    EXPECT_STREQ(err_value, "");
+    EXPECT_EQ(error_texts(), (ErrorTexts{std::to_string(count), ""}));
   }
 }
 
