@@ -24,7 +24,6 @@ std::array<Def, 5> initial_defaults() {
   for (std::int32_t i = 0; i < 5; ++i) {
     const auto slot = static_cast<std::size_t>(i);
     defaults[slot] = Def{PF_TYPE_INT + i, "", "", {}, 0, highest[i], lowest[i]};
-    if (!tevpf::is_floating_type(PF_TYPE_INT + i)) defaults[slot].precision = 0;
   }
   return defaults;
 }
@@ -180,7 +179,7 @@ class ListModel : public TempFileTest {
     EXPECT_EQ(record.cur_param, model.cursor);
     EXPECT_EQ(record.free_params, model.free);
     for (std::int32_t i = 0; i < model.count(); ++i) {
-      EXPECT_EQ(from_c(record.param_ptr[i].def), model.at(i)) << "position " << i;
+      EXPECT_EQ(text_of(record.param_ptr[i].def), text_of(model.at(i))) << "position " << i;
     }
   }
   void compare_delivered(std::int32_t position, const DefBuffers& out) {
@@ -190,7 +189,7 @@ class ListModel : public TempFileTest {
     if (expected.type == PF_TYPE_STRING) {
       EXPECT_TRUE(out.c.part.str.value == out.value.data());
     }
-    EXPECT_EQ(from_c(out.c), expected);
+    EXPECT_EQ(text_of(out.c), text_of(expected));
     model_->cursor = position;
   }
   void compare_value(const Def& expected, const std::vector<char>& value) {
@@ -401,7 +400,8 @@ class ListModel : public TempFileTest {
       return expect(actual, refuse(PF_BADTYPE, "function call", std::to_string(type)));
     }
     expect(actual, PF_NORMAL);
-    EXPECT_EQ(from_c(out), model_->defaults[static_cast<std::size_t>(type - PF_TYPE_INT)]);
+    EXPECT_EQ(text_of(out),
+              text_of(model_->defaults[static_cast<std::size_t>(type - PF_TYPE_INT)]));
     std::free(out.description);
     if (type == PF_TYPE_STRING) std::free(out.part.str.value);
   }

@@ -67,12 +67,11 @@ TEST_F(ListRules, WhatIsNotANumberIsInRangeUntilItIsSet) {
 TEST_F(ListRules, SizesBeyond31BitsAreRefusedBeforeAnythingChanges) {
   ASSERT_EQ(add({PF_TYPE_STRING, "s"}), PF_NORMAL);
   TEVPF_LIST& record = list("list");
-  Def longer{PF_TYPE_STRING, "s"};
-  longer.text = "longer";
+  const Def longer{.type = PF_TYPE_STRING, .name = "s", .text = "longer"};
   record.header.btf = INT_MAX - 5;
   const std::function<TEVPF_STATUS()> operations[] = {
       [&] {
-        return add({PF_TYPE_SHORT, "new"});
+        return add(Def{PF_TYPE_SHORT, "new"});
       },
       [&] { return TEV8R1_PF_modify_param("list", "s", "longer"); },
       [&] { return TEV8R1_PF_modify_param_def("list", to_c(longer)); },
@@ -83,7 +82,7 @@ TEST_F(ListRules, SizesBeyond31BitsAreRefusedBeforeAnythingChanges) {
     EXPECT_EQ(error_texts(), kEmpty);
     EXPECT_EQ(record.header.btf, INT_MAX - 5);
     EXPECT_EQ(record.num_params, 1);
-    EXPECT_EQ(from_c(record.param_ptr[0].def), as_kept({PF_TYPE_STRING, "s"}));
+    EXPECT_EQ(text_of(record.param_ptr[0].def), text_of(Def{PF_TYPE_STRING, "s"}));
   }
   EXPECT_EQ(TEV8R1_PF_modify_param("list", "s", "short"), PF_NORMAL);
   EXPECT_EQ(record.header.btf, INT_MAX);

@@ -4,7 +4,7 @@
 #include <cstdlib>
 #include <cstring>
 #include <optional>
-#include <ostream>
+#include <sstream>
 #include <string>
 #include <vector>
 
@@ -19,16 +19,7 @@ struct Def {
   std::int32_t precision = 6;  // reals and doubles
   std::string text{};          // strings
   std::int32_t length = 0;     // strings: as handed in or as kept
-
-  bool operator==(const Def&) const = default;
 };
-
-inline std::ostream& operator<<(std::ostream& out, const Def& def) {
-  return out << def.name << " type " << def.type << " value " << def.value << " [" << def.min
-             << ", " << def.max << "] precision " << def.precision << " text '" << def.text
-             << "' length " << def.length << " units " << def.units << " description "
-             << def.description.value_or("(none)");
-}
 
 // A definition for the interface; it points to the texts of `def`.
 inline TEVPF_PARAM_DEF to_c(const Def& def) {
@@ -53,39 +44,30 @@ inline TEVPF_PARAM_DEF to_c(const Def& def) {
   return c;
 }
 
-inline Def from_c(const TEVPF_PARAM_DEF& c) {
-  Def def{c.type, c.name, c.units};
-  def.precision = 0;
-  if (c.description != nullptr) def.description = std::string(c.description);
+// All that a definition says, to be compared; an absent description differs from an empty one.
+inline std::string text_of(const TEVPF_PARAM_DEF& c) {
+  std::ostringstream out;
+  out << c.name << ": type " << c.type << ", units " << c.units << ", "
+      << (c.description == nullptr ? "not described" : "description " + std::string(c.description));
   if (c.type == PF_TYPE_STRING) {
-    def.max = def.min = 0;
-    def.text = c.part.str.value;
-    def.length = c.part.str.length;
+    out << ", '" << c.part.str.value << "' of length " << c.part.str.length;
   } else {
     tevpf::with_number(c.type, [&](auto tag) {
-      using T = decltype(tag);
-      const auto& part = tevpf::number_part<T>(c);
-      def.value = static_cast<double>(part.value);
-      def.max = static_cast<double>(part.max);
-      def.min = static_cast<double>(part.min);
-      if constexpr (tevpf::kIsFloating<T>) def.precision = part.precision;
+      const auto& part = tevpf::number_part<decltype(tag)>(c);
+      out << std::hexfloat << ", " << double(part.value) << " in [" << double(part.min) << ", "
+          << double(part.max) << "]";
+      if constexpr (tevpf::kIsFloating<decltype(tag)>) out << ", precision " << part.precision;
     });
   }
-  return def;
+  return out.str();
 }
+inline std::string text_of(const Def& def) { return text_of(to_c(def)); }
 
-// What a list keeps of a definition: cut texts, a string's real length, nothing that its type lacks.
+// What a list keeps of a definition: cut texts, a string's real length.
 inline Def as_kept(Def def) {
   def.name = def.name.substr(0, 19);
   def.units = def.units.substr(0, 7);
-  if (def.type == PF_TYPE_STRING) {
-    def.value = def.max = def.min = 0;
-    def.length = static_cast<std::int32_t>(def.text.size());
-  } else {
-    def.text.clear();
-    def.length = 0;
-  }
-  if (!tevpf::is_floating_type(def.type)) def.precision = 0;
+  def.length = static_cast<std::int32_t>(def.text.size());
   return def;
 }
 

@@ -3,7 +3,6 @@
 #include <cfloat>
 #include <climits>
 #include <cstring>
-#include <map>
 #include <string>
 #include <vector>
 
@@ -27,22 +26,33 @@ double convert(std::int32_t type, const std::string& text, TEVPF_STATUS& status)
   });
 }
 
-TEST(Convert, TextsThatAreNumbers) {
-  struct Number {
-    const char* text;
-    double value;
-  };
-  const std::map<std::int32_t, std::vector<Number>> numbers = {
+TEST(Convert, TextsToValues) {
+  const std::string nines(300, '9');
+  const struct {
+    std::int32_t type;
+    const char* type_name;
+    std::vector<std::pair<const char*, double>> numbers;
+    std::vector<std::string> out_of_range, malformed;
+  } types[] = {
       {PF_TYPE_INT,
+       "integer",
        {{"2147483647", INT_MAX},
         {"-2147483648", INT_MIN},
         {"+2147483647", INT_MAX},
         {"0000000001", 1},
         {"-0000000001", -1},
         {" \t123", 123},
-        {"", 0}}},
-      {PF_TYPE_SHORT, {{"32767", 32767}, {"-32768", -32768}, {"00000000000012", 12}, {"", 0}}},
+        {"", 0}},
+       {"2147483648", "+2147483648", "-2147483649", "00000000001", "-00000000001", " -123456789",
+        nines},
+       {" ", "-", "12 ", "12a", "999999999999999999999x"}},
+      {PF_TYPE_SHORT,
+       "short",
+       {{"32767", 32767}, {"-32768", -32768}, {"00000000000012", 12}, {"", 0}},
+       {"32768", "-32769", "-99999999999999999999"},
+       {"1.5", "32768x"}},
       {PF_TYPE_DOUBLE,
+       "double",
        {{" \v2.5", 2.5},
         {"-.5e+1", -5},
         {"+5.", 5},
@@ -50,60 +60,34 @@ TEST(Convert, TextsThatAreNumbers) {
         {"1.7976931348623157e308", DBL_MAX},
         {"2.2250738585072014e-308", DBL_MIN},
         {"0e-99999999999", 0},
-        {"", kBefore}}},
+        {"", kBefore}},
+       {"1e309", "-1e309x", "1e-400", "-1e-310 ", "2.2250738585072011e-308", nines + nines + "x"},
+       {"1.5x", "1.5 ", "1e", "+-1", "- 1", ".", "   ", "inf", "-nan", "0x1p3", "1,5"}},
       {PF_TYPE_REAL,
+       "real",
        {{"3.4028234663852886e38", FLT_MAX},
         {"-3.4028234663852887e38", -FLT_MAX},
         {"1e-50", 0},
         {"0.1", 0.1F},
-        {"", 0}}},
+        {"", 0}},
+       {"3.5e38", "-3.5e38", "1e309"},
+       {"abc", "-3.5e38x", nines + "x"}},
   };
-  for (const auto& [type, texts] : numbers) {
-    for (const Number& number : texts) {
+  for (const auto& t : types) {
+    const auto expect = [&](const std::string& text, double value, TEVPF_STATUS expected,
+                            const ErrorTexts& texts) {
       set_error_texts();
       TEVPF_STATUS status;
-      EXPECT_EQ(convert(type, number.text, status), number.value) << type << ' ' << number.text;
-      EXPECT_EQ(status, PF_NORMAL) << type << ' ' << number.text;
-      EXPECT_EQ(error_texts(), kUntouched);
+      EXPECT_EQ(convert(t.type, text, status), value) << t.type_name << ' ' << text;
+      EXPECT_EQ(status, expected) << t.type_name << ' ' << text;
+      EXPECT_EQ(error_texts(), texts);
+    };
+    for (const auto& [text, value] : t.numbers) expect(text, value, PF_NORMAL, kUntouched);
+    for (const std::string& text : t.out_of_range) {
+      expect(text, kBefore, PF_RANGE, {text.substr(0, 256), ""});
     }
-  }
-}
-
-TEST(Convert, TextsThatAreRefused) {
-  const std::string nines(300, '9');
-  const struct {
-    std::int32_t type;
-    TEVPF_STATUS status;
-    const char* err_value;
-    std::vector<std::string> texts;
-  } refusals[] = {
-      {PF_TYPE_INT,
-       PF_RANGE,
-       "",
-       {"2147483648", "+2147483648", "-2147483649", "00000000001", "-00000000001", " -123456789",
-        nines}},
-      {PF_TYPE_INT, PF_BADARG, "integer", {" ", "-", "12 ", "12a", "999999999999999999999x"}},
-      {PF_TYPE_SHORT, PF_RANGE, "", {"32768", "-32769", "-99999999999999999999"}},
-      {PF_TYPE_SHORT, PF_BADARG, "short", {"1.5", "32768x"}},
-      {PF_TYPE_DOUBLE,
-       PF_RANGE,
-       "",
-       {"1e309", "-1e309x", "1e-400", "-1e-310 ", "2.2250738585072011e-308", nines + nines + "x"}},
-      {PF_TYPE_DOUBLE,
-       PF_BADARG,
-       "double",
-       {"1.5x", "1.5 ", "1e", "+-1", "- 1", ".", "   ", "inf", "-nan", "0x1p3", "1,5"}},
-      {PF_TYPE_REAL, PF_RANGE, "", {"3.5e38", "-3.5e38", "1e309"}},
-      {PF_TYPE_REAL, PF_BADARG, "real", {"abc", "-3.5e38x", nines + "x"}},
-  };
-  for (const auto& refusal : refusals) {
-    for (const std::string& text : refusal.texts) {
-      SCOPED_TRACE("type " + std::to_string(refusal.type) + ", text '" + text + "'");
-      set_error_texts();
-      TEVPF_STATUS status;
-      EXPECT_EQ(convert(refusal.type, text, status), kBefore) << "the destination is as it was";
-      EXPECT_EQ(status, refusal.status);
-      EXPECT_EQ(error_texts(), (ErrorTexts{text.substr(0, 256), refusal.err_value}));
+    for (const std::string& text : t.malformed) {
+      expect(text, kBefore, PF_BADARG, {text.substr(0, 256), t.type_name});
     }
   }
 }
@@ -166,27 +150,25 @@ TEST(TextCompare, BytesAndPrefixes) {
   const struct {
     const char *text, *pattern;
     TEVPF_STATUS order;
-  } cases[] = {
-      {"", "", PF_NORMAL},
-      {"A", "", 1},
-      {"", "A", kLess},
-      {"AB", "ABC", kLess},
-      {"ABC", "AB", 1},
-      {"\x80", "z", 1},
-      {"a", "\xff", kLess},
-      {"ABCD", "AB*", PF_NORMAL},
-      {"AB", "AB*", PF_NORMAL},
-      {"A", "AB*", kLess},
-      {"AC", "AB*", 1},
-      {"", "*", PF_NORMAL},
-      {"x", "*", PF_NORMAL},
-      {"B1X", "B*X", 1},
-      {"B*X", "B*X", PF_NORMAL},
-      {"A*", "A**", kLess},
-      {"A**", "A**", PF_NORMAL},
-      {"A*B", "A*", PF_NORMAL},
-      {"\xe9\x80", "\xe9*", PF_NORMAL},
-  };
+  } cases[] = {{"", "", PF_NORMAL},
+               {"A", "", 1},
+               {"", "A", kLess},
+               {"AB", "ABC", kLess},
+               {"ABC", "AB", 1},
+               {"\x80", "z", 1},
+               {"a", "\xff", kLess},
+               {"ABCD", "AB*", PF_NORMAL},
+               {"AB", "AB*", PF_NORMAL},
+               {"A", "AB*", kLess},
+               {"AC", "AB*", 1},
+               {"", "*", PF_NORMAL},
+               {"x", "*", PF_NORMAL},
+               {"B1X", "B*X", 1},
+               {"B*X", "B*X", PF_NORMAL},
+               {"A*", "A**", kLess},
+               {"A**", "A**", PF_NORMAL},
+               {"A*B", "A*", PF_NORMAL},
+               {"\xe9\x80", "\xe9*", PF_NORMAL}};
   for (const auto& c : cases) {
     EXPECT_EQ(TEV8R1_string_compare(c.text, c.pattern), c.order) << c.text << " : " << c.pattern;
   }
