@@ -192,19 +192,16 @@ class ListModel : public TempFileTest {
     EXPECT_EQ(text_of(out.c), text_of(expected));
     model_->cursor = position;
   }
-  void compare_value(const Def& expected, const std::vector<char>& value) {
-    TEVPF_PARAM_DEF c = to_c(expected);
+  void compare_value(std::int32_t position, const std::vector<char>& value) {
+    if (position < 0) return;
+    const TEVPF_PARAM_DEF c = to_c(model_->at(position));
     std::vector<char> wanted(value.size());
     TEV8R1_load_param_value(&c, wanted.data());
     EXPECT_EQ(value, wanted);
+    model_->cursor = position;
   }
   std::vector<char> buffer_for_value(std::int32_t position) {
-    return std::vector<char>(
-        static_cast<std::size_t>(position < 0 ? 1 : value_size(model_->at(position))));
-  }
-  DefBuffers buffers_for(std::int32_t position) {
-    const Def def = position >= 0 && position < model_->count() ? model_->at(position) : Def{};
-    return {value_size(def), desc_size(def)};
+    return std::vector<char>(std::size_t(position < 0 ? 1 : value_size(model_->at(position))));
   }
   std::int32_t next() const {
     return model_->cursor < model_->count() - 1 ? model_->cursor + 1 : -1;
@@ -296,13 +293,11 @@ class ListModel : public TempFileTest {
   }
   void get_value() {
     const std::string name = known_name();
-    const std::int32_t position = find_in_model(name);
+    const std::int32_t position = find(name);
     std::vector<char> value = buffer_for_value(position);
-    const TEVPF_STATUS actual = TEV8R1_PF_get_param_value(list_name(), name.c_str(), value.data());
-    expect(actual, find(name) < 0 ? PF_NOPARAM : PF_NORMAL);
-    if (position < 0) return;
-    compare_value(model_->at(position), value);
-    model_->cursor = position;
+    expect(TEV8R1_PF_get_param_value(list_name(), name.c_str(), value.data()),
+           position < 0 ? PF_NOPARAM : PF_NORMAL);
+    compare_value(position, value);
   }
   void next_value() {
     const std::int32_t position = next();
@@ -310,60 +305,61 @@ class ListModel : public TempFileTest {
     std::vector<char> value = buffer_for_value(position);
     expect(TEV8R1_PF_get_next_param(list_name(), name, value.data()),
            position < 0 ? PF_NOMORE : PF_NORMAL);
-    ++model_->cursor;
     EXPECT_EQ(name, position < 0 ? "?" : model_->at(position).name);
-    if (position >= 0) compare_value(model_->at(position), value);
+    if (position < 0) ++model_->cursor;
+    compare_value(position, value);
   }
-  void next_def() {
-    const std::int32_t position = next();
-    DefBuffers out = buffers_for(position);
-    expect(TEV8R1_PF_get_next_param_def(list_name(), &out.c), position < 0 ? PF_NOMORE : PF_NORMAL);
+  // One operation delivers the definition at a position, or refuses where there is none.
+  template <class Operation>
+  void deliver(std::int32_t position, TEVPF_STATUS refusal, const Operation& operation) {
+    const Def def = position < 0 ? Def{} : model_->at(position);
+    DefBuffers out(value_size(def), desc_size(def));
+    expect(operation(&out.c), position < 0 ? refusal : PF_NORMAL);
     if (position >= 0) compare_delivered(position, out);
   }
+  void next_def() {
+    deliver(next(), PF_NOMORE,
+            [&](auto* out) { return TEV8R1_PF_get_next_param_def(list_name(), out); });
+  }
   void previous_def() {
-    const bool none = model_->cursor <= 0 || model_->params.empty();
-    const std::int32_t position = none ? -1 : std::min(model_->cursor, model_->count()) - 1;
-    DefBuffers out = buffers_for(position);
-    expect(TEV8R1_PF_get_prev_param_def(list_name(), &out.c), none ? PF_NOMORE : PF_NORMAL);
-    if (!none) compare_delivered(position, out);
+    deliver(std::min(std::max(model_->cursor, 0), model_->count()) - 1, PF_NOMORE,
+            [&](auto* out) { return TEV8R1_PF_get_prev_param_def(list_name(), out); });
   }
   void def_by_name() {
     const std::string name = known_name();
-    const std::int32_t position = find_in_model(name);
-    DefBuffers out = buffers_for(position);
-    const TEVPF_STATUS actual = TEV8R1_PF_get_param_def(list_name(), name.c_str(), &out.c);
-    expect(actual, find(name) < 0 ? PF_NOPARAM : PF_NORMAL);
-    if (position >= 0) compare_delivered(position, out);
+    deliver(find(name), PF_NOPARAM,
+            [&](auto* out) { return TEV8R1_PF_get_param_def(list_name(), name.c_str(), out); });
   }
-  TEVPF_STATUS check_position(std::int32_t position) {
-    if (position >= 0 && position < model_->count()) return PF_NORMAL;
-    return refuse(PF_BADPOS, std::to_string(position), std::to_string(model_->count()));
+  // The position if there is a parameter at it; -1.
+  std::int32_t inside(std::int32_t position) {
+    if (position >= 0 && position < model_->count()) return position;
+    refuse(PF_BADPOS, std::to_string(position), std::to_string(model_->count()));
+    return -1;
   }
   void def_by_position() {
     const std::int32_t position = any_position();
-    DefBuffers out = buffers_for(position);
-    const TEVPF_STATUS expected = check_position(position);
-    expect(TEV8R1_PF_get_param_def_by_pos(list_name(), position, &out.c), expected);
-    if (expected == PF_NORMAL) compare_delivered(position, out);
+    deliver(inside(position), PF_BADPOS,
+            [&](auto* out) { return TEV8R1_PF_get_param_def_by_pos(list_name(), position, out); });
   }
   void sizes() {
     std::int32_t type = -1, value = -1, description = -1;
     const std::string name = known_name();
     std::int32_t position = any_position();
+    TEVPF_STATUS actual, refusal;
     if (chance(3)) {
       position = find(name);
-      expect(TEV8R1_PF_inq_param_size(list_name(), name.c_str(), &type, &value, &description),
-             position < 0 ? PF_NOPARAM : PF_NORMAL);
+      refusal = PF_NOPARAM;
+      actual = TEV8R1_PF_inq_param_size(list_name(), name.c_str(), &type, &value, &description);
     } else if (chance(2)) {
-      const TEVPF_STATUS expected = check_position(position);
-      expect(TEV8R1_PF_inq_param_size_by_pos(list_name(), position, &type, &value, &description),
-             expected);
-      if (expected != PF_NORMAL) position = -1;
+      refusal = PF_BADPOS;
+      actual = TEV8R1_PF_inq_param_size_by_pos(list_name(), position, &type, &value, &description);
+      position = inside(position);
     } else {
       position = next();
-      expect(TEV8R1_PF_inq_next_param_size(list_name(), &type, &value, &description),
-             position < 0 ? PF_NOMORE : PF_NORMAL);
+      refusal = PF_NOMORE;
+      actual = TEV8R1_PF_inq_next_param_size(list_name(), &type, &value, &description);
     }
+    expect(actual, position < 0 ? refusal : PF_NORMAL);
     EXPECT_EQ(type, position < 0 ? -1 : model_->at(position).type);
     EXPECT_EQ(value, position < 0 ? -1 : value_size(model_->at(position)));
     EXPECT_EQ(description, position < 0 ? -1 : desc_size(model_->at(position)));

@@ -1,10 +1,10 @@
 // Parameter definitions as values that tests can hold and compare.
 #pragma once
 
+#include <cstdio>
 #include <cstdlib>
 #include <cstring>
 #include <optional>
-#include <sstream>
 #include <string>
 #include <vector>
 
@@ -46,20 +46,20 @@ inline TEVPF_PARAM_DEF to_c(const Def& def) {
 
 // All that a definition says, to be compared; an absent description differs from an empty one.
 inline std::string text_of(const TEVPF_PARAM_DEF& c) {
-  std::ostringstream out;
-  out << c.name << ": type " << c.type << ", units " << c.units << ", "
-      << (c.description == nullptr ? "not described" : "description " + std::string(c.description));
+  char part[200] = "";
   if (c.type == PF_TYPE_STRING) {
-    out << ", '" << c.part.str.value << "' of length " << c.part.str.length;
+    std::snprintf(part, sizeof part, "'%s' of length %d", c.part.str.value, c.part.str.length);
   } else {
     tevpf::with_number(c.type, [&](auto tag) {
-      const auto& part = tevpf::number_part<decltype(tag)>(c);
-      out << std::hexfloat << ", " << double(part.value) << " in [" << double(part.min) << ", "
-          << double(part.max) << "]";
-      if constexpr (tevpf::kIsFloating<decltype(tag)>) out << ", precision " << part.precision;
+      const auto& number = tevpf::number_part<decltype(tag)>(c);
+      int precision = 0;
+      if constexpr (tevpf::kIsFloating<decltype(tag)>) precision = number.precision;
+      std::snprintf(part, sizeof part, "%a in [%a, %a], precision %d", double(number.value),
+                    double(number.min), double(number.max), precision);
     });
   }
-  return out.str();
+  return std::string(c.name) + ": type " + std::to_string(c.type) + ", " + part + ", units " +
+         c.units + (c.description == nullptr ? "" : ", description " + std::string(c.description));
 }
 inline std::string text_of(const Def& def) { return text_of(to_c(def)); }
 
