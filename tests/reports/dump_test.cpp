@@ -10,13 +10,9 @@ namespace {
 
 using Dump = ReportTest;
 
-Def text(std::string name, std::string value, std::optional<std::string> description = {},
-         std::string units = "") {
-  return {.type = PF_TYPE_STRING,
-          .name = name,
-          .units = units,
-          .description = description,
-          .text = value};
+Def text(const char* name, const std::string& value, std::optional<std::string> description = {},
+         const char* units = "") {
+  return {PF_TYPE_STRING, name, units, description, 0, 0, 0, 0, value};
 }
 
 TEST_F(Dump, AFileWithAllKindsOfLists) {
@@ -162,34 +158,26 @@ TEST_F(Dump, LinesBeyond31BitsAreRefused) {
   EXPECT_EQ(status_, PF_NOMEM);
 }
 
-// Precisions that no definition operation would refuse, and widths smaller than any number.
-TEST_F(Dump, NumbersOfAnyPrecisionFitTheirLines) {
-  define(
-      {col("a", kDouble, 1, {-1e308, 1e308, INT32_MAX}), col("b", kReal, 1, {-1e38, 1e38, 1100})});
-  add_rows({{"1e308", "1e38"},
-            {"-1e308", "-1e38"},
-            {"-2.2250738585072019e-308", "1e-50"},
-            {"1e-5", "1e-5"}});
-  char text[2400];
-  std::string expected;
-  for (std::int32_t n = 0; n < table().num_rows; ++n) {
-    const unsigned char* const at = row_at(table(), n);
-    std::snprintf(text, sizeof text, " %1.1100g  %1.1100g\n", load<double>(at),
-                  static_cast<double>(load<float>(at + column(1).offset)));
-    expected += text;
-  }
-  EXPECT_EQ(data_of(dump_table()), ".a  b\n.----\n\n" + expected);
-}
-
-// Every character doubled, in the widest text that its column takes.
-TEST_F(Dump, EscapedTextsFitTheirLines) {
-  define({col("a", kText, 100)});
+// Precisions that no definition operation would refuse, widths smaller than any number, and a text of
+// which every character is doubled.
+TEST_F(Dump, TheWidestValuesFitTheirLines) {
+  define({col("a", kDouble, 1, {-1e308, 1e308, INT32_MAX}), col("b", kReal, 1, {-1e38, 1e38, 1100}),
+          col("c", kText, 100)});
   const std::string tabs(100, '\t');
-  add_rows({{tabs.c_str()}});
-  std::string doubled;
+  std::string doubled, expected;
   for (int n = 0; n < 100; ++n) doubled += "\\t";
-  EXPECT_TRUE(dump_table().ends_with("\n\n " + doubled + "\n"));
-  EXPECT_TRUE(listing({"a"}).ends_with("\n\n " + doubled + "\n"));
+  add_rows({{"1e308", "1e38", tabs.c_str()},
+            {"-1e308", "-1e38", tabs.c_str()},
+            {"-2.2250738585072019e-308", "1e-5", tabs.c_str()}});
+  for (std::int32_t n = 0; n < 3; ++n) {
+    char text[2400];
+    const unsigned char* const at = row_at(table(), n);
+    std::snprintf(text, sizeof text, " %1.1100g  %1.1100g  ", load<double>(at),
+                  static_cast<double>(load<float>(at + column(1).offset)));
+    expected += text + doubled + '\n';
+  }
+  EXPECT_TRUE(dump_table().ends_with("\n\n" + expected));
+  EXPECT_TRUE(listing({"c"}).ends_with("\n " + doubled + "\n"));
 }
 
 }  // namespace

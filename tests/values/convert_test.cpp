@@ -4,6 +4,7 @@
 #include <climits>
 #include <cstring>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "include/tevpf.h"
@@ -148,29 +149,16 @@ TEST(Convert, SizesAndWrongTypes) {
 
 TEST(TextCompare, BytesAndPrefixes) {
   const struct {
-    const char *text, *pattern;
     TEVPF_STATUS order;
-  } cases[] = {{"", "", PF_NORMAL},
-               {"A", "", 1},
-               {"", "A", kLess},
-               {"AB", "ABC", kLess},
-               {"ABC", "AB", 1},
-               {"\x80", "z", 1},
-               {"a", "\xff", kLess},
-               {"ABCD", "AB*", PF_NORMAL},
-               {"AB", "AB*", PF_NORMAL},
-               {"A", "AB*", kLess},
-               {"AC", "AB*", 1},
-               {"", "*", PF_NORMAL},
-               {"x", "*", PF_NORMAL},
-               {"B1X", "B*X", 1},
-               {"B*X", "B*X", PF_NORMAL},
-               {"A*", "A**", kLess},
-               {"A**", "A**", PF_NORMAL},
-               {"A*B", "A*", PF_NORMAL},
-               {"\xe9\x80", "\xe9*", PF_NORMAL}};
+    std::vector<std::pair<const char*, const char*>> pairs;
+  } cases[] = {{kLess, {{"", "A"}, {"AB", "ABC"}, {"a", "\xff"}, {"A", "AB*"}, {"A*", "A**"}}},
+               {PF_NORMAL, {{"", ""}, {"ABCD", "AB*"}, {"AB", "AB*"}, {"", "*"}, {"x", "*"}}},
+               {PF_NORMAL, {{"B*X", "B*X"}, {"A**", "A**"}, {"A*B", "A*"}, {"\xe9\x80", "\xe9*"}}},
+               {1, {{"A", ""}, {"ABC", "AB"}, {"\x80", "z"}, {"AC", "AB*"}, {"B1X", "B*X"}}}};
   for (const auto& c : cases) {
-    EXPECT_EQ(TEV8R1_string_compare(c.text, c.pattern), c.order) << c.text << " : " << c.pattern;
+    for (const auto& [text, pattern] : c.pairs) {
+      EXPECT_EQ(TEV8R1_string_compare(text, pattern), c.order) << text << " : " << pattern;
+    }
   }
 }
 
