@@ -4,7 +4,6 @@
 #include <cfloat>
 #include <charconv>
 #include <cmath>
-#include <cstdarg>
 #include <cstdio>
 #include <cstdlib>
 #include <cstring>
@@ -95,21 +94,16 @@ TEVPF_STATUS convert_into(void* destination, const char* text,
   return PF_NORMAL;
 }
 
-// Formats with the caller's format, which takes exactly the argument behind it; gives the length.
-std::int32_t print(char* destination, const char* format, ...) noexcept {
-  std::va_list arguments;
-  va_start(arguments, format);
-  std::va_list again;
-  va_copy(again, arguments);
-  const int length = std::vsnprintf(nullptr, 0, format, arguments);
-  if (length > 0) {
-    std::vsnprintf(destination, static_cast<std::size_t>(length) + 1, format, again);
-  } else {  // a format that fails writes nothing
+// Formats with the caller's format, which takes exactly this argument; gives the length.
+template <class Argument>
+std::int32_t print(char* destination, const char* format, Argument argument) noexcept {
+  const int length = std::snprintf(nullptr, 0, format, argument);
+  if (length <= 0) {  // a format that fails writes nothing
     *destination = '\0';
+    return 0;
   }
-  va_end(again);
-  va_end(arguments);
-  return length > 0 ? length : 0;
+  std::snprintf(destination, static_cast<std::size_t>(length) + 1, format, argument);
+  return length;
 }
 
 std::int32_t text_from_string(const char* format, const char* value, char* destination) noexcept {
