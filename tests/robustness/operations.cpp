@@ -15,6 +15,7 @@
 #include "reports/row_text.h"
 #include "reports/table_dump.h"
 #include "reports/table_listing.h"
+#include "support/definitions.h"
 #include "support/error_texts.h"
 #include "tables/column_index.h"
 #include "tables/column_record.h"
@@ -56,34 +57,15 @@ constexpr std::int32_t kRows = 9;
 
 // A definition from its numbers: type, value, max, min, precision or length.
 TEVPF_PARAM_DEF param(const char* name, Numbers n) {
-  TEVPF_PARAM_DEF def{};
-  std::strcpy(def.name, name);
-  def.type = n[0];
-  def.description = long_text;
-  if (def.type == PF_TYPE_INT) def.part.i32 = {n[1], n[2], n[3]};
-  if (def.type == PF_TYPE_REAL) def.part.f32 = {n[4], float(n[1]), float(n[2]), float(n[3])};
-  if (def.type == PF_TYPE_STRING) def.part.str = {n[4], long_text};
-  if (def.type == PF_TYPE_DOUBLE) def.part.f64 = {n[4], double(n[1]), double(n[2]), double(n[3])};
-  if (def.type == PF_TYPE_SHORT) {
-    def.part.i16 = {std::int16_t(n[1]), std::int16_t(n[2]), std::int16_t(n[3])};
-  }
-  return def;
+  return tevpf::param(name, n[0], n[1], {double(n[3]), double(n[2]), n[4]}, long_text);
 }
 
 // The same for columns: type, width, max, min, precision, idx_flag, unq_flag.
 TEVPF_COL_DEF column(const char* name, Numbers n) {
-  TEVPF_COL_DEF def{};
-  std::strcpy(def.name, name);
-  def.description = long_text;
-  def.type = n[0];
-  def.width = n[1];
+  TEVPF_COL_DEF def = tevpf::col(name, n[0], n[1], {double(n[3]), double(n[2]), n[4]});
   def.idx_flag = std::int8_t(n[5]);
   def.unq_flag = std::int8_t(n[6]);
-  if (def.type == PF_TYPE_INT) def.limits.i32 = {n[2], n[3]};
-  if (def.type == PF_TYPE_REAL) def.limits.f32 = {float(n[2]), float(n[3]), n[4]};
-  if (def.type == PF_TYPE_DOUBLE) def.limits.f64 = {double(n[2]), double(n[3]), n[4]};
-  if (def.type == PF_TYPE_SHORT) def.limits.i16 = {std::int16_t(n[2]), std::int16_t(n[3])};
-  return def;
+  return tevpf::described(def, long_text);
 }
 
 // A row that fits the tables; its text has no terminator.

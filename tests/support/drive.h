@@ -17,5 +17,9 @@ inline void require(bool truth, const char* what) {
   if (!truth) throw std::logic_error(what);
 }
 
+// The current file, saved under another name in the folder, is read back whole and saved to the same
+// bytes. False when it cannot be saved: an unknown type was loaded half-way.
+bool save_and_compare(const std::string& folder);
+
 // Reports, saves, opens and compares what the current file holds, before and after the changes.
 void drive_current_file(const std::string& folder, Choices choose);

@@ -1,10 +1,10 @@
-// Column definitions, and a table "t" in a new file; each look at it checks its invariants.
+// A table "t" in a new file; each look at it checks its invariants.
 #pragma once
 
-#include <cstring>
 #include <string>
 #include <vector>
 
+#include "support/definitions.h"
 #include "support/temp_file.h"
 #include "tables/column_index.h"
 #include "tables/row_store.h"
@@ -12,41 +12,6 @@
 #define ASSERT_OK(expr) ASSERT_EQ(expr, PF_NORMAL)
 
 namespace tevpf {
-
-inline constexpr std::int32_t kInt = PF_TYPE_INT, kReal = PF_TYPE_REAL, kText = PF_TYPE_STRING,
-                              kDouble = PF_TYPE_DOUBLE, kShort = PF_TYPE_SHORT;
-
-struct Bounds {
-  double min = -1000, max = 1000;
-  std::int32_t precision = 6;
-};
-
-inline TEVPF_COL_DEF col(const char* name, std::int32_t type, std::int32_t width = 6,
-                         Bounds bounds = {}) {
-  TEVPF_COL_DEF def{};
-  def.type = type;
-  std::strncpy(def.name, name, sizeof def.name - 1);
-  def.width = width;
-  if (!is_number_type(type)) return def;
-  with_number(type, [&](auto tag) {
-    using T = decltype(tag);
-    limits_of<T>(def).min = static_cast<T>(bounds.min);
-    limits_of<T>(def).max = static_cast<T>(bounds.max);
-    if constexpr (kIsFloating<T>) limits_of<T>(def).precision = bounds.precision;
-  });
-  return def;
-}
-
-inline TEVPF_COL_DEF indexed(TEVPF_COL_DEF def, bool unique = false) {
-  def.idx_flag = 1;
-  def.unq_flag = unique;
-  return def;
-}
-
-inline TEVPF_COL_DEF described(TEVPF_COL_DEF def, const char* text) {
-  def.description = const_cast<char*>(text);
-  return def;
-}
 
 class TableTest : public TempFileTest {
  protected:

@@ -58,7 +58,9 @@ class LibraryTest : public testing::Test {
     TEV8R1_PF_init();
     set_error_texts();
   }
-  ~LibraryTest() override {
+  ~LibraryTest() override { close_all(); }
+
+  static void close_all() {
     while (TEV8R1_PF_close(0) == PF_NORMAL) {
     }
     TEV8R1_PF_set_memory_allocation(0, 0);
