@@ -15,8 +15,7 @@
 #include "reports/row_text.h"
 #include "reports/table_dump.h"
 #include "reports/table_listing.h"
-#include "support/definitions.h"
-#include "support/error_texts.h"
+#include "support/param_def.h"
 #include "tables/column_index.h"
 #include "tables/column_record.h"
 #include "tables/columns.h"
@@ -57,7 +56,10 @@ constexpr std::int32_t kRows = 9;
 
 // A definition from its numbers: type, value, max, min, precision or length.
 TEVPF_PARAM_DEF param(const char* name, Numbers n) {
-  return tevpf::param(name, n[0], n[1], {double(n[3]), double(n[2]), n[4]}, long_text);
+  static Def def;
+  def = {n[0],         name,         "",   long_text, double(n[1]),
+         double(n[2]), double(n[3]), n[4], long_text, n[4]};
+  return to_c(def);
 }
 
 // The same for columns: type, width, max, min, precision, idx_flag, unq_flag.

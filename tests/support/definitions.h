@@ -1,4 +1,4 @@
-// Definitions of parameters and columns from their numbers.
+// Definitions of columns, and the numbers in definitions.
 #pragma once
 
 #include <cstdint>
@@ -17,10 +17,10 @@ struct Bounds {
   std::int32_t precision = 6;
 };
 
-// Puts numbers into the part of a parameter or the limits of a column.
+// Fills the part of a parameter or the limits of a column; an integer keeps the low bits of what it
+// cannot hold.
 template <class T, class Part>
 void put_numbers(Part& part, Bounds bounds, [[maybe_unused]] double value = 0) {
-  // An integer keeps the low bits of what it cannot hold.
   using Wide = std::conditional_t<kIsFloating<T>, double, std::int64_t>;
   part.max = static_cast<T>(static_cast<Wide>(bounds.max));
   part.min = static_cast<T>(static_cast<Wide>(bounds.min));
@@ -35,8 +35,7 @@ inline TEVPF_COL_DEF col(const char* name, std::int32_t type, std::int32_t width
   std::strncpy(def.name, name, sizeof def.name - 1);
   def.width = width;
   if (!is_number_type(type)) return def;
-  with_number(type,
-              [&](auto tag) { put_numbers<decltype(tag)>(limits_of<decltype(tag)>(def), bounds); });
+  with_number(type, [&](auto t) { put_numbers<decltype(t)>(limits_of<decltype(t)>(def), bounds); });
   return def;
 }
 
@@ -48,21 +47,6 @@ inline TEVPF_COL_DEF indexed(TEVPF_COL_DEF def, bool unique = false) {
 
 inline TEVPF_COL_DEF described(TEVPF_COL_DEF def, const char* text) {
   def.description = const_cast<char*>(text);
-  return def;
-}
-
-// A parameter with a description; a string has that text as its value too, as long as `precision`.
-inline TEVPF_PARAM_DEF param(const char* name, std::int32_t type, double value, Bounds bounds,
-                             char* text) {
-  TEVPF_PARAM_DEF def{};
-  def.type = type;
-  std::strncpy(def.name, name, sizeof def.name - 1);
-  def.description = text;
-  if (type == kText) def.part.str = {bounds.precision, text};
-  if (!is_number_type(type)) return def;
-  with_number(type, [&](auto tag) {
-    put_numbers<decltype(tag)>(number_part<decltype(tag)>(def), bounds, value);
-  });
   return def;
 }
 

@@ -11,8 +11,8 @@
 
 #include "core/file.h"
 #include "core/library.h"
-#include "support/definitions.h"
 #include "support/list_check.h"
+#include "support/param_def.h"
 #include "support/table_check.h"
 
 std::uint8_t Choices::next() {
@@ -85,14 +85,16 @@ void read_table(const TEVPF_TABLE& info) {
 }
 
 TEVPF_PARAM_DEF some_param(Choices& choose) {
-  static char text[] = "text with\ttab";
-  const std::int32_t type = PF_TYPE_INT + choose.next() % 6;
-  const std::string name = "p" + std::to_string(choose.next() % 8);
-  const bool described = choose.next() % 2 != 0;
-  const int value = type < PF_TYPE_SHORT && type != PF_TYPE_STRING ? choose.next() : 0;
-  TEVPF_PARAM_DEF def = tevpf::param(name.c_str(), type, value, {-1, 300, 1}, text);
-  if (!described) def.description = nullptr;
-  return def;
+  static Def def;
+  def = {.type = PF_TYPE_INT + choose.next() % 6,
+         .name = "p" + std::to_string(choose.next() % 8),
+         .max = 300,
+         .min = -1,
+         .precision = 1,
+         .text = "text with\ttab"};
+  if (choose.next() % 2 != 0) def.description = "what it is";
+  if (def.type < PF_TYPE_SHORT && def.type != PF_TYPE_STRING) def.value = choose.next();
+  return to_c(def);
 }
 
 TEVPF_COL_DEF some_column(Choices& choose) {

@@ -8,8 +8,7 @@
 #include <string>
 #include <vector>
 
-#include "include/tevpf.h"
-#include "values/value_type.h"
+#include "support/definitions.h"
 
 struct Def {
   std::int32_t type = PF_TYPE_INT;
@@ -31,14 +30,10 @@ inline TEVPF_PARAM_DEF to_c(const Def& def) {
   if (def.description) c.description = const_cast<char*>(def.description->c_str());
   if (def.type == PF_TYPE_STRING) {
     c.part.str = {def.length, const_cast<char*>(def.text.c_str())};
-  } else {
+  } else if (tevpf::is_number_type(def.type)) {
     tevpf::with_number(def.type, [&](auto tag) {
       using T = decltype(tag);
-      auto& part = tevpf::number_part<T>(c);
-      part.value = static_cast<T>(def.value);
-      part.max = static_cast<T>(def.max);
-      part.min = static_cast<T>(def.min);
-      if constexpr (tevpf::kIsFloating<T>) part.precision = def.precision;
+      tevpf::put_numbers<T>(tevpf::number_part<T>(c), {def.min, def.max, def.precision}, def.value);
     });
   }
   return c;

@@ -14,9 +14,9 @@
 #include "support/list_check.h"
 #include "support/table_check.h"
 
-template <class T>
-void put(std::string& all, const T& value) {
-  all.append(reinterpret_cast<const char*>(&value), sizeof value);
+template <class... T>
+void put(std::string& all, const T&... values) {
+  (all.append(reinterpret_cast<const char*>(&values), sizeof values), ...);
 }
 
 template <class Definition>
@@ -26,8 +26,7 @@ void put_definitions(std::string& all, const Definition* five) {
     if (def.description != nullptr) all += def.description;
     def.description = nullptr;
     if constexpr (std::is_same_v<Definition, TEVPF_PARAM_DEF>) {
-      if (def.type == PF_TYPE_STRING) all += def.part.str.value;
-      if (def.type == PF_TYPE_STRING) def.part.str.value = nullptr;
+      if (def.type == PF_TYPE_STRING) all += std::exchange(def.part.str.value, nullptr);
     }
     put(all, def);
   }
@@ -44,38 +43,32 @@ inline void put_stored(std::string& all, const TEVPF_FILE& file) {
 }
 
 inline void put_table(std::string& all, const TEVPF_TABLE& table) {
-  const int search = table.cur_col == nullptr ? -1 : int(table.cur_col - table.col_array);
-  for (const int n : {table.dsp_wid, table.next_row, table.cur_row, search}) put(all, n);
-  for (std::int32_t i = 0; i < table.num_cols; ++i) {
-    all += table.col_array[i].format;
-    put(all, table.col_array[i].tolerance);
+  put(all, table.dsp_wid, table.next_row, table.cur_row);
+  for (const TEVPF_COLUMN& column : std::span(table.col_array, table.num_cols)) {
+    all += column.format;
+    put(all, column.tolerance, &column == table.cur_col);
   }
-  if (table.dft_row != nullptr) {
-    all.append(reinterpret_cast<const char*>(table.dft_row), std::size_t(table.row_wid));
-  }
+  if (table.dft_row != nullptr) all.append(table.dft_row, table.dft_row + table.row_wid);
   put_definitions(all, table.col_dft);
 }
 
 inline std::string snapshot(bool with_spare_slots) {
   const tevpf::Library& library = tevpf::library;
   std::string all;
-  for (const int n :
-       {library.num_files, library.interactive, library.alloc_initial, library.alloc_increment}) {
-    put(all, n);
-  }
+  put(all, library.num_files, library.interactive, library.alloc_initial, library.alloc_increment);
   if (library.current_file != nullptr) all += library.current_file->file_name;
   for (const TEVPF_FILE* f = library.first_file; f != nullptr; f = f->next_file) {
     all += f->file_name;
     put(all, f->read_only);
     put_stored(all, *f);
-    for (const TEVPF_LIST* list : std::span(f->list_ptr, std::size_t(f->num_lists))) {
+    for (const TEVPF_LIST* list : std::span(f->list_ptr, f->num_lists)) {
       put(all, list->cur_param);
       put_definitions(all, list->dft_ptr);
       if (with_spare_slots) put(all, list->free_params);
     }
-    for (const TEVPF_TABLE* table : std::span(f->table_ptr, std::size_t(f->num_tables))) {
+    for (const TEVPF_TABLE* table : std::span(f->table_ptr, f->num_tables)) {
       put_table(all, *table);
-      if (with_spare_slots) put(all, table->free_rows * 0x10000 + table->free_cols);
+      if (with_spare_slots) put(all, table->free_rows, table->free_cols);
     }
   }
   return all;
@@ -84,13 +77,13 @@ inline std::string snapshot(bool with_spare_slots) {
 // The first broken rule of each list and table.
 inline std::string broken_rules() {
   std::string all;
+  const auto note = [&](const char* rule) {
+    all += rule == nullptr ? "" : rule + std::string("; ");
+  };
   for (const TEVPF_FILE* f = tevpf::library.first_file; f != nullptr; f = f->next_file) {
-    for (const TEVPF_LIST* list : std::span(f->list_ptr, std::size_t(f->num_lists))) {
-      if (const char* rule = broken_rule(*list)) all += std::string(rule) + "; ";
-    }
-    for (const TEVPF_TABLE* table : std::span(f->table_ptr, std::size_t(f->num_tables))) {
-      if (const char* rule = tevpf_test::broken_rule(*table)) all += std::string(rule) + "; ";
-    }
+    for (const TEVPF_LIST* list : std::span(f->list_ptr, f->num_lists)) note(broken_rule(*list));
+    for (const TEVPF_TABLE* table : std::span(f->table_ptr, f->num_tables))
+      note(tevpf_test::broken_rule(*table));
   }
   return all;
 }
