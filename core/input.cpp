@@ -15,6 +15,7 @@ constexpr std::uint64_t kMaxRead = std::uint64_t{1} << 30;       // fits size_t 
 
 bool Input::read_ahead() noexcept {
   buffer_ = new_array<unsigned char>(kReadAhead);
+  room_ = kReadAhead;
   next_ = end_ = buffer_.get();
   return buffer_ != nullptr;
 }
@@ -34,7 +35,8 @@ std::uint64_t Input::read(void* to, std::uint64_t count) noexcept {
   auto* place = static_cast<unsigned char*>(to);
   std::uint64_t done = 0;
   for (;;) {
-    const auto part = static_cast<std::size_t>(std::min<std::uint64_t>(buffered(), count - done));
+    const auto part =
+        static_cast<std::size_t>(std::min(static_cast<std::uint64_t>(buffered()), count - done));
     if (part != 0) std::memcpy(place + done, next_, part);
     next_ += part;
     done += part;
@@ -52,7 +54,25 @@ Input::Claim Input::weigh(std::uint64_t bytes) const noexcept {
   if (bytes <= kSmallClaim) return Claim::kFits;
   const std::int64_t left = stream_bytes_left(stream_);
   if (left < 0) return Claim::kUnknown;
-  return bytes <= static_cast<std::uint64_t>(left) + buffered() ? Claim::kFits : Claim::kTooLarge;
+  return bytes <= static_cast<std::uint64_t>(left + buffered()) ? Claim::kFits : Claim::kTooLarge;
+}
+
+Input::Got Input::fetch_more() noexcept {
+  const auto kept = static_cast<std::size_t>(buffered());
+  if (kept != 0) std::memmove(buffer_.get(), next_, kept);
+  next_ = buffer_.get();
+  end_ = next_ + kept;
+  if (kept == room_) {
+    void* const larger = heap_resize(buffer_.get(), room_ * 2, 1);
+    if (larger == nullptr) return Got::kNoMemory;
+    (void)buffer_.release();
+    buffer_.reset(static_cast<unsigned char*>(larger));
+    room_ *= 2;
+    next_ = buffer_.get();
+  }
+  const std::uint64_t got = read_stream(buffer_.get() + kept, room_ - kept);
+  end_ = next_ + kept + got;
+  return got != 0 ? Got::kAll : Got::kPart;
 }
 
 Input::Got Input::read_block(std::uint64_t bytes, Owned<unsigned char>& out) noexcept {
@@ -74,14 +94,6 @@ Input::Got Input::read_block(std::uint64_t bytes, Owned<unsigned char>& out) noe
   }
   out = std::move(block);
   return Got::kAll;
-}
-
-const char* ByteReader::take_text() noexcept {
-  const void* terminator = std::memchr(next_, '\0', static_cast<std::size_t>(left()));
-  if (terminator == nullptr) return nullptr;
-  const auto* text = reinterpret_cast<const char*>(next_);
-  next_ = static_cast<const unsigned char*>(terminator) + 1;
-  return text;
 }
 
 }  // namespace tevpf

@@ -23,6 +23,11 @@ class Input {
   // Reads up to `count` bytes and gives their number: fewer only at the end of the stream.
   [[nodiscard]] std::uint64_t read(void* to, std::uint64_t count) noexcept;
 
+  // What is read ahead and not yet read.
+  const unsigned char* unread() const noexcept { return next_; }
+  std::int64_t buffered() const noexcept { return end_ - next_; }
+  void skip(std::int64_t count) noexcept { next_ += count; }
+
   // True when the stream ended by an error.
   [[nodiscard]] bool has_failed() const noexcept { return std::ferror(stream_) != 0; }
 
@@ -35,41 +40,20 @@ class Input {
 
   enum class Got { kAll, kPart, kNoMemory };
 
+  // Reads further ahead, into a larger buffer when this one is full. kPart: the stream has ended.
+  [[nodiscard]] Got fetch_more() noexcept;
+
   // Reads a block of so many bytes, allocated as far as the stream holds them.
   [[nodiscard]] Got read_block(std::uint64_t bytes, Owned<unsigned char>& out) noexcept;
 
  private:
-  std::size_t buffered() const noexcept { return static_cast<std::size_t>(end_ - next_); }
   std::uint64_t read_stream(unsigned char* to, std::uint64_t count) noexcept;
 
   std::FILE* stream_;
   Owned<unsigned char> buffer_;
+  std::uint64_t room_ = 0;
   const unsigned char* next_ = nullptr;  // what is read ahead
   const unsigned char* end_ = nullptr;
-};
-
-// The bytes of a body: takes parts off its front and never goes beyond its end.
-class ByteReader {
- public:
-  ByteReader(const void* bytes, std::int32_t count) noexcept
-      : next_(static_cast<const unsigned char*>(bytes)), end_(next_ + count) {}
-
-  std::int64_t left() const noexcept { return end_ - next_; }
-
-  // The next `count` bytes; null when there are not so many.
-  [[nodiscard]] const unsigned char* take(std::int64_t count) noexcept {
-    if (count < 0 || count > left()) return nullptr;
-    const unsigned char* part = next_;
-    next_ += count;
-    return part;
-  }
-
-  // A text with its terminator; null when there is none before the end.
-  [[nodiscard]] const char* take_text() noexcept;
-
- private:
-  const unsigned char* next_;
-  const unsigned char* end_;
 };
 
 }  // namespace tevpf

@@ -15,95 +15,127 @@ namespace tevpf {
 
 namespace {
 
-Parsed parse_string_value(ByteReader& body, TEVPF_PARAM_DEF& def) noexcept {
+constexpr std::size_t kTypePlace = stored_place(kParamFields, offsetof(TEVPF_PARAM, def.type));
+
+// Takes the value of a string, whose length stands in `def`, and the terminator behind it.
+Parsed parse_string_value(ByteReader& bytes, TEVPF_PARAM_DEF& def) noexcept {
   const std::int32_t length = def.part.str.length;
-  const unsigned char* text = length < 0 ? nullptr : body.take(std::int64_t{length} + 1);
-  if (text == nullptr) return Parsed::kBroken;
-  const void* terminator = std::memchr(text, '\0', static_cast<std::size_t>(length) + 1);
-  if (terminator == nullptr) return Parsed::kBroken;
+  if (length < 0) return Parsed::kBroken;
+  const unsigned char* text = bytes.take(std::int64_t{length} + 1);
+  if (text == nullptr) return Parsed::kCutOff;
   // A terminator before the stated length ends the value.
-  const std::ptrdiff_t real_length = static_cast<const unsigned char*>(terminator) - text;
-  def.part.str.length = static_cast<std::int32_t>(real_length);
-  def.part.str.value = const_cast<char*>(reinterpret_cast<const char*>(text));
+  ByteReader value(text, std::int64_t{length} + 1);
+  def.part.str.value = const_cast<char*>(value.take_text());
+  if (def.part.str.value == nullptr) return Parsed::kBroken;
+  def.part.str.length = length - static_cast<std::int32_t>(value.left());
   return Parsed::kWhole;
 }
 
-// Takes one stored parameter off the body. Its texts are left where they are in the body.
-Parsed parse_param(ByteReader& body, TEVPF_PARAM& param) noexcept {
-  param = {};
-  const unsigned char* fields = body.take(stored_size(kParamFields));
-  if (fields == nullptr) return Parsed::kBroken;
-  unpack<kParamFields>(fields, &param);
-  TEVPF_PARAM_DEF& def = param.def;
-  if (!is_value_type(def.type)) return Parsed::kUnknownType;
-  terminate_field(def.name);
-  terminate_field(def.units);
-
-  const std::int32_t part_bytes = value_type(def.type).param_part;
-  const unsigned char* part = body.take(part_bytes);
-  if (part == nullptr) return Parsed::kBroken;
-  std::memcpy(&def.part, part, static_cast<std::size_t>(part_bytes));
-  if (def.type == PF_TYPE_STRING && parse_string_value(body, def) != Parsed::kWhole) {
-    return Parsed::kBroken;
-  }
+// Takes the description that desc_loc, as it was read, speaks of.
+Parsed parse_description(ByteReader& bytes, TEVPF_PARAM& param, TextSizes& sizes) noexcept {
   if (param.desc_loc == 0) return Parsed::kWhole;
-  def.description = const_cast<char*>(body.take_text());
-  if (def.description == nullptr) return Parsed::kBroken;
+  const std::int64_t before = bytes.left();
+  param.def.description = const_cast<char*>(bytes.take_text());
+  if (param.def.description == nullptr) return Parsed::kCutOff;
+  sizes.description = before - bytes.left();
   // Of a string, any place means that there is one.
-  const std::int8_t place = description_place(def);
-  if (def.type != PF_TYPE_STRING && param.desc_loc != place) return Parsed::kBroken;
+  const std::int8_t place = description_place(param.def);
+  if (param.def.type != PF_TYPE_STRING && param.desc_loc != place) return Parsed::kBroken;
   param.desc_loc = place;
   return Parsed::kWhole;
 }
 
-// The parameters of a body, while their texts still lie in it, and room for their index.
-struct StoredParams {
-  Owned<TEVPF_PARAM> records;
-  Owned<std::int32_t> index;
-  std::int32_t count = 0;
-  std::int32_t known = 0;  // those in front of the first one of an unknown type
-};
+// Takes one stored parameter. Its texts are left where they are.
+Parsed parse_param(ByteReader& bytes, TEVPF_PARAM& param, TextSizes& sizes) noexcept {
+  param = {};
+  sizes = {};
+  const unsigned char* fields = bytes.take(stored_size(kParamFields));
+  if (fields == nullptr) return Parsed::kCutOff;
+  unpack<kParamFields>(fields, &param);
+  TEVPF_PARAM_DEF& def = param.def;
+  // Not from the record: what comes next waits for the type, and the record is still being written.
+  const auto type = load<std::int32_t>(fields + kTypePlace);
+  if (!is_value_type(type)) return Parsed::kUnknownType;
+  terminate_field(def.name);
+  terminate_field(def.units);
+
+  const unsigned char* part = bytes.take(value_type(type).param_part);
+  if (part == nullptr) return Parsed::kCutOff;
+  if (type == PF_TYPE_STRING) {
+    def.part.str.length = load<std::int32_t>(part);
+    const Parsed parsed = parse_string_value(bytes, def);
+    if (parsed != Parsed::kWhole) return parsed;
+    sizes.value = std::int64_t{def.part.str.length} + 1;
+  } else {
+    with_number(type, [&](auto tag) {
+      auto& numbers = number_part<decltype(tag)>(def);
+      std::memcpy(&numbers, part, sizeof numbers);
+    });
+  }
+  return parse_description(bytes, param, sizes);
+}
+
+// The same for the next parameter of a body, of which more is fetched when it goes on behind what is
+// at hand. Leaves the texts until the body is touched again.
+Parsed take_param(Body& body, TEVPF_PARAM& param, TextSizes& sizes) noexcept {
+  for (;;) {
+    ByteReader bytes = body.at_hand();
+    const std::int64_t at_hand = bytes.left();
+    const Parsed parsed = parse_param(bytes, param, sizes);
+    if (parsed == Parsed::kWhole) body.take(at_hand - bytes.left());
+    if (parsed != Parsed::kCutOff) return parsed;
+    const Input::Got got = body.fetch_more();
+    if (got == Input::Got::kPart) return Parsed::kBroken;
+    if (got == Input::Got::kNoMemory) return Parsed::kNoMemory;
+  }
+}
 
 // Takes the parameters off the body, up to the first one of an unknown type, whose size nobody
-// knows. False when they do not fill the body.
-bool parse_records(ByteReader body, StoredParams& params) noexcept {
-  for (; params.known < params.count; ++params.known) {
-    switch (parse_param(body, params.records[static_cast<std::size_t>(params.known)])) {
-      case Parsed::kBroken:
-        return false;
-      case Parsed::kUnknownType:
-        return true;
-      case Parsed::kWhole:
-        break;
-    }
+// knows, and gives them texts of their own. The list counts those it has got, and their bytes.
+Parsed take_params(Body& body, std::int32_t count, TEVPF_LIST& list) noexcept {
+  TextPacker packer;
+  if (!packer.reserve(text_room(body.left(), count), list.texts)) return Parsed::kNoMemory;
+  for (; list.num_params < count; ++list.num_params) {
+    TEVPF_PARAM& param = list.param_ptr[list.num_params];
+    TextSizes sizes;
+    const Parsed parsed = take_param(body, param, sizes);
+    if (parsed != Parsed::kWhole) return parsed;
+    if (!own_texts(param.def, sizes, packer, list.texts)) return Parsed::kNoMemory;
+    list.header.btf += static_cast<std::int32_t>(stored_size(param.def.type, sizes));
   }
-  return body.left() == 0;
+  return body.left() == 0 ? Parsed::kWhole : Parsed::kBroken;
 }
 
-TEVPF_STATUS parse_params(const char* list_name, ByteReader body, std::int32_t count,
-                          StoredParams& params) noexcept {
-  if (count > body.left() / stored_size(kParamFields)) {  // whatever their types
-    return fail(PF_BADFORMAT, list_name);
+// Makes room for the parameters that the body claims, when it can hold so many, and takes them.
+Parsed take_body(Body& body, TEVPF_LIST& list) noexcept {
+  const unsigned char* const fields = body.take_fields(kListHead);
+  if (fields == nullptr) return Parsed::kBroken;
+  TEVPF_LIST head;
+  unpack<kListFields>(fields, &head);
+  std::memcpy(list.RESERVED, head.RESERVED, sizeof list.RESERVED);
+  list.header.btf = kListHead;
+  const std::int32_t count = std::max(head.num_params, 0);
+  if (count > body.left() / stored_size(kParamFields))
+    return Parsed::kBroken;  // whatever their types
+  if (count != 0) {
+    list.param_ptr = new_array<TEVPF_PARAM>(static_cast<std::uint64_t>(count)).release();
+    list.index_ptr = new_array<std::int32_t>(static_cast<std::uint64_t>(count)).release();
+    if (list.param_ptr == nullptr || list.index_ptr == nullptr) return Parsed::kNoMemory;
+    list.param_room = count;
   }
-  params.count = count;
-  if (count > 0) {
-    params.records = new_array<TEVPF_PARAM>(static_cast<std::uint64_t>(count));
-    params.index = new_array<std::int32_t>(static_cast<std::uint64_t>(count));
-    if (!params.records || !params.index) return fail_empty(PF_NOMEM);
-  }
-  return parse_records(body, params) ? PF_NORMAL : fail(PF_BADFORMAT, list_name);
+  return take_params(body, count, list);
 }
 
-// Gives the parameters, as they were parsed, texts of their own and counts them.
-TEVPF_STATUS own_params(TEVPF_LIST& list, std::int32_t known, std::int32_t count) noexcept {
-  while (list.num_params < known) {
-    std::int32_t bytes = 0;
-    PF_TRY(TEV8R1_construct_param(&list.param_ptr[list.num_params], &bytes));
-    list.header.btf += bytes;
-    ++list.num_params;
-  }
-  if (known == count) return PF_NORMAL;
-  return fail(PF_BADTYPE, "parameter", Text(list.param_ptr[known].def.type));
+// Gives what a body held an element of its own. A body that is no list makes none; one that is cut
+// short by an unknown type does.
+TEVPF_STATUS create(Parsed parsed, const TEVPF_LIST& loaded, TEVPF_LIST*& list) noexcept {
+  if (parsed == Parsed::kNoMemory) return fail_empty(PF_NOMEM);
+  if (parsed == Parsed::kBroken) return fail(PF_BADFORMAT, loaded.header.elem_name);
+  PF_TRY(TEV8R1_create_list(loaded.header, &list));
+  const std::int32_t cursor = list->cur_param;
+  *list = loaded;
+  list->cur_param = cursor;
+  return PF_NORMAL;
 }
 
 // Reads the name index; `usable` when it is one.
@@ -118,25 +150,23 @@ TEVPF_STATUS read_name_index(TEVPF_LIST& list, Input& input, bool& usable) noexc
 
 }  // namespace
 
-TEVPF_STATUS build_list(TEVPF_ELEM_HEADER header, const void* body_bytes, Input& input) noexcept {
-  if (header.btf < kListHead) return fail(PF_BADFORMAT, header.elem_name);
-  ByteReader body(body_bytes, header.btf);
-  TEVPF_LIST head;
-  unpack<kListFields>(body.take(kListHead), &head);
-  StoredParams params;
-  PF_TRY(parse_params(header.elem_name, body, std::max(head.num_params, 0), params));
-
-  header.btf = kListHead;
+TEVPF_STATUS build_list(const TEVPF_ELEM_HEADER& header, Body body, Input& input) noexcept {
+  TEVPF_LIST loaded{};
+  loaded.header = header;
+  const Parsed parsed = take_body(body, loaded);
   TEVPF_LIST* list = nullptr;
-  PF_TRY(TEV8R1_create_list(header, &list));
-  std::memcpy(list->RESERVED, head.RESERVED, sizeof list->RESERVED);
-  list->param_ptr = params.records.release();
-  list->index_ptr = params.index.release();
-  list->param_room = params.count;
+  TEVPF_STATUS status = create(parsed, loaded, list);
+  if (status != PF_NORMAL) {
+    release_contents(loaded);
+    return status;
+  }
 
   bool usable_index = false;
-  TEVPF_STATUS status = own_params(*list, params.known, params.count);
-  if (status == PF_NORMAL) status = read_name_index(*list, input, usable_index);
+  if (parsed == Parsed::kWhole) {
+    status = read_name_index(*list, input, usable_index);
+  } else {
+    status = fail(PF_BADTYPE, "parameter", Text(list->param_ptr[list->num_params].def.type));
+  }
   if (!usable_index) sort_names(list->param_ptr, list->num_params, list->index_ptr);
   return status;
 }

@@ -21,6 +21,7 @@ struct Scratch {
   std::int32_t room = 0;
 };
 
+// The body of the element that was announced last, in the scratch block.
 Input::Got read_body(Input& input, std::int32_t bytes, Scratch& scratch) noexcept {
   if (bytes > scratch.room) {
     const Input::Got got = input.read_block(static_cast<std::uint32_t>(bytes), scratch.block);
@@ -37,24 +38,34 @@ TEVPF_STATUS refuse(TEVPF_FILE& file, const TEVPF_ELEM_HEADER& header) noexcept 
   return fail(PF_BADFORMAT, header.elem_name);
 }
 
-TEVPF_STATUS load_element(TEVPF_FILE& file, TEVPF_ELEM_HEADER& header, Input& input,
-                          Scratch& scratch) noexcept {
+// Builds the element whose header was read last.
+TEVPF_STATUS build_element(const TEVPF_ELEM_HEADER& header, Input& input,
+                           Scratch& scratch) noexcept {
   const bool is_list = header.elem_type == PF_ELEM_LIST;
-  if (!is_list && header.elem_type != PF_ELEM_TABLE) {
-    PF_TRY(TEV8R1_check_valid_file(&file));
-    return fail(PF_BADTYPE, {"element", header.elem_name}, Text(header.elem_type));
+  if (header.btf < (is_list ? kListHead : kTableHead)) return fail(PF_BADFORMAT, header.elem_name);
+  // A list can be as long as its file: one that the file does hold is taken as it comes.
+  if (is_list && input.weigh(static_cast<std::uint32_t>(header.btf)) == Input::Claim::kFits) {
+    return build_list(header, Body(input, header.btf), input);
   }
-  if (header.btf < (is_list ? kListHead : kTableHead)) return refuse(file, header);
   switch (read_body(input, header.btf, scratch)) {
     case Input::Got::kPart:
-      return refuse(file, header);
+      return fail(PF_BADFORMAT, header.elem_name);
     case Input::Got::kNoMemory:
       return fail_empty(PF_NOMEM);
     case Input::Got::kAll:
       break;
   }
-  const TEVPF_STATUS status = is_list ? build_list(header, scratch.block.get(), input)
-                                      : build_table(header, scratch.block.get(), input);
+  return is_list ? build_list(header, Body(scratch.block.get(), header.btf), input)
+                 : build_table(header, scratch.block.get(), input);
+}
+
+TEVPF_STATUS load_element(TEVPF_FILE& file, const TEVPF_ELEM_HEADER& header, Input& input,
+                          Scratch& scratch) noexcept {
+  if (header.elem_type != PF_ELEM_LIST && header.elem_type != PF_ELEM_TABLE) {
+    PF_TRY(TEV8R1_check_valid_file(&file));
+    return fail(PF_BADTYPE, {"element", header.elem_name}, Text(header.elem_type));
+  }
+  const TEVPF_STATUS status = build_element(header, input, scratch);
   if (status == PF_BADFORMAT) PF_TRY(TEV8R1_check_valid_file(&file));
   return status;
 }
@@ -94,7 +105,7 @@ TEVPF_STATUS TEV8R1_check_valid_file(TEVPF_FILE* file) noexcept {
 TEVPF_STATUS TEV8R1_format_list(TEVPF_ELEM_HEADER header, const void* body,
                                 std::FILE* stream) noexcept {
   Input input(stream);
-  return build_list(header, body, input);
+  return build_list(header, Body(body, header.btf), input);
 }
 
 TEVPF_STATUS TEV8R1_format_table(TEVPF_ELEM_HEADER header, const void* body,

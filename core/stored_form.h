@@ -10,6 +10,7 @@
 //   behind       list: name index; table: the index of each indexed column, then the rows
 #pragma once
 
+#include <array>
 #include <bit>
 #include <cstddef>
 #include <cstdint>
@@ -74,6 +75,14 @@ constexpr std::int32_t stored_size(const Field (&fields)[N]) noexcept {
   return static_cast<std::int32_t>(bytes);
 }
 
+// Where the field that stands at that place in the record lies in the stored form.
+template <std::size_t N>
+constexpr std::size_t stored_place(const Field (&fields)[N], std::size_t place) noexcept {
+  std::size_t bytes = 0;
+  for (std::size_t i = 0; i < N && fields[i].place != place; ++i) bytes += fields[i].bytes;
+  return bytes;
+}
+
 static_assert(stored_size(kListFields) == kListHead);
 static_assert(stored_size(kTableFields) == kTableHead);
 static_assert(stored_size(kParamFields) == kParamHead);
@@ -81,7 +90,27 @@ static_assert(stored_size(kColumnFields) == kColumnHead);
 
 namespace stored_form {
 
-// Each field is copied with a size known to the compiler.
+// Fields that stand side by side in the record too are one; what is left over at the end is empty.
+template <const auto& Fields>
+constexpr auto joined() noexcept {
+  std::array<Field, std::size(Fields)> runs{};
+  std::size_t last = 0;
+  for (const Field& field : Fields) {
+    Field& run = runs[last];
+    const bool goes_on = field.place != kNowhere && field.place == run.place + run.bytes;
+    if (run.bytes == 0 || goes_on) {
+      run = {run.bytes == 0 ? field.place : run.place, run.bytes + field.bytes};
+    } else {
+      runs[++last] = field;
+    }
+  }
+  return runs;
+}
+
+template <const auto& Fields>
+inline constexpr auto kRuns = joined<Fields>();
+
+// Each run is copied with a size known to the compiler.
 template <const auto& Fields, std::size_t... I>
 void pack(const void* record, unsigned char* out, std::index_sequence<I...>) noexcept {
   const auto* from = static_cast<const unsigned char*>(record);
@@ -104,12 +133,14 @@ void unpack(const unsigned char* in, void* record, std::index_sequence<I...>) no
 // Copies the fields of a record to their stored form, and back.
 template <const auto& Fields>
 void pack(const void* record, unsigned char* out) noexcept {
-  stored_form::pack<Fields>(record, out, std::make_index_sequence<std::size(Fields)>{});
+  stored_form::pack<stored_form::kRuns<Fields>>(record, out,
+                                                std::make_index_sequence<std::size(Fields)>{});
 }
 
 template <const auto& Fields>
 void unpack(const unsigned char* in, void* record) noexcept {
-  stored_form::unpack<Fields>(in, record, std::make_index_sequence<std::size(Fields)>{});
+  stored_form::unpack<stored_form::kRuns<Fields>>(in, record,
+                                                  std::make_index_sequence<std::size(Fields)>{});
 }
 
 }  // namespace tevpf

@@ -86,12 +86,13 @@ TEVPF_STATUS prepare(const TEVPF_LIST& list, const TEVPF_PARAM_DEF& old,
   return prepared ? TEVPF_STATUS{PF_NORMAL} : fail_empty(PF_NOMEM);
 }
 
-void redefine(TEVPF_PARAM& param, TEVPF_PARAM_DEF definition, Redefinition& change) noexcept {
+void redefine(const TEVPF_LIST& list, TEVPF_PARAM& param, TEVPF_PARAM_DEF definition,
+              Redefinition& change) noexcept {
   TEVPF_PARAM_DEF& old = param.def;
   char* const old_value = old.type == PF_TYPE_STRING ? old.part.str.value : nullptr;
-  char* const value = change.value.commit(old_value);
+  char* const value = change.value.commit(old_value, list.texts);
   if (definition.type == PF_TYPE_STRING) definition.part.str.value = value;
-  definition.description = change.description.commit(old.description);
+  definition.description = change.description.commit(old.description, list.texts);
   std::memcpy(definition.name, old.name, sizeof definition.name);  // the selection may be a pattern
   old = definition;
   param.desc_loc = description_place(definition);
@@ -139,7 +140,7 @@ TEVPF_STATUS TEV8R1_PF_modify_param_def(const char* list_name,
   TEVPF_PARAM& param = list->param_ptr[position];
   Redefinition change;
   PF_TRY(prepare(*list, param.def, definition, change));
-  redefine(param, definition, change);
+  redefine(*list, param, definition, change);
   list->header.btf += static_cast<std::int32_t>(change.growth);
   return PF_NORMAL;
 }

@@ -3,13 +3,15 @@
 //
 // Invariants: index_ptr[0 .. num_params - 1] holds each position once, ordered by name; no two
 // names compare equal; header.btf = 12 + the stored sizes of all parameters; for strings, length is
-// the length of value; description and string value are blocks of the record's own.
+// the length of value; description and string value lie in the list's text block, or are blocks of
+// the record's own.
 #pragma once
 
 #include <cstddef>
 #include <cstdint>
 
 #include "core/element.h"
+#include "lists/text_block.h"
 
 namespace tevpf {
 
@@ -50,6 +52,7 @@ struct TEVPF_LIST {
 
   std::int32_t param_room;  // slots that the two blocks really have, at least what is counted
   tevpf::NameTable names;   // all zero: not built
+  tevpf::TextBlock texts;
 };
 
 static_assert(sizeof(void*) != 4 || sizeof(TEVPF_PARAM_DEF) == 64);
@@ -60,7 +63,8 @@ static_assert(offsetof(TEVPF_PARAM_DEF, description) == 32);
 
 namespace tevpf {
 
-// Releases everything that the list owns, and the record; half-built ones too.
+// Releases everything that the list owns, half-built ones too; release_list the record as well.
+void release_contents(TEVPF_LIST& list) noexcept;
 void release_list(TEVPF_LIST* list) noexcept;
 
 // Gives `copy`, a new empty list, all that `source` holds but its name; false when memory runs out,

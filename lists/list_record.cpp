@@ -11,23 +11,16 @@
 namespace tevpf {
 namespace {
 
-void release_contents(TEVPF_LIST& list) noexcept {
-  if (list.param_ptr != nullptr) {
-    for (std::int32_t i = 0; i < list.num_params; ++i) release_texts(list.param_ptr[i].def);
-  }
-  release_defaults(list.dft_ptr);
-  drop_table(list.names);
-  heap_free(list.index_ptr);
-  heap_free(list.param_ptr);
-}
-
 // The array of copied records in `half`; num_params counts those that are whole.
 bool copy_params(const TEVPF_LIST& source, TEVPF_LIST& half) noexcept {
   half.param_ptr = new_array<TEVPF_PARAM>(static_cast<std::uint32_t>(source.num_params)).release();
-  if (half.param_ptr == nullptr) return false;
+  TextPacker packer;
+  if (half.param_ptr == nullptr ||
+      !packer.reserve(text_room(source.header.btf - kListHead, source.num_params), half.texts))
+    return false;
   for (std::int32_t& i = half.num_params; i < source.num_params; ++i) {
-    half.param_ptr[i] = source.param_ptr[i];
-    if (!own_texts(half.param_ptr[i].def)) return false;
+    TEVPF_PARAM_DEF& definition = (half.param_ptr[i] = source.param_ptr[i]).def;
+    if (!own_texts(definition, text_sizes(definition), packer, half.texts)) return false;
   }
   return true;
 }
@@ -40,6 +33,18 @@ bool copy_index(const TEVPF_LIST& source, TEVPF_LIST& half) noexcept {
 }
 
 }  // namespace
+
+void release_contents(TEVPF_LIST& list) noexcept {
+  if (list.param_ptr != nullptr) {
+    for (std::int32_t i = 0; i < list.num_params; ++i)
+      release_texts(list.param_ptr[i].def, list.texts);
+  }
+  heap_free(list.texts.begin);
+  release_defaults(list.dft_ptr);
+  drop_table(list.names);
+  heap_free(list.index_ptr);
+  heap_free(list.param_ptr);
+}
 
 void release_list(TEVPF_LIST* list) noexcept {
   if (list == nullptr) return;

@@ -6,6 +6,7 @@
 #include <numeric>
 
 #include "core/status.h"
+#include "core/text_word.h"
 #include "lists/name_table.h"
 #include "values/text_compare.h"
 #include "values/value_type.h"
@@ -31,11 +32,10 @@ int first_bit(std::uint64_t word) noexcept { return word == 0 ? 64 : std::countr
 int compare_fields(const char (&name)[TEVPF_NAME_SIZE],
                    const char (&wanted)[TEVPF_NAME_SIZE]) noexcept {
   for (const std::size_t offset : {std::size_t{0}, std::size_t{8}, sizeof name - 8}) {
-    const auto a = load<std::uint64_t>(name + offset);
-    const auto b = load<std::uint64_t>(wanted + offset);
-    const std::uint64_t ends = (b - 0x0101010101010101u) & ~b & 0x8080808080808080u;
+    const std::uint64_t a = load_word(name + offset);
+    const std::uint64_t b = load_word(wanted + offset);
     const int difference = first_bit(a ^ b) & ~7;
-    const int end = first_bit(ends) & ~7;
+    const int end = first_bit(zero_bytes(b)) & ~7;
     if (difference <= end && difference < 64) {
       return static_cast<int>((a >> difference) & 0xFF) -
              static_cast<int>((b >> difference) & 0xFF);

@@ -11,12 +11,6 @@ namespace tevpf {
 namespace {
 
 constexpr std::int32_t kMaxInt = std::numeric_limits<std::int32_t>::max();
-constexpr std::int32_t kHeadBeforeDef = 8;  // desc_loc counts from behind it
-
-// Bytes of the type part, of a string without its text; codes that are none count as integers.
-std::int32_t part_size(std::int32_t type) noexcept {
-  return value_type(is_value_type(type) ? type : PF_TYPE_INT).param_part;
-}
 
 std::int64_t text_size(const char* text) noexcept {
   return text == nullptr ? 0 : static_cast<std::int64_t>(std::strlen(text)) + 1;
@@ -25,20 +19,13 @@ std::int64_t text_size(const char* text) noexcept {
 }  // namespace
 
 std::int64_t stored_size(std::int32_t type, const char* description, std::int64_t length) noexcept {
-  return kParamHead + part_size(type) + (type == PF_TYPE_STRING ? length + 1 : 0) +
-         text_size(description);
+  return stored_size(type, {type == PF_TYPE_STRING ? length + 1 : 0, text_size(description)});
 }
 
 std::int64_t stored_size(const TEVPF_PARAM_DEF& definition) noexcept {
   const bool string = definition.type == PF_TYPE_STRING;
   return stored_size(definition.type, definition.description,
                      string ? definition.part.str.length : 0);
-}
-
-std::int8_t description_place(const TEVPF_PARAM_DEF& definition) noexcept {
-  if (definition.description == nullptr) return 0;
-  if (definition.type == PF_TYPE_STRING) return 1;
-  return static_cast<std::int8_t>(kParamHead + part_size(definition.type) - kHeadBeforeDef);
 }
 
 bool btf_can_change(const TEVPF_LIST& list, std::int64_t bytes) noexcept {
@@ -59,25 +46,27 @@ TEVPF_STATUS normalise(TEVPF_PARAM_DEF& definition) noexcept {
   return PF_NORMAL;
 }
 
-void release_texts(TEVPF_PARAM_DEF& definition) noexcept {
-  heap_free(definition.description);
+void release_texts(TEVPF_PARAM_DEF& definition, const TextBlock& block) noexcept {
+  release_text(block, definition.description);
   definition.description = nullptr;
   if (definition.type != PF_TYPE_STRING) return;
-  heap_free(definition.part.str.value);
+  release_text(block, definition.part.str.value);
   definition.part.str.value = nullptr;
 }
 
-bool own_texts(TEVPF_PARAM_DEF& definition) noexcept {
+TextSizes text_sizes(const TEVPF_PARAM_DEF& definition) noexcept {
   const bool string = definition.type == PF_TYPE_STRING;
-  Owned<char> value{string ? heap_copy(definition.part.str.value) : nullptr};
-  if (string && !value) return false;
-  if (definition.description != nullptr) {
-    char* const description = heap_copy(definition.description);
-    if (description == nullptr) return false;
-    definition.description = description;
-  }
-  if (string) definition.part.str.value = value.release();
-  return true;
+  return {string ? text_size(definition.part.str.value) : 0, text_size(definition.description)};
+}
+
+std::int64_t text_room(std::int64_t bytes, std::int64_t params) noexcept {
+  constexpr std::int32_t kLeastPart = value_type(PF_TYPE_STRING).param_part;
+  return bytes - params * (kParamHead + kLeastPart);
+}
+
+bool own_texts(TEVPF_PARAM_DEF& definition) noexcept {
+  TextPacker none;  // each text gets a block of its own
+  return own_texts(definition, text_sizes(definition), none, {});
 }
 
 bool NewText::prepare(const char* text, std::size_t length, std::size_t capacity) noexcept {
@@ -88,13 +77,13 @@ bool NewText::prepare(const char* text, std::size_t length, std::size_t capacity
   return block_ != nullptr;
 }
 
-char* NewText::commit(char* old) noexcept {
+char* NewText::commit(char* old, const TextBlock& block) noexcept {
   if (text_ != nullptr && !block_) {
     std::memmove(old, text_, length_ + 1);
     return old;
   }
   if (block_) std::memcpy(block_.get(), text_, length_ + 1);
-  heap_free(old);
+  release_text(block, old);
   return block_.release();
 }
 

@@ -22,12 +22,35 @@ namespace tevpf {
 // What every parameter takes in the file before its type part.
 inline constexpr std::int32_t kParamHead = 44;
 
+// Bytes of the type part, of a string without its text; codes that are none count as integers.
+constexpr std::int32_t part_size(std::int32_t type) noexcept {
+  return value_type(is_value_type(type) ? type : PF_TYPE_INT).param_part;
+}
+
+// The bytes that the texts of a definition take, terminators counted; 0 where there is no text.
+struct TextSizes {
+  std::int64_t value;
+  std::int64_t description;
+};
+TextSizes text_sizes(const TEVPF_PARAM_DEF& definition) noexcept;
+
 // Bytes of a parameter in the file, in 64 bits so that no text is too long to be measured.
+constexpr std::int64_t stored_size(std::int32_t type, const TextSizes& texts) noexcept {
+  return kParamHead + part_size(type) + texts.value + texts.description;
+}
 std::int64_t stored_size(std::int32_t type, const char* description, std::int64_t length) noexcept;
 std::int64_t stored_size(const TEVPF_PARAM_DEF& definition) noexcept;
 
+// How many of the bytes that some stored parameters take can be texts, at most.
+std::int64_t text_room(std::int64_t bytes, std::int64_t params) noexcept;
+
 // The desc_loc of a record with that definition.
-std::int8_t description_place(const TEVPF_PARAM_DEF& definition) noexcept;
+inline std::int8_t description_place(const TEVPF_PARAM_DEF& definition) noexcept {
+  constexpr std::int32_t kHeadBeforeDef = 8;  // desc_loc counts from behind it
+  if (definition.description == nullptr) return 0;
+  if (definition.type == PF_TYPE_STRING) return 1;
+  return static_cast<std::int8_t>(kParamHead + part_size(definition.type) - kHeadBeforeDef);
+}
 
 // Whether btf can change by that many bytes and still fit its 31 bits.
 bool btf_can_change(const TEVPF_LIST& list, std::int64_t bytes) noexcept;
@@ -49,24 +72,44 @@ inline void copy_value(const TEVPF_PARAM_DEF& definition, void* value_out) noexc
   });
 }
 
-// Releases the texts that the definition owns and leaves null pointers.
-void release_texts(TEVPF_PARAM_DEF& definition) noexcept;
+// Releases the texts of a definition but those in that block, and leaves null pointers.
+void release_texts(TEVPF_PARAM_DEF& definition, const TextBlock& block = {}) noexcept;
 
 // Replaces the texts that the definition points to by heap copies; false when memory runs out, and
 // then the definition is as it was.
 [[nodiscard]] bool own_texts(TEVPF_PARAM_DEF& definition) noexcept;
 
-// A text on its way into a record: the record's old block is kept when it is large enough, else a
-// new one is there before anything changes.
+// The same with copies in the block that is being packed.
+[[nodiscard]] inline bool own_texts(TEVPF_PARAM_DEF& definition, const TextSizes& sizes,
+                                    TextPacker& packer, const TextBlock& block) noexcept {
+  char* value = nullptr;
+  if (definition.type == PF_TYPE_STRING) {
+    value = packer.pack(definition.part.str.value, sizes.value);
+    if (value == nullptr) return false;
+  }
+  if (definition.description != nullptr) {
+    char* const description = packer.pack(definition.description, sizes.description);
+    if (description == nullptr) {
+      release_text(block, value);
+      return false;
+    }
+    definition.description = description;
+  }
+  if (value != nullptr) definition.part.str.value = value;
+  return true;
+}
+
+// A text on its way into a record: it goes to the place of the old one when that is large enough,
+// else a new block is there before anything changes.
 class NewText {
  public:
-  // `text`, of `length` characters, is to replace what stands in a block of `capacity` bytes; null
+  // `text`, of `length` characters, is to replace what stands in a place of `capacity` bytes; null
   // for no text. false when memory runs out.
   [[nodiscard]] bool prepare(const char* text, std::size_t length, std::size_t capacity) noexcept;
 
-  // Writes it into the old block, or into the new one and releases the old; gives the block that
-  // holds it, null for no text.
-  char* commit(char* old) noexcept;
+  // Writes it over the old text, or into the new block and releases the old one, unless the list's
+  // text block holds that. Gives what stands there now, null for no text.
+  char* commit(char* old, const TextBlock& block) noexcept;
 
  private:
   const char* text_ = nullptr;

@@ -32,7 +32,7 @@ TEVPF_STATUS TEV8R1_PF_delete_param(const char* list_name, const char* param_nam
   const std::int32_t position = list->index_ptr[place];
   TEVPF_PARAM* const param = list->param_ptr + position;
   const std::int64_t bytes = stored_size(param->def);
-  release_texts(param->def);
+  release_texts(param->def, list->texts);
   const auto behind = static_cast<std::size_t>(list->num_params - position - 1);
   std::memmove(param, param + 1, behind * sizeof *param);
   TEV8R1_remove_param_from_index(list, place);

@@ -35,7 +35,7 @@ TEVPF_STATUS change_string(TEVPF_LIST& list, TEVPF_PARAM_DEF& definition,
       !text.prepare(value, length, static_cast<std::size_t>(string.length) + 1)) {
     return fail_empty(PF_NOMEM);
   }
-  string.value = text.commit(string.value);
+  string.value = text.commit(string.value, list.texts);
   string.length = static_cast<std::int32_t>(length);
   list.header.btf += static_cast<std::int32_t>(growth);
   return PF_NORMAL;

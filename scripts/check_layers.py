@@ -15,10 +15,12 @@ import sys
 LAYERS = [
     ("interface", "include/*"),
     ("core, lower half", "core/status core/error_context core/heap core/library core/element "
-                         "core/text_field core/number_text core/leading_digits"),
+                         "core/text_field core/text_word core/short_copy core/number_text "
+                         "core/leading_digits"),
     ("values", "values/*"),
-    ("records", "lists/list lists/*_record lists/name_* lists/param_check lists/default_table "
-                "tables/table tables/*_record tables/layout tables/row_store tables/column_index "
+    ("records", "lists/list lists/text_block lists/*_record lists/name_* lists/param_check "
+                "lists/default_table tables/table tables/*_record tables/layout tables/row_store "
+                "tables/column_index "
                 "tables/default_row tables/templates reports/formats"),
     ("core, upper half", "core/*"),
     ("operations", "lists/* tables/*"),

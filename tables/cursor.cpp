@@ -1,6 +1,7 @@
 #include "tables/cursor.h"
 
 #include "core/directory.h"
+#include "core/short_copy.h"
 #include "core/status.h"
 #include "tables/column_index.h"
 #include "tables/row_store.h"
@@ -27,7 +28,7 @@ bool has_position(const TEVPF_TABLE& table, std::int32_t position) noexcept {
 void deliver_row(TEVPF_TABLE& table, std::int32_t position, void* row_out) noexcept {
   fetch_ahead(table, position);
   const unsigned char* const row = row_at(table, row_at_position(table, position));
-  copy_row_bytes(row_out, row, table.row_wid);
+  copy_short(row_out, row, table.row_wid);
   table.cur_row = position;
   table.next_row = position + 1;
 }

@@ -21,20 +21,6 @@ inline const unsigned char* row_at(const TEVPF_TABLE& table, std::int64_t row) n
   return table.row_data + row * table.row_wid;
 }
 
-// Copies a row's bytes. Rows up to kShortRow go by 16 bytes, the last ones over those before,
-// without a call: reading row by row is copying short rows.
-inline void copy_row_bytes(void* to, const unsigned char* row, std::int32_t row_wid) noexcept {
-  constexpr std::int32_t kStep = 16, kShortRow = 128;
-  auto* const out = static_cast<unsigned char*>(to);
-  if (row_wid < kStep || row_wid > kShortRow) {
-    if (row_wid > 0) std::memcpy(out, row, static_cast<std::size_t>(row_wid));
-    return;
-  }
-  for (std::int32_t at = 0; at < row_wid - kStep; at += kStep)
-    std::memcpy(out + at, row + at, kStep);
-  std::memcpy(out + row_wid - kStep, row + row_wid - kStep, kStep);
-}
-
 // The values of one column: the column's value in row number 0, and row_wid bytes further on the
 // next.
 inline const unsigned char* column_base(const TEVPF_TABLE& table,

@@ -10,6 +10,7 @@
 #include <cstdint>
 #include <cstring>
 
+#include "core/text_word.h"
 #include "values/text_compare.h"
 #include "values/value_type.h"
 
@@ -61,8 +62,8 @@ inline constexpr std::size_t kHeadSize = 8;
 // The first eight bytes of a text as a number that orders as they do; zeros behind its terminator.
 // All eight bytes must be readable.
 inline std::uint64_t wide_text_head(const unsigned char* text) noexcept {
-  const std::uint64_t bytes = load<std::uint64_t>(text);
-  const std::uint64_t ends = (bytes - 0x0101010101010101u) & ~bytes & 0x8080808080808080u;
+  const std::uint64_t bytes = load_word(text);
+  const std::uint64_t ends = zero_bytes(bytes);
   return __builtin_bswap64(bytes & (ends ^ (ends - 1)));  // up to the first zero byte; all without
 }
 

@@ -1,0 +1,23 @@
+// Copies of a few bytes, which a call would cost more than.
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <cstring>
+
+namespace tevpf {
+
+// memcpy. From 16 up to 128 bytes go 16 at a time, the last ones over those before.
+inline void copy_short(void* to, const void* from, std::int64_t count) noexcept {
+  constexpr std::int64_t kStep = 16, kShort = 128;
+  auto* const out = static_cast<unsigned char*>(to);
+  const auto* const in = static_cast<const unsigned char*>(from);
+  if (count < kStep || count > kShort) {
+    if (count > 0) std::memcpy(out, in, static_cast<std::size_t>(count));
+    return;
+  }
+  for (std::int64_t at = 0; at < count - kStep; at += kStep) std::memcpy(out + at, in + at, kStep);
+  std::memcpy(out + count - kStep, in + count - kStep, kStep);
+}
+
+}  // namespace tevpf
