@@ -1,11 +1,9 @@
 // Opens arbitrary bytes as a parameter file and drives whatever was loaded. Nothing may crash, hang,
-// leak or disagree.
-//
-// Input: one byte n, n bytes that choose the changes, then the file.
+// leak or disagree. Input: one byte n, n bytes that choose the changes, then the file.
 #include <unistd.h>
 
-#include <cstdio>
 #include <filesystem>
+#include <fstream>
 
 #include "core/heap.h"
 #include "include/tevpf.h"
@@ -20,12 +18,10 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
   const std::string path = folder + "/file";
   std::filesystem::create_directory(folder);
   const std::string_view input(reinterpret_cast<const char*>(data), size);
-  const std::string_view choices = input.substr(1, data[0]),
-                         file = input.substr(1 + choices.size());
-  std::FILE* out = std::fopen(path.c_str(), "wb");
-  require(out != nullptr, "scratch file");
-  std::fwrite(file.data(), 1, file.size(), out);
-  std::fclose(out);
+  const std::string_view choices = input.substr(1, data[0]);
+  std::ofstream out(path, std::ios::binary);
+  require(static_cast<bool>(out << input.substr(1 + choices.size()) << std::flush), "scratch file");
+  out.close();
 
   tevpf::heap_fail_above(kLargestBlock);
   TEV8R1_PF_init();

@@ -34,9 +34,6 @@ class ReportTest : public TableTest {
     }
   }
 
-  static void define(const std::vector<TEVPF_COL_DEF>& defs) {
-    for (const TEVPF_COL_DEF& def : defs) ASSERT_OK(TEV8R1_PF_def_column("t", def)) << def.name;
-  }
   static void add_rows(const std::vector<std::vector<const char*>>& rows) {
     for (const auto& values : rows) {
       std::string row(static_cast<std::size_t>(table().row_wid), '\x55');

@@ -24,18 +24,15 @@ std::uint8_t Choices::next() {
 
 namespace {
 
-constexpr int kMostElements = 6, kMostEntries = 12;
+constexpr std::int32_t kMostElements = 6, kMostEntries = 12;  // of those that a file holds
 
-// Not all of them, where a file holds many.
-template <class Element>
-std::span<Element* const> some(Element* const* elements, std::int32_t count) {
-  return {elements, static_cast<std::size_t>(std::min(count, kMostElements))};
-}
 std::span<TEVPF_LIST* const> lists() {
-  return some(tevpf::library.current_file->list_ptr, tevpf::library.current_file->num_lists);
+  const TEVPF_FILE& file = *tevpf::library.current_file;
+  return {file.list_ptr, std::size_t(std::min(file.num_lists, kMostElements))};
 }
 std::span<TEVPF_TABLE* const> tables() {
-  return some(tevpf::library.current_file->table_ptr, tevpf::library.current_file->num_tables);
+  const TEVPF_FILE& file = *tevpf::library.current_file;
+  return {file.table_ptr, std::size_t(std::min(file.num_tables, kMostElements))};
 }
 
 void read_list(const char* list) {
@@ -44,26 +41,25 @@ void read_list(const char* list) {
   TEV8R1_PF_reset_param(list);
   for (int i = 0; i < kMostEntries; ++i) {
     if (TEV8R1_PF_inq_next_param_size(list, &type, &value_size, &desc_size) != PF_NORMAL) break;
-    std::vector<char> value(static_cast<std::size_t>(value_size)),
-        desc(static_cast<std::size_t>(desc_size)), again = value;
-    TEVPF_PARAM_DEF def{};
-    def.description = desc.data();
-    if (type == PF_TYPE_STRING) def.part.str.value = value.data();
-    require(TEV8R1_PF_get_next_param_def(list, &def) == PF_NORMAL, "a parameter that has sizes");
-    require(std::strlen(desc.data()) + 1 == desc.size(), "description size");
-    require(type != PF_TYPE_STRING || std::strlen(value.data()) + 1 == value.size(), "value size");
-    if (type != PF_TYPE_STRING)
-      require(TEV8R1_load_param_value(&def, value.data()) == PF_NORMAL, "a value");
+    DefBuffers out(value_size, desc_size);
+    std::vector<char> again(value_size);
+    require(TEV8R1_PF_get_next_param_def(list, &out.c) == PF_NORMAL, "a parameter that has sizes");
+    require(std::strlen(out.description.data()) + 1 == out.description.size(), "description size");
+    if (type == PF_TYPE_STRING) {
+      require(std::strlen(out.value.data()) + 1 == out.value.size(), "value size");
+    } else {
+      require(TEV8R1_load_param_value(&out.c, out.value.data()) == PF_NORMAL, "a value");
+    }
     TEV8R1_PF_reset_param(list);
     TEV8R1_set_cur_param(list, i - 1);  // refused for the first
     require(TEV8R1_PF_get_next_param(list, name, again.data()) == PF_NORMAL, "the value again");
-    require(again == value, "the same value");
-    TEV8R1_inq_param_pos(list, def.name, &position);
+    require(again == out.value, "the same value");
+    TEV8R1_inq_param_pos(list, out.c.name, &position);
   }
 }
 
 std::vector<unsigned char> row_buffer(const TEVPF_TABLE& table) {
-  return std::vector<unsigned char>(static_cast<std::size_t>(table.row_wid) + 1);
+  return std::vector<unsigned char>(table.row_wid + std::size_t{1});
 }
 
 void read_table(const TEVPF_TABLE& info) {

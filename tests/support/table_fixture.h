@@ -35,6 +35,9 @@ class TableTest : public TempFileTest {
     return {entries, entries + table().num_rows};
   }
 
+  static void define(const std::vector<TEVPF_COL_DEF>& defs) {
+    for (const TEVPF_COL_DEF& def : defs) ASSERT_OK(TEV8R1_PF_def_column("t", def)) << def.name;
+  }
   static TEVPF_STATUS redefine(const char* name, const TEVPF_COL_DEF& def) {
     return TEV8R1_PF_modify_col_def("t", name, def);
   }

@@ -30,9 +30,6 @@ void put_value(char* place, auto number) { store(place, number); }
 
 class TableRules : public TableTest {
  protected:
-  static void define(std::initializer_list<TEVPF_COL_DEF> defs) {
-    for (const TEVPF_COL_DEF& def : defs) ASSERT_OK(TEV8R1_PF_def_column("t", def)) << def.name;
-  }
   // A row of values of the columns' types.
   template <class... T>
   static TEVPF_STATUS add(T... values) {
