@@ -56,10 +56,11 @@ constexpr std::int32_t kRows = 9;
 
 // A definition from its numbers: type, value, max, min, precision or length.
 TEVPF_PARAM_DEF param(const char* name, Numbers n) {
-  static Def def;
-  def = {n[0],         name,         "",   long_text, double(n[1]),
-         double(n[2]), double(n[3]), n[4], long_text, n[4]};
-  return to_c(def);
+  const double value = n[1], max = n[2], min = n[3];
+  TEVPF_PARAM_DEF def = to_c({n[0], name, "", {}, value, max, min, n[4], "", n[4]});
+  def.description = long_text;
+  if (def.type == PF_TYPE_STRING) def.part.str.value = long_text;
+  return def;
 }
 
 // The same for columns: type, width, max, min, precision, idx_flag, unq_flag.
@@ -88,12 +89,16 @@ TEVPF_PARAM_DEF* buffers() {
   return &def;
 }
 
-void release(void* block) { std::free(block); }
-void release(TEVPF_COL_DEF& def) { std::free(def.description); }
-void release(TEVPF_PARAM_DEF& def) {
-  std::free(def.description);
-  if (def.type == PF_TYPE_STRING) std::free(def.part.str.value);
+void release(void* block) {
+  if (block != long_text) std::free(block);
 }
+void release(const TEVPF_COL_DEF& def) { release(def.description); }
+void release(const TEVPF_PARAM_DEF& def) {
+  release(def.description);
+  if (def.type == PF_TYPE_STRING) release(def.part.str.value);
+}
+void release(const TEVPF_COLUMN& column) { release(column.def); }
+void release(const TEVPF_PARAM& param) { release(param.def); }
 // What operations hand out, released at the end of the call's expression.
 template <class T>
 struct Handed {
@@ -107,8 +112,14 @@ using Names = Handed<char (*)[TEVPF_NAME_SIZE]>;
 using Descs = Handed<char (*)[TEVPF_DESC_SIZE]>;
 
 template <class T>
-const T* at(const T& temporary) {
+T* at(T&& temporary) {
   return &temporary;
+}
+template <class Record, class Definition>
+Record with(const Definition& def) {
+  Record record{};
+  record.def = def;
+  return record;
 }
 template <class T>
 T* zeroed() {
@@ -248,13 +259,8 @@ void add_list_calls(std::vector<Call>& calls) {
       MORE(PF_set_param_dft, kPartStays, ("none", param("default", n)), type, 1, 9, -9, 3),
       CALL(validate_param_def, (&list(), param("new", n)), type, 1, 9, -9, 3),
       CALL(load_param_value, (at(param("new", n)), text_out), type, 1, 9, -9, 3),
-      {"construct_param", {type, 1, 9, -9, 3}, [](Numbers n) {
-         TEVPF_PARAM made{};
-         made.def = param("new", n);
-         const TEVPF_STATUS status = TEV8R1_construct_param(&made, out);
-         if (status == PF_NORMAL) release(made.def);
-         return status;
-       }},
+      CALL(construct_param, (Handed<TEVPF_PARAM>{with<TEVPF_PARAM>(param("new", n))}.to(), out), type,
+           1, 9, -9, 3),
       CALL(store_param_value, (n[0], "12", HandedParam{{n[0], "", "", nullptr, {}}}.to()), type),
       CALL(PF_inq_param_dft, ("list", n[0], HandedParam().to()), type),
       CALL(calc_param_bytes, (n[0], long_text, n[1], out), type, 7),
@@ -315,19 +321,11 @@ void add_column_calls(std::vector<Call>& calls) {
       CALL(PF_inq_col_dft, ("t", n[0], HandedColumn().to()), type),
       CALL(validate_col_range, (at(column("x", n))), type, 8, 99, 0, 3, 0, 0),
       CALL(validate_col_def, (&table(), column("x", n)), type, 8, 99, 0, 3, 0, 0),
-      {"construct_column", {type, 8, 99, 0, 3, 0, 0}, [](Numbers n) {
-         TEVPF_COLUMN made{};
-         made.def = column("x", n);
-         const TEVPF_STATUS status = TEV8R1_construct_column(&made, out, out + 1, &short_out);
-         if (made.def.description != long_text) std::free(made.def.description);
-         return status;
-       }},
+      CALL(construct_column, (Handed<TEVPF_COLUMN>{with<TEVPF_COLUMN>(column("x", n))}.to(), out,
+                              out + 1, &short_out), type, 8, 99, 0, 3, 0, 0),
       CALL(calc_col_bytes, (n[0], long_text, out), type),
-      {"adjust_col", {40, type, 8}, [](Numbers n) {
-         TEVPF_COLUMN placed{};
-         std::int16_t extra = 0, mod = 4;
-         return TEV8R1_adjust_col(n[0], n[1], n[2], &extra, &mod, &placed, out);
-       }},
+      CALL(adjust_col, (n[0], n[1], n[2], at(std::int16_t{0}), at(std::int16_t{4}),
+                        at(TEVPF_COLUMN{}), out), 40, type, 8),
     });
   }
   calls.insert(calls.end(), {
@@ -413,19 +411,12 @@ void add_report_calls(std::vector<Call>& calls, const TempDir& dir) {
     CALL(display_string_value, (n[0], n[1], long_text, nowhere(), "  "), 1, 10),
     CALL(create_table_header, ("t", n[0], n[1], std::min(n[2], 20), std::min(n[3], 4000), out,
                                text_out), 0, 3, 2, 40),
-    {"make_col_format", {PF_TYPE_DOUBLE, 8, 99, 0, 3, 0, 0}, [](Numbers n) {
-       TEVPF_COLUMN formatted{};
-       formatted.def = column("x", n);
-       return TEV8R1_make_col_format(&formatted, out);
-     }},
+    CALL(make_col_format, (at(with<TEVPF_COLUMN>(column("x", n))), out), PF_TYPE_DOUBLE, 8, 99, 0,
+         3, 0, 0),
     CALL(make_table_format, (&table())),
     CALL(review_row, (table().col_array, table().col_array + 4, table().row_data, text_out, out)),
-    {"remove_escape_chars", {8}, [](Numbers n) {
-       Handed<char*> text{static_cast<char*>(std::malloc(8))};
-       std::strcpy(text.made, "\t\t\t\t\t\t\t");
-       std::int32_t size = std::min(n[0], 8);
-       return TEV8R1_remove_escape_chars(&size, text.to());
-     }},
+    CALL(remove_escape_chars, (at(std::int32_t(std::min(n[0], 8))),
+                               Handed<char*>{strdup("\t\t\t\t\t\t\t")}.to()), 8),
     CALL(insert_escape_chars, (std::strcpy(text_out, "a\\tb"), out)),
   });
 }
