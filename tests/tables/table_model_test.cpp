@@ -338,7 +338,7 @@ class TableModelTest : public TableTest, public testing::WithParamInterface<unsi
     define_column();
   }
 
-  std::string last_;  // the operation of the last step
+  std::string last_;  // the last call that was compared
 
   void step() {
     static constexpr struct {
@@ -408,20 +408,23 @@ class TableModelTest : public TableTest, public testing::WithParamInterface<unsi
   bool chance(int percent) { return below(100) < percent; }
   int any_column() { return below(int(model_.columns.size())); }
 
-  void expect(const std::string& operation, const Result& expected, TEVPF_STATUS status) {
-    last_ = operation;
+  // Whether both the model and the call say that it was done.
+#define BOTH(expected, call) both(#call, expected, call)
+  bool both(const char* call, const Result& expected, TEVPF_STATUS status) {
+    last_ = call;
     EXPECT_EQ(status, expected.status);
     EXPECT_EQ(error_texts(), expected.texts);
+    return !expected.failed() && !HasFailure();
   }
-  // The same for an operation that gives the row which is now the model's current one.
-  template <class Deliver>
-  void expect_row(const std::string& operation, const Result& expected, Deliver deliver) {
-    const TEVPF_TABLE& t = table();
-    std::string out(t.row_wid + 1, '\0');
-    expect(operation, expected, deliver(out.data()));
-    if (expected.failed() || HasFailure()) return;
+
+  // A buffer, and the row that was delivered into it as the model's current one.
+  char* out(int bytes = table().row_wid) {
+    out_.assign(bytes + 1, '\0');
+    return out_.data();
+  }
+  void compare_row() {
     const int row = model_.row_at(model_.cur);
-    EXPECT_EQ(decode(t, out.data()), model_.rows[row]);
+    EXPECT_EQ(decode(table(), out_.data()), model_.rows[row]);
     EXPECT_EQ(TEV8R1_convert_row("t", model_.cur), row);
   }
 
@@ -472,8 +475,7 @@ class TableModelTest : public TableTest, public testing::WithParamInterface<unsi
   void add_row() {
     const int place = chance(70) ? PF_END_POS : below(model_.count() + 4) - 2;
     const Row row = random_row();
-    expect("add at " + std::to_string(place), model_.add(row, place),
-           TEV8R1_PF_add_row_by_pos("t", image(row).data(), place));
+    BOTH(model_.add(row, place), TEV8R1_PF_add_row_by_pos("t", image(row).data(), place));
   }
   void add_with_defaults() {
     Row row = random_row();
@@ -483,8 +485,8 @@ class TableModelTest : public TableTest, public testing::WithParamInterface<unsi
       supplied.push_back(below(2));
       if (supplied[i] == 0) row[i] = model_.defaults[i];
     }
-    expect("add with defaults", model_.add(row, PF_END_POS),
-           TEV8R1_PF_add_row_with_dft("t", bytes.data(), supplied.data()));
+    BOTH(model_.add(row, PF_END_POS),
+         TEV8R1_PF_add_row_with_dft("t", bytes.data(), supplied.data()));
     const Row completed = decode(table(), bytes.c_str());
     for (size_t i = 0; i < row.size(); ++i) {
       EXPECT_TRUE(supplied[i] != 0 || completed[i] == row[i]);
@@ -498,9 +500,9 @@ class TableModelTest : public TableTest, public testing::WithParamInterface<unsi
       old[changed] = row[changed];
       row = old;
     }
-    expect("replace", model_.replace(row), TEV8R1_PF_replace_row("t", image(row).data()));
+    BOTH(model_.replace(row), TEV8R1_PF_replace_row("t", image(row).data()));
   }
-  void delete_row() { expect("delete row", model_.delete_row(), TEV8R1_PF_delete_row("t")); }
+  void delete_row() { BOTH(model_.delete_row(), TEV8R1_PF_delete_row("t")); }
   // What was reserved for rows stays, while columns without rows may become any others.
   void delete_all_rows() {
     if (chance(70)) return;
@@ -517,33 +519,33 @@ class TableModelTest : public TableTest, public testing::WithParamInterface<unsi
     }
     const int from = below(model_.count() + 2) - 1;
     const int to = chance(10) ? PF_END_POS : below(model_.count() + 2) - 1;
-    expect("move row " + std::to_string(from) + " to " + std::to_string(to), model_.move(from, to),
-           TEV8R1_PF_move_row("t", from, to));
+    BOTH(model_.move(from, to), TEV8R1_PF_move_row("t", from, to));
   }
   void next_row() {
-    expect_row("next row", model_.go_to(model_.next, {PF_NOMORE}),
-               [](void* out) { return TEV8R1_PF_get_next_row("t", out); });
+    const Result expected = model_.go_to(model_.next, {PF_NOMORE});
+    if (BOTH(expected, TEV8R1_PF_get_next_row("t", out()))) compare_row();
   }
   void row_at(int pos) {
-    expect_row("row at " + std::to_string(pos), model_.go_to(pos, model_.bad_position(pos)),
-               [&](void* out) { return TEV8R1_PF_get_row_by_pos("t", pos, out); });
+    const Result expected = model_.go_to(pos, model_.bad_position(pos));
+    if (BOTH(expected, TEV8R1_PF_get_row_by_pos("t", pos, out()))) compare_row();
   }
   void row_by_pos() { row_at(below(model_.count() + 2) - 1); }
   void reset() {
     model_.cur = -1;
     model_.next = 0;
-    expect("reset", {}, TEV8R1_PF_reset_table("t"));
+    BOTH({}, TEV8R1_PF_reset_table("t"));
   }
   void row_by_value() {
     if (chance(40)) reset();
     const bool indexed = !model_.search.empty() && chance(60);
     const int column = indexed ? model_.searched() : any_column();
-    const Column& c = model_.columns[column];
-    const int mode = below(3);
+    const char* const name = model_.columns[column].def.name;
+    const auto mode = std::int8_t(below(3));
     const Value key = random_key(column);
-    expect_row("row by value " + c.text(key), model_.by_value(mode, column, key), [&](void* out) {
-      return TEV8R1_PF_get_row_by_value("t", std::int8_t(mode), c.def.name, key.c_str(), out);
-    });
+    const Result expected = model_.by_value(mode, column, key);
+    if (BOTH(expected, TEV8R1_PF_get_row_by_value("t", mode, name, key.c_str(), out()))) {
+      compare_row();
+    }
   }
   void get_value() {
     const Value key = random_key(0);
@@ -552,31 +554,24 @@ class TableModelTest : public TableTest, public testing::WithParamInterface<unsi
     Model searched = model_;
     searched.next = 0;
     const Result expected = searched.by_value(0, 0, key);
-    std::string out(def.width + 9, '\0');
-    expect("get value for " + model_.columns[0].text(key), expected,
-           TEV8R1_PF_get_value("t", def.name, key.c_str(), out.data()));
-    if (expected.failed()) return;
-    EXPECT_EQ(load_value(def, out.data()), searched.rows[searched.row_at(searched.cur)][column]);
+    if (!BOTH(expected, TEV8R1_PF_get_value("t", def.name, key.c_str(), out()))) return;
+    EXPECT_EQ(load_value(def, out_.data()), searched.rows[searched.row_at(searched.cur)][column]);
   }
   void define_search() {
     const TEVPF_COL_DEF& def = model_.columns[any_column()].def;
-    if (def.idx_flag) model_.search = def.name;
-    expect("define search", def.idx_flag ? Result{} : Result{PF_BADSEARCH, {def.name, ""}},
-           TEV8R1_PF_define_table_search("t", def.name));
+    const Result expected = def.idx_flag ? Result{} : Result{PF_BADSEARCH, {def.name, ""}};
+    if (BOTH(expected, TEV8R1_PF_define_table_search("t", def.name))) model_.search = def.name;
   }
   void set_defaults() {
     const Row row = random_row();
     const Result expected = model_.interactive ? Result{} : model_.check_row(row, -2);
-    if (!expected.failed()) model_.defaults = row;
-    expect("set defaults", expected, TEV8R1_PF_set_dft_row("t", image(row).data()));
-    std::string out(table().row_wid, '\0');
-    TEV8R1_PF_inq_dft_row("t", out.data());
-    EXPECT_EQ(decode(table(), out.data()), model_.defaults);
+    if (BOTH(expected, TEV8R1_PF_set_dft_row("t", image(row).data()))) model_.defaults = row;
+    TEV8R1_PF_inq_dft_row("t", out());
+    EXPECT_EQ(decode(table(), out_.data()), model_.defaults);
   }
   void interactive() {
     model_.interactive = !model_.interactive && chance(30);
-    expect("interactive", {},
-           model_.interactive ? TEV8R1_set_interactive_table("t") : TEV8R1_turn_off_interactive());
+    model_.interactive ? TEV8R1_set_interactive_table("t") : TEV8R1_turn_off_interactive();
   }
 
   // Every column has a name of its own; other refusals of definitions are tested elsewhere.
@@ -600,7 +595,7 @@ class TableModelTest : public TableTest, public testing::WithParamInterface<unsi
   void define_column() {
     if (model_.columns.size() > 6) return;
     const Column c = random_column(random_type(), random_bounds());
-    expect(std::string("define ") + c.def.name, model_.define(c), TEV8R1_PF_def_column("t", c.def));
+    BOTH(model_.define(c), TEV8R1_PF_def_column("t", c.def));
   }
   void redefine_column() {
     if (model_.columns.empty()) return;
@@ -615,27 +610,25 @@ class TableModelTest : public TableTest, public testing::WithParamInterface<unsi
     if (chance(70)) std::strcpy(c.def.name, old.def.name);
     if (c.is_text() && !model_.rows.empty()) c.def.width = old.def.width;
     if (chance(60)) c.def.idx_flag = old.def.idx_flag;
-    expect(std::string("redefine ") + old.def.name, model_.redefine(place, c),
-           redefine(old.def.name, c.def));
+    BOTH(model_.redefine(place, c), redefine(old.def.name, c.def));
   }
   void delete_column() {
     const int place = any_column();
     const std::string name = model_.columns[place].def.name;
     model_.remove_column(place);
-    expect("delete " + name, {}, TEV8R1_PF_delete_col("t", name.c_str()));
+    BOTH({}, TEV8R1_PF_delete_col("t", name.c_str()));
   }
   void move_column() {
     const int from = any_column(), before = below(int(model_.columns.size()) + 1) - 1;
     const std::string name = model_.columns[from].def.name;
     const std::string other = before < 0 ? "" : model_.columns[before].def.name;
     model_.move_column(from, before);
-    expect("move " + name + " before " + other, {},
-           TEV8R1_PF_move_col("t", name.c_str(), before < 0 ? nullptr : other.c_str()));
+    BOTH({}, TEV8R1_PF_move_col("t", name.c_str(), before < 0 ? nullptr : other.c_str()));
   }
 
   // The copy takes the place of its source: whatever they shared would be gone.
   void copy() {
-    expect("copy", {}, TEV8R1_PF_copy_table("t", "copy"));
+    BOTH({}, TEV8R1_PF_copy_table("t", "copy"));
     TEV8R1_PF_delete_table("t");
     TEV8R1_modify_elem_name(PF_ELEM_TABLE, "copy", "t");
     model_.free_rows = model_.free_cols = 0;
@@ -653,23 +646,23 @@ class TableModelTest : public TableTest, public testing::WithParamInterface<unsi
     const int column = any_column();
     const TEVPF_COL_DEF& def = model_.columns[column].def;
     const auto size = int(value_size(def.type, def.width));
-    std::string out(size * model_.rows.size() + 1, '\0');
-    expect("column values", {model_.rows.empty() ? PF_NOMORE : PF_NORMAL},
-           TEV8R1_PF_get_col_values("t", def.name, out.data()));
+    char* const values = out(size * model_.count());
+    BOTH({model_.rows.empty() ? PF_NOMORE : PF_NORMAL},
+         TEV8R1_PF_get_col_values("t", def.name, values));
     for (int i = 0; i < model_.count(); ++i) {
-      EXPECT_EQ(load_value(def, &out[i * size]), model_.rows[i][column]);
+      EXPECT_EQ(load_value(def, values + i * size), model_.rows[i][column]);
     }
   }
   void check_value() {
     const int column = any_column();
     const Value value = random_key(column);
-    const Column& c = model_.columns[column];
-    expect("check " + c.text(value), model_.check_value(column, value),
-           TEV8R1_validate_row_value("t", c.def.name, value.c_str()));
+    const char* const name = model_.columns[column].def.name;
+    BOTH(model_.check_value(column, value), TEV8R1_validate_row_value("t", name, value.c_str()));
   }
 
   std::mt19937 random_;
   Model model_;
+  std::string out_;
   int names_ = 0;
 };
 
