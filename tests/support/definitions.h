@@ -10,7 +10,7 @@
 namespace tevpf {
 
 inline constexpr std::int32_t kInt = PF_TYPE_INT, kReal = PF_TYPE_REAL, kText = PF_TYPE_STRING,
-                              kDouble = PF_TYPE_DOUBLE, kShort = PF_TYPE_SHORT;
+                              kDouble = PF_TYPE_DOUBLE;
 
 struct Bounds {
   double min = -1000, max = 1000;

@@ -74,7 +74,7 @@ TEST_F(TableRules, RefusedDefinitionsChangeNothing) {
       {nullptr, col("n", kInt, 0, {5, 4}), PF_DUPLICATE, {"column n", "table t"}},
       {nullptr, indexed(col("x", 99, 0), true), PF_BADUNIQUE, kEmpty},
       {nullptr, col("x", 16, 0), PF_BADTYPE, {"column", "16"}},
-      {nullptr, col("x", kShort, 0, {5, 4}), PF_BADRANGE, {"5", ""}},
+      {nullptr, col("x", PF_TYPE_SHORT, 0, {5, 4}), PF_BADRANGE, {"5", ""}},
       {nullptr, col("x", kReal, 0, {1.5, 1.25}), PF_BADRANGE, {"1.5", ""}},
       {nullptr, col("x", kReal, 5, {1, kNan}), PF_BADRANGE, {"1", ""}},
       {nullptr, col("x", kDouble, 5, {kNan, 1, 0}), PF_BADPREC, {"0", "x"}},
@@ -198,7 +198,7 @@ TEST(CompareTest, RealsWithinTheToleranceAreEqual) {
   const std::int32_t five = 5, seven = 7;
   EXPECT_EQ(TEV8R1_compare(kInt, &five, &seven, 100), kLess);
   const std::int16_t minus = -1, one = 1;
-  EXPECT_EQ(TEV8R1_compare(kShort, &one, &minus, 100), kGreater);
+  EXPECT_EQ(TEV8R1_compare(PF_TYPE_SHORT, &one, &minus, 100), kGreater);
   EXPECT_REFUSED(TEV8R1_compare(16, &five, &seven, 0), PF_BADTYPE, {"value", "16"});
   EXPECT_REFUSED(TEV8R1_compare(10, &five, &seven, 0), PF_BADTYPE, {"value", "10"});
 }
