@@ -17,7 +17,7 @@ struct Def {
   double value = 0, max = 100, min = -100;
   std::int32_t precision = 6;  // reals and doubles
   std::string text{};          // strings
-  std::int32_t length = 0;     // strings: as handed in or as kept
+  std::int32_t length = 0;  // strings: as handed in or as kept; negative: no text, if it is empty
 };
 
 // A definition for the interface; it points to the texts of `def`.
@@ -29,7 +29,8 @@ inline TEVPF_PARAM_DEF to_c(const Def& def) {
   std::memcpy(c.units, def.units.data(), std::min(def.units.size(), sizeof c.units));
   if (def.description) c.description = const_cast<char*>(def.description->c_str());
   if (def.type == PF_TYPE_STRING) {
-    c.part.str = {def.length, const_cast<char*>(def.text.c_str())};
+    const bool absent = def.text.empty() && def.length < 0;
+    c.part.str = {def.length, absent ? nullptr : const_cast<char*>(def.text.c_str())};
   } else if (tevpf::is_number_type(def.type)) {
     tevpf::with_number(def.type, [&](auto tag) {
       using T = decltype(tag);
@@ -43,7 +44,8 @@ inline TEVPF_PARAM_DEF to_c(const Def& def) {
 inline std::string text_of(const TEVPF_PARAM_DEF& c) {
   char part[200] = "";
   if (c.type == PF_TYPE_STRING) {
-    std::snprintf(part, sizeof part, "'%s' of length %d", c.part.str.value, c.part.str.length);
+    std::snprintf(part, sizeof part, "'%s' of length %d",
+                  c.part.str.value == nullptr ? "" : c.part.str.value, c.part.str.length);
   } else {
     tevpf::with_number(c.type, [&](auto tag) {
       const auto& number = tevpf::number_part<decltype(tag)>(c);
@@ -65,16 +67,3 @@ inline Def as_kept(Def def) {
   def.length = static_cast<std::int32_t>(def.text.size());
   return def;
 }
-
-// A record with buffers of exactly the given sizes, for the operations that deliver definitions.
-struct DefBuffers {
-  DefBuffers(std::int32_t value_size, std::int32_t desc_size)
-      : value(static_cast<std::size_t>(value_size), '?'),
-        description(static_cast<std::size_t>(desc_size), '?') {
-    c.description = description.data();
-    c.part.str.value = value.data();
-  }
-
-  std::vector<char> value, description;
-  TEVPF_PARAM_DEF c{};
-};
