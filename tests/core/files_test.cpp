@@ -23,41 +23,42 @@ class FilesTest : public LibraryTest {
  protected:
   std::string at(const std::string& name) const { return dir_ / name; }
   static TEVPF_STATUS open(const std::string& name) { return TEV8R1_PF_open(name.c_str()); }
-
-  // Refused, and the error context names the file.
-  static void expect_refused(TEVPF_STATUS got, TEVPF_STATUS expected, const std::string& file) {
-    EXPECT_EQ(got, expected);
-    EXPECT_EQ(error_texts(), (ErrorTexts{file, ""}));
+  static TEVPF_STATUS save(const std::string& name) { return TEV8R1_PF_save(name.c_str()); }
+  static TEVPF_STATUS add_list(const char* name = "L") {
+    return TEV8R1_PF_create_elem(name, "", PF_ELEM_LIST);
   }
   // The current file's name without its folder; "" when none is current.
-  std::string current() const {
+  static std::string current() {
     char name[TEVPF_FILE_NAME_SIZE] = "";
     TEV8R1_PF_inq_current_file(name);
     EXPECT_EQ(error_texts(), kEmpty);
     return fs::path(name).filename();
   }
-
-  // A file with one list of that name, saved and closed.
-  void make(const std::string& path, const char* list) const {
+  // A file with one list, 120 bytes, saved and closed.
+  static void make(const std::string& path) {
     ASSERT_EQ(open(path), PF_NEWFILE);
-    ASSERT_EQ(TEV8R1_PF_create_elem(list, "", PF_ELEM_LIST), PF_NORMAL);
+    ASSERT_EQ(add_list(), PF_NORMAL);
     ASSERT_EQ(TEV8R1_PF_close(1), PF_NORMAL);
+    ASSERT_EQ(read_file(path).size(), 120u);
+  }
+  static void set_mode(const std::string& path, mode_t mode) {
+    EXPECT_EQ(chmod(path.c_str(), mode), 0);
+  }
+
+  // Calls in a child process, as an ordinary user when the tests run as root.
+  static int in_child(const std::function<void()>& body, bool as_user) {
+    const pid_t child = fork();
+    if (child == 0) {
+      if (as_user && getuid() == 0 && (setgid(65534) != 0 || setuid(65534) != 0)) _exit(2);
+      body();
+      std::fflush(nullptr);
+      _exit(HasFailure() ? 1 : 0);
+    }
+    int status = -1;
+    waitpid(child, &status, 0);
+    return status;
   }
 };
-
-// Calls in a child process, as an ordinary user when the tests run as root.
-int in_child(const std::function<void()>& body, bool as_user) {
-  const pid_t child = fork();
-  if (child == 0) {
-    if (as_user && getuid() == 0 && (setgid(65534) != 0 || setuid(65534) != 0)) _exit(2);
-    body();
-    std::fflush(nullptr);
-    _exit(testing::Test::HasFailure() ? 1 : 0);
-  }
-  int status = -1;
-  waitpid(child, &status, 0);
-  return status;
-}
 
 TEST_F(FilesTest, ClosingMakesTheNeighbourCurrent) {
   // The files opened, the one made current, and those current after each close.
@@ -70,8 +71,7 @@ TEST_F(FilesTest, ClosingMakesTheNeighbourCurrent) {
       EXPECT_EQ(current(), std::string{name});
     }
     set_error_texts();
-    EXPECT_EQ(TEV8R1_PF_change_file(at(chosen).c_str()), PF_NORMAL);
-    EXPECT_EQ(error_texts(), kEmpty);
+    expect_answer(TEV8R1_PF_change_file(at(chosen).c_str()), PF_NORMAL, kEmpty);
     for (const char name : then) {
       EXPECT_EQ(TEV8R1_PF_close(0), PF_NORMAL);
       EXPECT_EQ(current(), std::string{name});
@@ -84,59 +84,56 @@ TEST_F(FilesTest, ClosingMakesTheNeighbourCurrent) {
 }
 
 TEST_F(FilesTest, AnOpenFileIsNotOpenedAgain) {
-  make(at("a"), "L");
-  EXPECT_EQ(open(at("a")), PF_NORMAL);
-  EXPECT_EQ(error_texts(), kUntouched);
-  EXPECT_EQ(open(at("b")), PF_NEWFILE);
-  set_error_texts();
-  EXPECT_EQ(open(at("a")), PF_FILEOPEN);
-  EXPECT_EQ(error_texts(), kEmpty);
+  make(at("a"));
+  write_file(at("empty"), "");
+  write_file(at("text"), "Dear reader");
+  expect_answer(open(at("a")), PF_NORMAL);
+  expect_answer(open(at("b")), PF_NEWFILE);
+  expect_answer(open(at("a")), PF_FILEOPEN, kEmpty);
   EXPECT_EQ(current(), "b");
   EXPECT_EQ(TEV8R1_PF_change_file("a"), PF_NOFILE);  // not by another name
-  write_file(at("empty"), "");
   EXPECT_EQ(open(at("empty")), PF_NORMAL);
   EXPECT_EQ(TEV8R1_PF_close(0), PF_NORMAL);
   EXPECT_EQ(read_file(at("empty")), "");
   // A file that is none: closed again, not deleted, and its neighbour is current.
-  write_file(at("text"), "Dear reader");
-  expect_refused(open(at("text")), PF_BADFILE, at("text"));
+  expect_answer(open(at("text")), PF_BADFILE, {at("text"), ""});
   EXPECT_EQ(current(), "b");
   EXPECT_EQ(read_file(at("text")), "Dear reader");
-  expect_refused(open(dir_.path()), PF_OPENFAIL, dir_.path());
+  expect_answer(open(dir_.path()), PF_OPENFAIL, {dir_.path(), ""});
 }
 
 TEST_F(FilesTest, NamesAreLookedUpAndHaveUpTo257Characters) {
+  const std::string folder = at(std::string(100, 'd'));
+  const std::string longest = folder + "/" + std::string(256 - folder.size(), 'f');
+  fs::create_directory(folder);
   setenv("PFDIR", "/nowhere", 1);  // the "$" is part of the name
-  EXPECT_EQ(open("$PFDIR/a"), PF_OPENFAIL);
-  EXPECT_EQ(error_texts(), (ErrorTexts{"$PFDIR/a", kUntouched.value}));
-  setenv("$PFDIR", dir_.path().c_str(), 1);
-  EXPECT_EQ(open("$PFDIR/a"), PF_NEWFILE);
-  EXPECT_EQ(TEV8R1_PF_change_file(at("a").c_str()), PF_NORMAL);
-  EXPECT_EQ(TEV8R1_PF_change_file("$PFDIR/a"), PF_NOFILE);
-  EXPECT_EQ(open("$PFDIR/a"), PF_FILEOPEN);
-  setenv("$PFDIR", at("whole").c_str(), 1);
-  EXPECT_EQ(open("$PFDIR"), PF_NEWFILE);
-  EXPECT_EQ(current(), "whole");
-  setenv("$PFDIR", std::string(300, 'v').c_str(), 1);
-  expect_refused(open("$PFDIR/a"), PF_OPENFAIL, std::string(256, 'v'));
+  expect_answer(open("$PFDIR/a"), PF_OPENFAIL, {"$PFDIR/a", kUntouched.value});
+  const struct {
+    std::string value, name, found;
+    TEVPF_STATUS status;
+  } cases[] = {{dir_.path(), "$PFDIR/a", "a", PF_NEWFILE},
+               {dir_.path(), "$PFDIR/a", "a", PF_FILEOPEN},
+               {at("whole"), "$PFDIR", "whole", PF_NEWFILE},
+               {std::string(300, 'v'), "$PFDIR/a", std::string(256, 'v'), PF_OPENFAIL},
+               {"", longest, fs::path(longest).filename(), PF_NEWFILE},
+               {"", longest + "f", longest.substr(0, 256), PF_OPENFAIL}};
+  for (const auto& c : cases) {
+    SCOPED_TRACE(c.name);
+    setenv("$PFDIR", c.value.c_str(), 1);
+    set_error_texts();
+    EXPECT_EQ(open(c.name), c.status);
+    EXPECT_EQ(c.status == PF_OPENFAIL ? error_texts().item : current(), c.found);
+    EXPECT_EQ(TEV8R1_PF_change_file("$PFDIR/a"), PF_NOFILE);
+  }
   unsetenv("$PFDIR");
   unsetenv("PFDIR");
-
-  const std::string folder = at(std::string(100, 'd'));
-  fs::create_directory(folder);
-  const std::string longest = folder + "/" + std::string(256 - folder.size(), 'f');
-  EXPECT_EQ(open(longest), PF_NEWFILE);
-  EXPECT_EQ(current(), fs::path(longest).filename());
-  expect_refused(open(longest + "f"), PF_OPENFAIL, longest.substr(0, 256));
   EXPECT_EQ(TEV8R1_PF_save(nullptr), PF_NORMAL);
 }
 
 TEST_F(FilesTest, InitialisingTwiceKeepsTheFiles) {
   EXPECT_EQ(open(at("a")), PF_NEWFILE);
   setenv("TEV8R1_debug", "", 1);
-  set_error_texts();
-  EXPECT_EQ(TEV8R1_PF_init(), PF_INITDONE);
-  EXPECT_EQ(error_texts(), kUntouched);
+  expect_answer(TEV8R1_PF_init(), PF_INITDONE);
   EXPECT_NE(tevpf::library.debug_value, nullptr);
   unsetenv("TEV8R1_debug");
   EXPECT_EQ(TEV8R1_PF_init(), PF_INITDONE);
@@ -153,42 +150,36 @@ TEST_F(FilesTest, InitialisingTwiceKeepsTheFiles) {
 TEST_F(FilesTest, AllocationSettings) {
   const std::int32_t cases[][4] = {{-1, 5, 25, 5}, {3, INT32_MIN, 3, 5}, {0, 0, 25, 10}};
   for (const auto& [initial, increment, initial_then, increment_then] : cases) {
-    EXPECT_EQ(TEV8R1_PF_set_memory_allocation(initial, increment),
-              initial < 0 || increment < 0 ? PF_BADARG : PF_NORMAL);
+    expect_answer(TEV8R1_PF_set_memory_allocation(initial, increment),
+                  initial < 0 || increment < 0 ? PF_BADARG : PF_NORMAL);
     EXPECT_EQ(tevpf::library.alloc_initial, initial_then);
     EXPECT_EQ(tevpf::library.alloc_increment, increment_then);
-    EXPECT_EQ(error_texts(), kUntouched);
   }
 }
 
 TEST_F(FilesTest, AReadOnlyFileStaysOpenRatherThanBeSaved) {
-  make(at("a"), "L");
-  chmod(dir_.path().c_str(), 0777);
-  chmod(at("a").c_str(), 0444);
+  make(at("a"));
+  write_file(at("blind"), "Dear reader");
+  set_mode(dir_.path(), 0777);
+  set_mode(at("a"), 0444);
+  set_mode(at("blind"), 0222);
   const auto body = [&] {
     std::int32_t access = 7;
     ASSERT_EQ(open(at("a")), PF_NORMAL);
     EXPECT_EQ(TEV8R1_PF_inq_file_access(&access), PF_NORMAL);
     EXPECT_EQ(access, 0);
-    const std::function<TEVPF_STATUS()> saves[] = {
-        [] { return TEV8R1_PF_save(nullptr); },
-        [&] { return TEV8R1_PF_save(at("a").c_str()); },
-        [] { return TEV8R1_PF_close(1); },
-    };
-    for (const auto& save : saves) {
-      set_error_texts();
-      expect_refused(save(), PF_NOPRIV, at("a"));
-      EXPECT_EQ(current(), "a");
-    }
-    EXPECT_EQ(TEV8R1_PF_save(at("copy").c_str()), PF_NORMAL);
-    chmod(at("copy").c_str(), 0444);
-    expect_refused(TEV8R1_PF_save(at("copy").c_str()), PF_NOPRIV, at("copy"));
+    const ErrorTexts texts{at("a"), ""};
+    expect_answer(TEV8R1_PF_save(nullptr), PF_NOPRIV, texts);
+    expect_answer(save(at("a")), PF_NOPRIV, texts);
+    expect_answer(TEV8R1_PF_close(1), PF_NOPRIV, texts);
+    EXPECT_EQ(current(), "a");
+    EXPECT_EQ(save(at("copy")), PF_NORMAL);
+    set_mode(at("copy"), 0444);
+    expect_answer(save(at("copy")), PF_NOPRIV, {at("copy"), ""});
     EXPECT_EQ(TEV8R1_PF_close(0), PF_NORMAL);
     // What may be written but not read is emptied and new.
-    write_file(at("blind"), "Dear reader");
-    chmod(at("blind").c_str(), 0222);
     EXPECT_EQ(open(at("blind")), PF_NEWFILE);
-    EXPECT_EQ(TEV8R1_PF_save(nullptr), PF_NORMAL);
+    EXPECT_EQ(save(at("blind")), PF_NORMAL);
     EXPECT_EQ(TEV8R1_PF_close(0), PF_NORMAL);
   };
   EXPECT_EQ(in_child(body, true), 0);
@@ -197,61 +188,60 @@ TEST_F(FilesTest, AReadOnlyFileStaysOpenRatherThanBeSaved) {
 }
 
 TEST_F(FilesTest, ReplacingKeepsModeOwnerAndLinks) {
-  make(at("a"), "L");
-  chmod(at("a").c_str(), 04640);
+  make(at("a"));
+  set_mode(at("a"), 04640);
   const bool given_away = chown(at("a").c_str(), 12, 34) == 0;
   EXPECT_EQ(given_away, getuid() == 0);
-  chmod(at("a").c_str(), 04640);
+  set_mode(at("a"), 04640);
   fs::create_symlink("a", at("link"));
   struct stat before, after;
   stat(at("a").c_str(), &before);
   ASSERT_EQ(open(at("link")), PF_NORMAL);
-  ASSERT_EQ(TEV8R1_PF_create_elem("L2", "", PF_ELEM_LIST), PF_NORMAL);
+  ASSERT_EQ(add_list("L2"), PF_NORMAL);
   EXPECT_EQ(TEV8R1_PF_save(nullptr), PF_NORMAL);
   stat(at("a").c_str(), &after);
   EXPECT_NE(after.st_ino, before.st_ino);
   EXPECT_EQ(after.st_mode, before.st_mode);
   EXPECT_EQ(after.st_uid, before.st_uid);
   EXPECT_EQ(after.st_gid, before.st_gid);
-  EXPECT_TRUE(fs::is_symlink(at("link")));
   EXPECT_EQ(after.st_size, 240);
+  EXPECT_TRUE(fs::is_symlink(at("link")));
   // A file of two names is written where it stands.
   fs::create_hard_link(at("a"), at("second"));
-  ASSERT_EQ(TEV8R1_PF_create_elem("L3", "", PF_ELEM_LIST), PF_NORMAL);
+  ASSERT_EQ(add_list("L3"), PF_NORMAL);
   EXPECT_EQ(TEV8R1_PF_save(nullptr), PF_NORMAL);
   EXPECT_EQ(read_file(at("second")).size(), 360u);
   EXPECT_EQ(dir_.entries(), (std::set<std::string>{"a", "link", "second"}));
 }
 
 TEST_F(FilesTest, AFileThatMayNotBeWrittenIsNotReplaced) {
-  make(at("a"), "L");
-  chmod(dir_.path().c_str(), 0777);
-  chmod(at("a").c_str(), 0666);
-  const auto body = [&] {
+  make(at("a"));
+  set_mode(dir_.path(), 0777);
+  set_mode(at("a"), 0666);
+  const auto adds_a_list = [&] {
     ASSERT_EQ(open(at("a")), PF_NORMAL);
-    ASSERT_EQ(TEV8R1_PF_create_elem("L2", "", PF_ELEM_LIST), PF_NORMAL);
+    ASSERT_EQ(add_list("L2"), PF_NORMAL);
     EXPECT_EQ(TEV8R1_PF_save(nullptr), PF_NORMAL);  // another's file, in a folder for all
     EXPECT_EQ(read_file(at("a")).size(), 240u);
   };
-  EXPECT_EQ(in_child(body, true), 0);
-  fs::resize_file(at("a"), 120);     // without the second list
-  chmod(dir_.path().c_str(), 0555);  // no place for a new image
-  EXPECT_EQ(in_child(body, true), 0);
-  chmod(dir_.path().c_str(), 0777);
+  EXPECT_EQ(in_child(adds_a_list, true), 0);
+  fs::resize_file(at("a"), 120);  // without the second list
+  set_mode(dir_.path(), 0555);    // no place for a new image
+  EXPECT_EQ(in_child(adds_a_list, true), 0);
+  set_mode(dir_.path(), 0777);
 
   const auto locked = [&] {
     ASSERT_EQ(open(at("mine")), PF_NEWFILE);
-    ASSERT_EQ(TEV8R1_PF_create_elem("L", "", PF_ELEM_LIST), PF_NORMAL);
-    chmod(at("mine").c_str(), 0444);
+    ASSERT_EQ(add_list(), PF_NORMAL);
+    set_mode(at("mine"), 0444);
     for (int i = 0; i < 2; ++i) {
-      expect_refused(TEV8R1_PF_save(nullptr), PF_OPENFAIL, at("mine"));
+      expect_answer(TEV8R1_PF_save(nullptr), PF_OPENFAIL, {at("mine"), ""});
       EXPECT_EQ(read_file(at("mine")), "");
     }
-    chmod(at("mine").c_str(), 0644);
+    set_mode(at("mine"), 0644);
     EXPECT_EQ(TEV8R1_PF_save(nullptr), PF_NORMAL);
-    EXPECT_EQ(read_file(at("mine")).size(), 120u);
-    chmod(at("mine").c_str(), 0444);
-    ASSERT_EQ(TEV8R1_PF_create_elem("L2", "", PF_ELEM_LIST), PF_NORMAL);
+    set_mode(at("mine"), 0444);
+    ASSERT_EQ(add_list("L2"), PF_NORMAL);
     EXPECT_EQ(TEV8R1_PF_close(1), PF_OPENFAIL);
     EXPECT_EQ(current(), "");
     EXPECT_EQ(read_file(at("mine")).size(), 120u);
@@ -270,19 +260,19 @@ TEST_F(FilesTest, AFullDiskKeepsTheOldFile) {
         mount("tmpfs", at("disk").c_str(), "tmpfs", 0, size) != 0) {
       _exit(kNotAllowed);
     }
-    make(at("disk/a"), "L");
+    make(at("disk/a"));
     const std::string old = read_file(at("disk/a"));
     ASSERT_EQ(open(at("disk/a")), PF_NORMAL);
     for (int i = 0; i < 1000; ++i) {
       ASSERT_EQ(TEV8R1_PF_create_elem(std::to_string(i).c_str(), "", PF_ELEM_TABLE), PF_NORMAL);
     }
     for (int i = 0; i < 2; ++i) {
-      expect_refused(TEV8R1_PF_save(nullptr), PF_OPENFAIL, at("disk/a"));
+      expect_answer(TEV8R1_PF_save(nullptr), PF_OPENFAIL, {at("disk/a"), ""});
       EXPECT_EQ(read_file(at("disk/a")), old);
       EXPECT_EQ(std::distance(fs::directory_iterator(at("disk")), {}), 1);
     }
-    EXPECT_EQ(TEV8R1_PF_save(at("disk/copy").c_str()), PF_OPENFAIL);
-    EXPECT_EQ(TEV8R1_PF_save(at("copy").c_str()), PF_NORMAL);
+    EXPECT_EQ(save(at("disk/copy")), PF_OPENFAIL);
+    EXPECT_EQ(save(at("copy")), PF_NORMAL);
     EXPECT_EQ(read_file(at("copy")).size(), 120u + 1000 * 132);
     EXPECT_EQ(TEV8R1_PF_close(1), PF_OPENFAIL);
     EXPECT_EQ(read_file(at("disk/a")), old);
@@ -297,9 +287,8 @@ TEST_F(FilesTest, AFullDiskKeepsTheOldFile) {
 
 // The name stands for another file, for none, for a folder: what is in memory is what it shall hold.
 TEST_F(FilesTest, AFileChangedUnderneathIsWrittenAgain) {
-  make(at("a"), "L");
+  make(at("a"));
   const std::string own = read_file(at("a"));
-  ASSERT_EQ(own.size(), 120u);
   ASSERT_EQ(open(at("a")), PF_NORMAL);
   write_file(at("other"), "other");
   fs::rename(at("other"), at("a"));
@@ -311,15 +300,15 @@ TEST_F(FilesTest, AFileChangedUnderneathIsWrittenAgain) {
   fs::remove(at("a"));
   fs::create_directory(at("a"));
   for (const std::string& path : {at("a"), at("no/folder"), std::string("/dev/full")}) {
-    expect_refused(TEV8R1_PF_save(path == at("a") ? nullptr : path.c_str()), PF_OPENFAIL, path);
+    expect_answer(save(path), PF_OPENFAIL, {path, ""});
   }
-  EXPECT_EQ(TEV8R1_PF_save(at("copy").c_str()), PF_NORMAL);
+  EXPECT_EQ(save(at("copy")), PF_NORMAL);
   EXPECT_EQ(read_file(at("copy")), own);
   // A new file whose folder is gone: tried once, and not deleted at its end.
   const std::string away = at("folder");
   fs::create_directory(away);
   ASSERT_EQ(open(away + "/b"), PF_NEWFILE);
-  EXPECT_EQ(TEV8R1_PF_save(at("empty").c_str()), PF_NORMAL);
+  EXPECT_EQ(save(at("empty")), PF_NORMAL);
   EXPECT_EQ(tevpf::library.current_file->new_file, 1);  // a copy leaves the file as it is
   fs::remove_all(away);
   EXPECT_EQ(TEV8R1_PF_save(nullptr), PF_OPENFAIL);

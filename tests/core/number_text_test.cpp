@@ -37,14 +37,5 @@ TEST(NumberText, GeneralGivesTheBytesOfPrintf) {
   }
 }
 
-TEST(NumberText, DecimalAtTheEndsOfTheTypes) {
-  for (const std::int64_t number :
-       {INT64_MIN, INT64_MAX, std::int64_t{INT32_MIN} - 1, std::int64_t{INT32_MIN},
-        std::int64_t{INT32_MAX} + 1, std::int64_t{0}, std::int64_t{-7}}) {
-    char text[21];
-    EXPECT_EQ(std::string(text, write_decimal(text, number)), std::to_string(number));
-  }
-}
-
 }  // namespace
 }  // namespace tevpf

@@ -4,9 +4,11 @@
 #include <gtest/gtest.h>
 
 #include <cstdio>
+#include <source_location>
 #include <string>
 
 #include "core/error_context.h"
+#include "include/tevpf.h"
 
 struct ErrorTexts {
   std::string item, value;
@@ -25,4 +27,14 @@ inline ErrorTexts error_texts() { return {tevpf::err_item, tevpf::err_value}; }
 
 inline std::ostream& operator<<(std::ostream& out, const ErrorTexts& texts) {
   return out << '"' << texts.item << "\", \"" << texts.value << '"';
+}
+
+// What a call answered and what it left in the error context, which is then ready for the next one.
+inline void expect_answer(TEVPF_STATUS got, TEVPF_STATUS status,
+                          const ErrorTexts& texts = kUntouched,
+                          std::source_location at = std::source_location::current()) {
+  const testing::ScopedTrace trace(at.file_name(), static_cast<int>(at.line()), "the call");
+  EXPECT_EQ(got, status);
+  EXPECT_EQ(error_texts(), texts);
+  set_error_texts();
 }
