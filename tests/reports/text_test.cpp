@@ -1,0 +1,103 @@
+// Texts in reports: long ones over several lines, control characters as backslash sequences and back.
+#include <gtest/gtest.h>
+
+#include <cstdlib>
+#include <cstring>
+#include <random>
+#include <string>
+
+#include "reports/display.h"
+
+namespace {
+
+TEST(Display, LinesBreakBehindWhiteSpaceOrWithinWords) {
+  const struct {
+    const char* label;
+    std::int32_t first, width;
+    const char *text, *shown;
+  } cases[] = {
+      {"exactly the width", 1, 10, "0123456789", "0123456789"},
+      {"indented at once", 0, 10, "0123456789", ">>0123456789"},
+      {"hard break", 1, 10, "0123456789a", "01234567\\\n>>89a"},
+      {"blank at the last place", 1, 10, "0123456 89a", "0123456 \\\n>>89a"},
+      {"blanks across the end", 1, 10, "01 4567   b", "01 \\\n>>4567   b"},
+      {"blank one too late", 1, 10, "01234567 9a", "01234567\\\n>> 9a"},
+      {"behind several blanks", 1, 10, "01   56789a", "01   \\\n>>56789a"},
+      {"form feed, vertical tab", 1, 10, "01\v\f4567\xFF\xA0z", "01\v\f\\\n>>4567\xFF\xA0z"},
+      {"blanks at the front only", 0, 10, "  23456789a", ">>  \\\n>>23456789a"},
+      {"nothing but blanks", 1, 5, "      ", "   \\\n>>   "},
+      {"three lines", 1, 6, "%d %s %x", "%d \\\n>>%s %x"},
+      {"width below 3", 1, -7, "abcd", "a\\\n>>bcd"},
+      {"empty", 0, 3, "", ">>"},
+  };
+  for (const auto& c : cases) {
+    char shown[64] = "";
+    std::FILE* const stream = fmemopen(shown, sizeof shown, "w");
+    std::fputs("before|", stream);
+    EXPECT_EQ(TEV8R1_display_string_value(c.first, c.width, c.text, stream, ">>"),
+              std::strchr(c.shown, '\n') != nullptr ? PF_NOMORE : PF_NORMAL)
+        << c.label;
+    std::fputs("|after", stream);
+    std::fclose(stream);
+    EXPECT_EQ(shown, "before|" + std::string(c.shown) + "|after") << c.label;
+  }
+}
+
+TEST(Display, OnStandardOutputLinesGoOnWithABlank) {
+  testing::internal::CaptureStdout();
+  TEV8R1_display_string_value(1, 4, "abcdef", stdout, "> ");
+  std::fflush(stdout);
+  EXPECT_EQ(testing::internal::GetCapturedStdout(), "ab \n> cdef");
+}
+
+std::string read_back(std::string text) {
+  std::int32_t length = -1;
+  EXPECT_EQ(TEV8R1_insert_escape_chars(text.data(), &length), PF_NORMAL);
+  EXPECT_EQ(text.c_str()[length], '\0');
+  return text.substr(0, static_cast<std::size_t>(length));
+}
+
+// Any bytes, special ones often, with any number of bytes to spare in the block.
+TEST(Escape, RandomTextsComeBackAndBlocksGrowByTens) {
+  std::mt19937 random(20240611);
+  for (int round = 0; round < 20000; ++round) {
+    std::string text(random() % 60, '\0');
+    for (char& c : text) {
+      c = random() % 2 == 0 ? "\n\t\f\b\r\v\\8n0"[random() % 10]
+                            : static_cast<char>(1 + random() % 255);
+    }
+    auto used = static_cast<std::int32_t>(text.size() + 1);
+    std::int32_t size = used + static_cast<std::int32_t>(random() % 15), grown = size;
+    for (const char c : text) {  // one expansion after the other
+      if (std::strchr("\n\t\f\b\r\v\\", c) != nullptr && grown - 1 <= used++) grown += 10;
+    }
+    char* block = static_cast<char*>(std::malloc(static_cast<std::size_t>(size)));
+    std::memcpy(block, text.c_str(), text.size() + 1);
+    ASSERT_EQ(TEV8R1_remove_escape_chars(&size, &block), PF_NORMAL);
+    const std::string escaped = block;
+    std::free(block);
+    ASSERT_EQ(size, grown) << "round " << round;
+    ASSERT_EQ(escaped.find_first_of("\n\t\f\b\r\v"), std::string::npos);
+    ASSERT_EQ(read_back(escaped), text) << "round " << round;
+  }
+}
+
+TEST(Escape, SequencesStandForCharacters) {
+  using namespace std::string_literals;
+  const struct {
+    std::string written, meant;
+  } cases[] = {{"", ""},
+               {R"(a\tb\bc\fd\ve\r\n)", "a\tb\bc\fd\ve\r\n"},
+               {R"(\\n)", R"(\n)"},
+               {R"(\101\60)", "A0"},
+               {R"(\0123)", "\n3"},
+               {R"(\777\18)", "\377\0018"},
+               {R"(\q\8\9\")", "q89\""},
+               {R"(end\)", R"(end\)"},
+               {R"(\\\)", R"(\\)"},
+               {R"(a\0b\nc)", "a\0b\nc"s},
+               {"\\\377x", "\377x"}};
+  for (const auto& c : cases) EXPECT_EQ(read_back(c.written), c.meant) << c.written;
+}
+
+}  // namespace
