@@ -58,6 +58,9 @@ class ListModel : public TempFileTest {
     for (int step = 0; step < steps && !HasFailure(); ++step) {
       name_ = chance(2) ? "alpha" : "beta";
       model_ = &lists_[name_];
+      wanted_ = known_name();
+      found_ = find(wanted_);
+      asked_ = any_position();
       const std::size_t operation = below(std::size(operations));
       SCOPED_TRACE("step " + std::to_string(step) + ", operation " + std::to_string(operation) +
                    " in " + name_);
@@ -121,7 +124,7 @@ class ListModel : public TempFileTest {
     return text;
   }
   // The position of the first match in name order among all parameters but one; -1.
-  std::int32_t find_in_model(const std::string& wanted, std::int32_t without = -1) {
+  std::int32_t find(const std::string& wanted, std::int32_t without = -1) {
     std::int32_t found = -1;
     for (std::int32_t i = 0; i < model_->count(); ++i) {
       if (i == without || !matches(model_->at(i).name, wanted)) continue;
@@ -129,11 +132,8 @@ class ListModel : public TempFileTest {
     }
     return found;
   }
-  std::int32_t find(const std::string& wanted) {
-    const std::int32_t found = find_in_model(wanted);
-    if (found < 0) refuse(PF_NOPARAM, wanted);
-    return found;
-  }
+  TEVPF_STATUS find_wanted() { return found_ < 0 ? refuse(PF_NOPARAM, wanted_) : PF_NORMAL; }
+  bool is_inside(std::int32_t position) { return position >= 0 && position < model_->count(); }
   TEVPF_STATUS check(const Def& def) {
     if (def.name[0] == ' ') return refuse(PF_BADNAME, "");
     if (!tevpf::is_value_type(def.type)) {
@@ -193,82 +193,69 @@ class ListModel : public TempFileTest {
   void add() {
     const Def def = any_def(any_name());
     const TEVPF_PARAM_DEF c = to_c(def);
-    const std::int32_t position = any_position();
-    const TEVPF_STATUS actual = TEV8R1_PF_add_param(list_name(), &c, position);
+    const TEVPF_STATUS actual = TEV8R1_PF_add_param(list_name(), &c, asked_);
     if (model_->free == 0) model_->free = kIncrement;
     const std::string kept = def.name.substr(0, 19);
     const bool known = find(kept) >= 0;
+    refuse(PF_NOPARAM, kept);  // which is what adding looks for, and is glad not to find
     if (!expect(actual, known ? refuse_duplicate(kept) : check(def))) return;
-    model_->params.insert(model_->params.begin() + std::clamp(position, 0, model_->count()),
+    model_->params.insert(model_->params.begin() + std::clamp(asked_, 0, model_->count()),
                           as_kept(def));
     --model_->free;
   }
   void remove() {
-    const std::string name = known_name();
-    const TEVPF_STATUS actual = TEV8R1_PF_delete_param(list_name(), name.c_str());
-    const std::int32_t position = find(name);
-    if (!expect(actual, position < 0 ? PF_NOPARAM : PF_NORMAL)) return;
-    model_->params.erase(model_->params.begin() + position);
+    if (!expect(TEV8R1_PF_delete_param(list_name(), wanted()), find_wanted())) return;
+    model_->params.erase(model_->params.begin() + found_);
     ++model_->free;
   }
   void redefine() {
-    const Def def = any_def(known_name());
+    const Def def = any_def(wanted_);
     const TEVPF_STATUS actual = TEV8R1_PF_modify_param_def(list_name(), to_c(def));
-    const std::int32_t position = find(def.name.substr(0, 19));
-    if (!expect(actual, position < 0 ? TEVPF_STATUS{PF_NOPARAM} : check(def))) return;
-    const std::string name = model_->at(position).name;
-    model_->at(position) = as_kept(def);
-    model_->at(position).name = name;
+    wanted_ = wanted_.substr(0, 19);
+    found_ = find(wanted_);
+    if (!expect(actual, found_ < 0 ? find_wanted() : check(def))) return;
+    const std::string name = model_->at(found_).name;
+    model_->at(found_) = as_kept(def);
+    model_->at(found_).name = name;
   }
   void rename() {
-    const std::string name = known_name(), new_name = chance(4) ? known_name() : any_name();
-    const TEVPF_STATUS actual =
-        TEV8R1_PF_modify_param_name(list_name(), name.c_str(), new_name.c_str());
-    const std::int32_t position = find(name);
-    TEVPF_STATUS expected = PF_NOPARAM;
-    if (position >= 0) {
-      const bool taken = find_in_model(new_name.substr(0, 19), position) >= 0;
-      refuse(PF_NOPARAM, new_name);  // which is what renaming looks for, and is glad not to find
-      expected = taken ? refuse_duplicate(new_name) : TEVPF_STATUS{PF_NORMAL};
+    const std::string name = chance(4) ? known_name() : any_name();
+    const TEVPF_STATUS actual = TEV8R1_PF_modify_param_name(list_name(), wanted(), name.c_str());
+    TEVPF_STATUS expected = find_wanted();
+    if (found_ >= 0) {
+      const bool taken = find(name.substr(0, 19), found_) >= 0;
+      refuse(PF_NOPARAM, name);
+      if (taken) expected = refuse_duplicate(name);
     }
-    if (expect(actual, expected)) model_->at(position).name = new_name.substr(0, 19);
+    if (expect(actual, expected)) model_->at(found_).name = name.substr(0, 19);
   }
   void move() {
-    const std::string name = known_name();
-    std::int32_t to = any_position();
-    const TEVPF_STATUS actual = TEV8R1_PF_move_param(list_name(), name.c_str(), to);
-    const std::int32_t from = find(name);
-    if (to == PF_END_POS) to = model_->count() - 1;
-    const bool inside = to >= 0 && to < model_->count();
-    if (!expect(actual, from < 0 ? PF_NOPARAM : inside ? PF_NORMAL : PF_BADPOS)) return;
-    const Def moved = model_->at(from);
-    model_->params.erase(model_->params.begin() + from);
+    const std::int32_t to = asked_ == PF_END_POS ? model_->count() - 1 : asked_;
+    const TEVPF_STATUS expected = found_ < 0 || is_inside(to) ? find_wanted() : PF_BADPOS;
+    if (!expect(TEV8R1_PF_move_param(list_name(), wanted(), asked_), expected)) return;
+    const Def moved = model_->at(found_);
+    model_->params.erase(model_->params.begin() + found_);
     model_->params.insert(model_->params.begin() + to, moved);
   }
   void change_value() {
-    const std::string name = known_name();
-    const std::int32_t position = find_in_model(name);
-    Def changed = position < 0 ? Def{} : model_->at(position);
+    Def changed = found_ < 0 ? Def{} : model_->at(found_);
     changed.value = any_value(changed.type);
     changed.text = letters(16, "value");
     const TEVPF_PARAM_DEF c = to_c(changed);
     char value[32];
     TEV8R1_load_param_value(&c, value);
-    const TEVPF_STATUS actual = TEV8R1_PF_modify_param(list_name(), name.c_str(), value);
-    const bool outside = changed.type != PF_TYPE_STRING &&
-                         !(changed.value <= changed.max && changed.value >= changed.min);
-    const TEVPF_STATUS expected = find(name) < 0 ? TEVPF_STATUS{PF_NOPARAM}
-                                  : outside ? refuse(PF_RANGE, shown(changed.type, changed.value))
-                                            : TEVPF_STATUS{PF_NORMAL};
-    if (expect(actual, expected)) model_->at(position) = as_kept(changed);
+    TEVPF_STATUS expected = find_wanted();
+    if (found_ >= 0 && changed.type != PF_TYPE_STRING &&
+        !(changed.value <= changed.max && changed.value >= changed.min)) {
+      expected = refuse(PF_RANGE, shown(changed.type, changed.value));
+    }
+    const TEVPF_STATUS actual = TEV8R1_PF_modify_param(list_name(), wanted(), value);
+    if (expect(actual, expected)) model_->at(found_) = as_kept(changed);
   }
   void get_value() {
-    const std::string name = known_name();
-    const std::int32_t position = find(name);
     std::string value(kRoom, '?');
-    expect(TEV8R1_PF_get_param_value(list_name(), name.c_str(), value.data()),
-           position < 0 ? PF_NOPARAM : PF_NORMAL);
-    compare_value(position, value);
+    expect(TEV8R1_PF_get_param_value(list_name(), wanted(), value.data()), find_wanted());
+    compare_value(found_, value);
   }
   void next_value() {
     const std::int32_t position = next();
@@ -284,10 +271,7 @@ class ListModel : public TempFileTest {
   // The sizes of a definition and the definition itself, selected in one of four ways.
   void definition() {
     const char* const list = list_name();
-    const std::string name = known_name();
-    const std::int32_t asked = any_position();
-    const auto before = std::clamp(model_->cursor, 0, model_->count()) - 1;
-    std::int32_t position, type = -1, value_size = -1, desc_size = -1;
+    std::int32_t position = -1, type = -1, value_size = -1, desc_size = -1;
     std::string value(kRoom, '?'), description(kRoom, '?');
     TEVPF_PARAM_DEF out{};
     out.description = description.data();
@@ -300,23 +284,23 @@ class ListModel : public TempFileTest {
         delivered = TEV8R1_PF_get_next_param_def(list, &out);
         break;
       case 1:
-        position = before;
-        sized = TEV8R1_PF_inq_param_size_by_pos(list, before, &type, &value_size, &desc_size);
-        delivered = TEV8R1_PF_get_prev_param_def(list, &out);
-        if (before < 0) refuse(sized = PF_NOMORE, "-1", std::to_string(model_->count()));
+        position = std::clamp(model_->cursor, 0, model_->count()) - 1;
+        delivered = sized = TEV8R1_PF_get_prev_param_def(list, &out);
+        if (position >= 0)
+          TEV8R1_PF_inq_param_size_by_pos(list, position, &type, &value_size, &desc_size);
         break;
       case 2:
-        position = find(name);
-        refusal = PF_NOPARAM;
-        sized = TEV8R1_PF_inq_param_size(list, name.c_str(), &type, &value_size, &desc_size);
-        delivered = TEV8R1_PF_get_param_def(list, name.c_str(), &out);
+        position = found_;
+        refusal = find_wanted();
+        sized = TEV8R1_PF_inq_param_size(list, wanted(), &type, &value_size, &desc_size);
+        delivered = TEV8R1_PF_get_param_def(list, wanted(), &out);
         break;
       default:
-        position = asked >= 0 && asked < model_->count() ? asked : -1;
-        refusal = PF_BADPOS;
-        if (position < 0) refuse(refusal, std::to_string(asked), std::to_string(model_->count()));
-        sized = TEV8R1_PF_inq_param_size_by_pos(list, asked, &type, &value_size, &desc_size);
-        delivered = TEV8R1_PF_get_param_def_by_pos(list, asked, &out);
+        if (is_inside(asked_)) position = asked_;
+        if (position < 0)
+          refusal = refuse(PF_BADPOS, std::to_string(asked_), std::to_string(model_->count()));
+        sized = TEV8R1_PF_inq_param_size_by_pos(list, asked_, &type, &value_size, &desc_size);
+        delivered = TEV8R1_PF_get_param_def_by_pos(list, asked_, &out);
     }
     EXPECT_EQ(sized, delivered);
     EXPECT_TRUE(out.description == description.data()) << "the caller's pointer stays";
@@ -337,30 +321,25 @@ class ListModel : public TempFileTest {
 
   void inquire() {
     std::int32_t count = -1, position = -1, type = -1, place = -1;
-    expect(TEV8R1_PF_inq_num_params(list_name(), &count), PF_NORMAL);
-    EXPECT_EQ(count, model_->count());
-    const std::string name = known_name();
-    const std::int32_t found = find(name);
-    const TEVPF_STATUS expected = found < 0 ? PF_NOPARAM : PF_NORMAL;
-    expect(TEV8R1_inq_param_pos(list_name(), name.c_str(), &position), expected);
-    EXPECT_EQ(position, found);
-    expect(TEV8R1_inq_param_exists(list_name(), name.c_str()), expected);
-    expect(TEV8R1_get_param_type(list_name(), name.c_str(), &type), expected);
-    EXPECT_EQ(type, found < 0 ? -1 : model_->at(found).type);
-    // In the name index: where it stands, or where it would be inserted.
     const TEVPF_LIST& record = list(name_);
+    expect(TEV8R1_PF_inq_num_params(list_name(), &count), PF_NORMAL);
+    expect(TEV8R1_inq_param_pos(list_name(), wanted(), &position), find_wanted());
+    expect(TEV8R1_inq_param_exists(list_name(), wanted()), find_wanted());
+    expect(TEV8R1_get_param_type(list_name(), wanted(), &type), find_wanted());
     expect(TEV8R1_list_binary_search(record.param_ptr, record.num_params, record.index_ptr,
-                                     name.c_str(), &place),
-           expected);
-    const std::string bound = found < 0 ? name : model_->at(found).name;
+                                     wanted(), &place),
+           find_wanted());
+    EXPECT_EQ(count, model_->count());
+    EXPECT_EQ(position, found_);
+    EXPECT_EQ(type, found_ < 0 ? -1 : model_->at(found_).type);
+    // Where it stands in the name index, or where it would be inserted.
+    const std::string bound = found_ < 0 ? wanted_ : model_->at(found_).name;
     EXPECT_EQ(place, std::count_if(model_->params.begin(), model_->params.end(),
                                    [&](const Def& def) { return def.name < bound; }));
   }
   void set_cursor() {
-    const std::int32_t position = any_position();
-    const bool inside = position >= 0 && position < model_->count();
-    const TEVPF_STATUS expected = inside ? PF_NORMAL : PF_BADPOS;
-    if (expect(TEV8R1_set_cur_param(list_name(), position), expected)) model_->cursor = position;
+    const TEVPF_STATUS expected = is_inside(asked_) ? PF_NORMAL : PF_BADPOS;
+    if (expect(TEV8R1_set_cur_param(list_name(), asked_), expected)) model_->cursor = asked_;
   }
   void reset() {
     if (!chance(4)) return;
@@ -370,11 +349,12 @@ class ListModel : public TempFileTest {
   }
   void inquire_default() {
     const std::int32_t type = number(10, 16);
+    TEVPF_STATUS expected = PF_NORMAL;
+    if (!tevpf::is_value_type(type)) {
+      expected = refuse(PF_BADTYPE, "function call", std::to_string(type));
+    }
     TEVPF_PARAM_DEF out{};
-    const TEVPF_STATUS actual = TEV8R1_PF_inq_param_dft(list_name(), type, &out);
-    const bool known = tevpf::is_value_type(type);
-    if (!known) refuse(PF_BADTYPE, "function call", std::to_string(type));
-    if (!expect(actual, known ? PF_NORMAL : PF_BADTYPE)) return;
+    if (!expect(TEV8R1_PF_inq_param_dft(list_name(), type, &out), expected)) return;
     EXPECT_EQ(text_of(out), text_of(model_->default_of(type)));
     std::free(out.description);
     if (type == PF_TYPE_STRING) std::free(out.part.str.value);
@@ -406,11 +386,15 @@ class ListModel : public TempFileTest {
   }
 
   const char* list_name() const { return name_.c_str(); }
+  const char* wanted() const { return wanted_.c_str(); }
 
   std::mt19937 random_{1};
   std::map<std::string, ModelList> lists_{{"alpha", {}}, {"beta", {}}};
   std::string name_;
   ModelList* model_ = nullptr;
+  std::string wanted_;       // a name, perhaps a pattern, of a parameter that is there or not
+  std::int32_t found_ = -1;  // its position
+  std::int32_t asked_ = 0;   // a position that is there or not
   ErrorTexts texts_ = kUntouched;
 };
 

@@ -1,6 +1,7 @@
 // Holds a list against the invariants that every operation must keep.
 #pragma once
 
+#include <algorithm>
 #include <cstdint>
 #include <cstring>
 #include <vector>
@@ -9,51 +10,39 @@
 #include "values/text_compare.h"
 #include "values/value_type.h"
 
-inline bool terminated(const char* field, std::size_t size) {
-  return std::memchr(field, '\0', size) != nullptr;
-}
-
-// The stored bytes of a parameter, and where its description would lie in them.
-inline std::int64_t stored_bytes(const TEVPF_PARAM_DEF& def, std::int64_t& description_place) {
-  const std::int64_t parts[] = {12, 16, 5, 28, 6};
-  std::int64_t bytes = 44 + parts[def.type - PF_TYPE_INT];
-  if (def.type == PF_TYPE_STRING) bytes += def.part.str.length;
-  description_place = def.description == nullptr ? 0 : def.type == PF_TYPE_STRING ? 1 : bytes - 8;
-  if (def.description != nullptr)
-    bytes += static_cast<std::int64_t>(std::strlen(def.description)) + 1;
-  return bytes;
-}
-
 // The first broken rule of one parameter, or null; adds its stored bytes.
 inline const char* broken_rule(const TEVPF_PARAM& param, std::int64_t& bytes) {
   const TEVPF_PARAM_DEF& def = param.def;
   if (!tevpf::is_value_type(def.type)) return "value type";
-  if (!terminated(def.name, sizeof def.name)) return "terminated name";
-  if (!terminated(def.units, sizeof def.units)) return "terminated units";
+  if (std::memchr(def.name, '\0', sizeof def.name) == nullptr) return "terminated name";
+  if (std::memchr(def.units, '\0', sizeof def.units) == nullptr) return "terminated units";
+  constexpr std::int64_t kParts[] = {12, 16, 5, 28, 6};
+  std::int64_t size = 44 + kParts[def.type - PF_TYPE_INT];
+  std::int64_t description_place = size - 8;
   if (def.type == PF_TYPE_STRING) {
-    if (def.part.str.value == nullptr) return "string has a value";
-    const std::size_t length = std::strlen(def.part.str.value);
-    if (static_cast<std::size_t>(def.part.str.length) != length)
+    const auto& string = def.part.str;
+    if (string.value == nullptr || std::size_t(string.length) != std::strlen(string.value))
       return "length of the string value";
+    size += string.length;
+    description_place = 1;
   }
-  std::int64_t description_place;
-  bytes += stored_bytes(def, description_place);
+  if (def.description == nullptr) description_place = 0;
+  if (def.description != nullptr)
+    size += static_cast<std::int64_t>(std::strlen(def.description)) + 1;
+  bytes += size;
   return param.desc_loc == description_place ? nullptr : "desc_loc";
 }
 
 // The first broken rule of the name index, or null.
 inline const char* broken_index_rule(const TEVPF_LIST& list) {
-  std::vector<bool> seen(static_cast<std::size_t>(list.num_params));
-  const char* previous = nullptr;
-  for (std::int32_t place = 0; place < list.num_params; ++place) {
-    const std::int32_t position = list.index_ptr[place];
-    if (position < 0 || position >= list.num_params) return "index entries are positions";
-    if (seen[static_cast<std::size_t>(position)]) return "index holds each position once";
-    seen[static_cast<std::size_t>(position)] = true;
-    const char* const name = list.param_ptr[position].def.name;
-    if (previous != nullptr && std::strcmp(previous, name) >= 0)
-      return "index in order, names unique";
-    previous = name;
+  std::vector<std::int32_t> positions(list.index_ptr, list.index_ptr + list.num_params);
+  std::sort(positions.begin(), positions.end());
+  for (std::int32_t i = 0; i < list.num_params; ++i) {
+    if (positions[std::size_t(i)] != i) return "index holds each position once";
+  }
+  const auto name = [&](std::int32_t i) { return list.param_ptr[list.index_ptr[i]].def.name; };
+  for (std::int32_t i = 1; i < list.num_params; ++i) {
+    if (std::strcmp(name(i - 1), name(i)) >= 0) return "index in order, names unique";
   }
   return nullptr;
 }
