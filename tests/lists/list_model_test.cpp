@@ -50,7 +50,7 @@ class ListModel : public TempFileTest {
     // clang-format off
     static constexpr void (M::*operations[])() = {
         &M::add, &M::add, &M::add, &M::add, &M::add, &M::remove, &M::redefine, &M::redefine,
-        &M::rename, &M::move, &M::change_value, &M::change_value, &M::get_value, &M::next_value,
+        &M::rename, &M::move, &M::change_value, &M::change_value, &M::value, &M::value,
         &M::definition, &M::definition, &M::definition, &M::definition, &M::inquire,
         &M::set_cursor, &M::reset, &M::inquire_default, &M::set_default, &M::replace_by_copy,
         &M::reopen};
@@ -175,15 +175,6 @@ class ListModel : public TempFileTest {
     text.resize(kRoom, '?');
     return text;
   }
-  void compare_value(std::int32_t position, const std::string& value) {
-    std::string wanted(value.size(), '?');
-    if (position >= 0) {
-      const TEVPF_PARAM_DEF c = to_c(model_->at(position));
-      TEV8R1_load_param_value(&c, wanted.data());
-      model_->cursor = position;
-    }
-    EXPECT_EQ(value, wanted);
-  }
   std::int32_t next() const {
     return model_->cursor < model_->count() - 1 ? model_->cursor + 1 : -1;
   }
@@ -252,20 +243,25 @@ class ListModel : public TempFileTest {
     const TEVPF_STATUS actual = TEV8R1_PF_modify_param(list_name(), wanted(), value);
     if (expect(actual, expected)) model_->at(found_) = as_kept(changed);
   }
-  void get_value() {
-    std::string value(kRoom, '?');
-    expect(TEV8R1_PF_get_param_value(list_name(), wanted(), value.data()), find_wanted());
-    compare_value(found_, value);
-  }
-  void next_value() {
-    const std::int32_t position = next();
+  // A value by name, or the next one.
+  void value() {
+    const bool by_name = chance(2);
+    const std::int32_t position = by_name ? found_ : next();
+    std::string value(kRoom, '?'), expected = value;
     char name[TEVPF_NAME_SIZE] = "?";
-    std::string value(kRoom, '?');
-    expect(TEV8R1_PF_get_next_param(list_name(), name, value.data()),
-           position < 0 ? PF_NOMORE : PF_NORMAL);
-    EXPECT_EQ(name, position < 0 ? "?" : model_->at(position).name);
-    if (position < 0 && model_->cursor < INT_MAX) ++model_->cursor;
-    compare_value(position, value);
+    const TEVPF_STATUS refusal = by_name ? find_wanted() : PF_NOMORE;
+    expect(by_name ? TEV8R1_PF_get_param_value(list_name(), wanted(), value.data())
+                   : TEV8R1_PF_get_next_param(list_name(), name, value.data()),
+           position < 0 ? refusal : PF_NORMAL);
+    EXPECT_EQ(name, by_name || position < 0 ? "?" : model_->at(position).name);
+    if (position >= 0) {
+      const TEVPF_PARAM_DEF c = to_c(model_->at(position));
+      TEV8R1_load_param_value(&c, expected.data());
+      model_->cursor = position;
+    } else if (!by_name && model_->cursor < INT_MAX) {
+      ++model_->cursor;
+    }
+    EXPECT_EQ(value, expected);
   }
 
   // The sizes of a definition and the definition itself, selected in one of four ways.

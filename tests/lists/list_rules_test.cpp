@@ -13,7 +13,7 @@ namespace {
 
 class ListRules : public TempFileTest {
  protected:
-  ListRules() { EXPECT_EQ(TEV8R1_PF_create_elem("list", "", PF_ELEM_LIST), PF_NORMAL); }
+  ListRules() { expect_answer(TEV8R1_PF_create_elem("list", "", PF_ELEM_LIST), PF_NORMAL); }
 
   static TEVPF_STATUS add(const Def& def) {
     const TEVPF_PARAM_DEF c = to_c(def);
@@ -28,6 +28,7 @@ class ListRules : public TempFileTest {
 
 TEST_F(ListRules, BoundsOfAFileAreTakenAsTheyAre) {
   ASSERT_EQ(add({PF_TYPE_DOUBLE, "p", "", {}, 0.5, 1, -1}), PF_NORMAL);
+  set_error_texts();
   const struct {
     double max, min, value;
     TEVPF_STATUS status;
@@ -42,23 +43,21 @@ TEST_F(ListRules, BoundsOfAFileAreTakenAsTheyAre) {
     auto& part = list("list").param_ptr[0].def.part.f64;
     part.max = change.max;
     part.min = change.min;
-    set_error_texts();
-    EXPECT_EQ(TEV8R1_PF_modify_param("list", "p", &change.value), change.status) << change.value;
-    EXPECT_EQ(error_texts(), change.texts);
+    expect_answer(TEV8R1_PF_modify_param("list", "p", &change.value), change.status, change.texts);
     EXPECT_EQ(part.value + 0, change.status == PF_NORMAL ? change.value : 0.5);
   }
 }
 
 TEST_F(ListRules, SizesBeyond31BitsAreRefusedBeforeAnythingChanges) {
-  ASSERT_EQ(add({PF_TYPE_STRING, "s"}), PF_NORMAL);
+  add({PF_TYPE_STRING, "s"});
+  set_error_texts();
   TEVPF_LIST& record = list("list");
   record.header.btf = INT_MAX - 5;
   const std::string before = snapshot(true);
-  EXPECT_EQ(add({PF_TYPE_SHORT, "new"}), PF_NOMEM);
-  EXPECT_EQ(error_texts(), kEmpty);
-  EXPECT_EQ(TEV8R1_PF_modify_param("list", "s", "longer"), PF_NOMEM);
+  expect_answer(add({PF_TYPE_SHORT, "new"}), PF_NOMEM, kEmpty);
+  expect_answer(TEV8R1_PF_modify_param("list", "s", "longer"), PF_NOMEM, kEmpty);
   const Def longer{.type = PF_TYPE_STRING, .name = "s", .text = "longer"};
-  EXPECT_EQ(TEV8R1_PF_modify_param_def("list", to_c(longer)), PF_NOMEM);
+  expect_answer(TEV8R1_PF_modify_param_def("list", to_c(longer)), PF_NOMEM, kEmpty);
   EXPECT_TRUE(snapshot(true) == before);
   EXPECT_EQ(TEV8R1_PF_modify_param("list", "s", "short"), PF_NORMAL);
   EXPECT_EQ(record.header.btf, INT_MAX);
@@ -78,9 +77,8 @@ TEST_F(ListRules, StoredSizes) {
   EXPECT_EQ(TEV8R1_calc_param_bytes(PF_TYPE_STRING, "", INT_MAX - 49, &bytes), PF_NOMEM);
   TEVPF_PARAM record{};
   record.def.type = 16;
-  EXPECT_EQ(TEV8R1_construct_param(&record, &bytes), PF_BADTYPE);
-  EXPECT_EQ(error_texts(), (ErrorTexts{"parameter", "16"}));
-  EXPECT_EQ(TEV8R1_load_param_value(&record.def, nullptr), PF_BADTYPE);
+  expect_answer(TEV8R1_construct_param(&record, &bytes), PF_BADTYPE, {"parameter", "16"});
+  expect_answer(TEV8R1_load_param_value(&record.def, nullptr), PF_BADTYPE, {"parameter", "16"});
 }
 
 TEST_F(ListRules, ValuesOfDefinitionsFromText) {
@@ -93,8 +91,7 @@ TEST_F(ListRules, ValuesOfDefinitionsFromText) {
   EXPECT_EQ(store(PF_TYPE_DOUBLE, "2.5"), PF_NORMAL);
   EXPECT_EQ(store(PF_TYPE_DOUBLE, ""), PF_NORMAL);
   EXPECT_EQ(def.part.f64.value + 0, 2.5) << "empty text leaves a double as it was";
-  EXPECT_EQ(store(10, "1"), PF_BADTYPE);
-  EXPECT_EQ(error_texts(), (ErrorTexts{"parameter", "10"}));
+  expect_answer(store(10, "1"), PF_BADTYPE, {"parameter", "10"});
   def.part.str = {-7, nullptr};
   EXPECT_EQ(store(PF_TYPE_STRING, "hello"), PF_NORMAL);
   EXPECT_STREQ(def.part.str.value, "hello");
