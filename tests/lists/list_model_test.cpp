@@ -17,7 +17,7 @@ namespace {
 
 constexpr int kInitial = 3;
 constexpr int kIncrement = 2;
-constexpr std::size_t kRoom = 40;  // for any value
+constexpr int kRoom = 40;  // for any value
 
 // By type, from PF_TYPE_INT on.
 const std::vector<Def> kInitialDefaults = {{PF_TYPE_INT, "", "", {}, 0, INT_MAX, INT_MIN},
@@ -170,10 +170,10 @@ class ListModel : public TempFileTest {
     }
   }
   // A text as it stands in a buffer that was full of question marks.
-  static std::string in_room(std::string text) {
-    text += '\0';
-    text.resize(kRoom, '?');
-    return text;
+  static std::vector<char> in_room(const std::string& text) {
+    std::vector<char> room(text.c_str(), text.c_str() + text.size() + 1);
+    room.resize(kRoom, '?');
+    return room;
   }
   std::int32_t next() const {
     return model_->cursor < model_->count() - 1 ? model_->cursor + 1 : -1;
@@ -268,20 +268,17 @@ class ListModel : public TempFileTest {
   void definition() {
     const char* const list = list_name();
     std::int32_t position = -1, type = -1, value_size = -1, desc_size = -1;
-    std::string value(kRoom, '?'), description(kRoom, '?');
-    TEVPF_PARAM_DEF out{};
-    out.description = description.data();
-    out.part.str.value = value.data();
+    DefBuffers out(kRoom, kRoom);
     TEVPF_STATUS sized, delivered, refusal = PF_NOMORE;
     switch (below(4)) {
       case 0:
         position = next();
         sized = TEV8R1_PF_inq_next_param_size(list, &type, &value_size, &desc_size);
-        delivered = TEV8R1_PF_get_next_param_def(list, &out);
+        delivered = TEV8R1_PF_get_next_param_def(list, &out.c);
         break;
       case 1:
         position = std::clamp(model_->cursor, 0, model_->count()) - 1;
-        delivered = sized = TEV8R1_PF_get_prev_param_def(list, &out);
+        delivered = sized = TEV8R1_PF_get_prev_param_def(list, &out.c);
         if (position >= 0)
           TEV8R1_PF_inq_param_size_by_pos(list, position, &type, &value_size, &desc_size);
         break;
@@ -289,26 +286,26 @@ class ListModel : public TempFileTest {
         position = found_;
         refusal = find_wanted();
         sized = TEV8R1_PF_inq_param_size(list, wanted(), &type, &value_size, &desc_size);
-        delivered = TEV8R1_PF_get_param_def(list, wanted(), &out);
+        delivered = TEV8R1_PF_get_param_def(list, wanted(), &out.c);
         break;
       default:
         if (is_inside(asked_)) position = asked_;
         if (position < 0)
           refusal = refuse(PF_BADPOS, std::to_string(asked_), std::to_string(model_->count()));
         sized = TEV8R1_PF_inq_param_size_by_pos(list, asked_, &type, &value_size, &desc_size);
-        delivered = TEV8R1_PF_get_param_def_by_pos(list, asked_, &out);
+        delivered = TEV8R1_PF_get_param_def_by_pos(list, asked_, &out.c);
     }
     EXPECT_EQ(sized, delivered);
-    EXPECT_TRUE(out.description == description.data()) << "the caller's pointer stays";
+    EXPECT_TRUE(out.c.description == out.description.data()) << "the caller's pointer stays";
     if (!expect(delivered, position < 0 ? refusal : PF_NORMAL)) {
       EXPECT_EQ(type + value_size + desc_size, -3);
       return;
     }
     Def def = model_->at(position);
     def.description = def.description.value_or("");
-    EXPECT_EQ(text_of(out), text_of(def));
-    EXPECT_EQ(description, in_room(*def.description));
-    EXPECT_EQ(value, def.type == PF_TYPE_STRING ? in_room(def.text) : std::string(kRoom, '?'));
+    EXPECT_EQ(text_of(out.c), text_of(def));
+    EXPECT_EQ(out.description, in_room(*def.description));
+    EXPECT_TRUE(def.type != PF_TYPE_STRING || out.value == in_room(def.text));
     EXPECT_EQ(type, def.type);
     EXPECT_EQ(value_size, tevpf::value_size(def.type, def.length));
     EXPECT_EQ(desc_size, std::ssize(*def.description) + 1);

@@ -36,9 +36,6 @@ class Reports : public TableTest {
     }
   }
 
-  static void define(const std::vector<TEVPF_COL_DEF>& defs) {
-    for (const TEVPF_COL_DEF& def : defs) ASSERT_OK(TEV8R1_PF_def_column("t", def)) << def.name;
-  }
   static void add_rows(const std::vector<std::vector<const char*>>& rows) {
     for (const auto& values : rows) {
       std::string row(static_cast<std::size_t>(table().row_wid), '\x55');
@@ -60,7 +57,7 @@ class Reports : public TableTest {
     const std::string wide(55, 'a');
     const TEVPF_COL_DEF x = described(col("x", kReal, 8, {-1e6, 1e6, 3}), wide.c_str());
     define({indexed(described(col("id", kInt, 5, {-9999, 9999}), "identifier"), true), text,
-            indexed(x), y, col("s", kShort, 3, {-32768, 32767}), col("t", kText, 6)});
+            indexed(x), y, col("s", PF_TYPE_SHORT, 3, {-32768, 32767}), col("t", kText, 6)});
     add_rows({{"30", "ab\n", "1.5", "0.25", "7", "end "},
               {"10", "", "-0.0001", "0.1", "-32768", ""},
               {"20", "x\\y", "123456", "2.0", "5", "%d"}});

@@ -67,3 +67,16 @@ inline Def as_kept(Def def) {
   def.length = static_cast<std::int32_t>(def.text.size());
   return def;
 }
+
+// A record with buffers of exactly the given sizes, for the operations that deliver definitions.
+struct DefBuffers {
+  DefBuffers(std::int32_t value_size, std::int32_t desc_size)
+      : value(static_cast<std::size_t>(value_size), '?'),
+        description(static_cast<std::size_t>(desc_size), '?') {
+    c.description = description.data();
+    c.part.str.value = value.data();
+  }
+
+  std::vector<char> value, description;
+  TEVPF_PARAM_DEF c{};
+};
