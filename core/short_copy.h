@@ -9,10 +9,10 @@ namespace tevpf {
 
 // memcpy. From 16 up to 128 bytes go 16 at a time, the last ones over those before.
 inline void copy_short(void* to, const void* from, std::int64_t count) noexcept {
-  constexpr std::int64_t kStep = 16, kShort = 128;
+  constexpr std::int64_t kStep = 16, kMost = 128;
   auto* const out = static_cast<unsigned char*>(to);
   const auto* const in = static_cast<const unsigned char*>(from);
-  if (count < kStep || count > kShort) {
+  if (count < kStep || count > kMost) {
     if (count > 0) std::memcpy(out, in, static_cast<std::size_t>(count));
     return;
   }
