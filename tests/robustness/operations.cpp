@@ -474,12 +474,10 @@ void make_elements() {
 
 std::vector<Call> all_calls(const TempDir& dir) {
   std::vector<Call> calls;
-  add_file_calls(calls, dir);
-  add_element_calls(calls);
-  add_value_calls(calls);
-  add_list_calls(calls);
-  add_column_calls(calls);
-  add_row_calls(calls);
-  add_report_calls(calls, dir);
+  for (const auto add :
+       {add_element_calls, add_value_calls, add_list_calls, add_column_calls, add_row_calls}) {
+    add(calls);
+  }
+  for (const auto add : {add_file_calls, add_report_calls}) add(calls, dir);
   return calls;
 }
