@@ -117,6 +117,8 @@ TEST_F(TableRules, FormatsAreRemadeWhereTheirWidthChangesInInteractiveMode) {
   ASSERT_OK(redefine("r", col("r", kReal, INT32_MAX, {-10, 10, INT32_MAX})));
   EXPECT_STREQ(column(2).format, "%2147483647.2147483647g");
   EXPECT_EQ(table().dsp_wid, INT32_MAX);
+  ASSERT_OK(TEV8R1_PF_delete_col("t", "r"));
+  EXPECT_EQ(table().dsp_wid, 11 + 2 + 4 + 1);
 
   // Without rows a column may change its type, and its format has to be made anew.
   new_table();
@@ -227,6 +229,8 @@ TEST_F(TableRules, APatternIsADuplicateOfWhatItMatches) {
   const std::string longest(300, 'x');
   EXPECT_EQ(add("ABC"), PF_NORMAL);
   EXPECT_REFUSED(add("AB*"), PF_DUPLICATE, {"value AB*", "column name"});
+  EXPECT_REFUSED(TEV8R1_validate_row_value("t", "name", "A*"), PF_DUPLICATE,
+                 {"value A*", "column name"});
   EXPECT_EQ(add("AB"), PF_NORMAL);
   EXPECT_EQ(add(longest.c_str()), PF_NORMAL);
   EXPECT_REFUSED(add(longest.c_str()), PF_DUPLICATE,
