@@ -26,7 +26,10 @@ void put_definitions(std::string& all, const Definition* five) {
     if (def.description != nullptr) all += def.description;
     def.description = nullptr;
     if constexpr (std::is_same_v<Definition, TEVPF_PARAM_DEF>) {
-      if (def.type == PF_TYPE_STRING) all += std::exchange(def.part.str.value, nullptr);
+      if (def.type == PF_TYPE_STRING) {
+        all += def.part.str.value;
+        def.part.str.value = nullptr;
+      }
     }
     put(all, def);
   }
