@@ -82,21 +82,17 @@ TEST_F(ListRules, StoredSizes) {
 }
 
 TEST_F(ListRules, ValuesOfDefinitionsFromText) {
-  TEVPF_PARAM_DEF def = to_c({PF_TYPE_SHORT, "p"});
-  const auto store = [&](std::int32_t type, const char* text) {
-    return TEV8R1_store_param_value(type, text, &def);
-  };
-  EXPECT_EQ(store(PF_TYPE_INT, "42"), PF_NORMAL);
-  EXPECT_EQ(def.part.i32.value, 42);
-  EXPECT_EQ(store(PF_TYPE_DOUBLE, "2.5"), PF_NORMAL);
-  EXPECT_EQ(store(PF_TYPE_DOUBLE, ""), PF_NORMAL);
+  TEVPF_PARAM_DEF def = to_c({PF_TYPE_DOUBLE, "p", "", {}, 2.5});
+  EXPECT_EQ(TEV8R1_store_param_value(PF_TYPE_DOUBLE, "", &def), PF_NORMAL);
   EXPECT_EQ(def.part.f64.value + 0, 2.5) << "empty text leaves a double as it was";
-  expect_answer(store(10, "1"), PF_BADTYPE, {"parameter", "10"});
+  EXPECT_EQ(TEV8R1_store_param_value(PF_TYPE_INT, "42", &def), PF_NORMAL);
+  EXPECT_EQ(def.part.i32.value, 42);
+  expect_answer(TEV8R1_store_param_value(10, "1", &def), PF_BADTYPE, {"parameter", "10"});
   def.part.str = {-7, nullptr};
-  EXPECT_EQ(store(PF_TYPE_STRING, "hello"), PF_NORMAL);
+  EXPECT_EQ(TEV8R1_store_param_value(PF_TYPE_STRING, "hello", &def), PF_NORMAL);
   EXPECT_STREQ(def.part.str.value, "hello");
   EXPECT_EQ(def.part.str.length, -7);
-  EXPECT_EQ(def.type, PF_TYPE_SHORT);
+  EXPECT_EQ(def.type, PF_TYPE_DOUBLE);
   std::free(def.part.str.value);
 }
 

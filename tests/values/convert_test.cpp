@@ -71,7 +71,7 @@ TEST(Convert, TextsToValues) {
 TEST(Convert, ValuesToText) {
   const std::int32_t i = INT_MIN;
   const std::int16_t s = -1;
-  const float f = 0.1F;
+  const float f = 1 / 3.0F;
   const double d = 1e-5;
   const struct {
     std::int32_t type;
@@ -81,7 +81,7 @@ TEST(Convert, ValuesToText) {
   } cases[] = {
       {PF_TYPE_INT, nullptr, &i, "-2147483648"}, {PF_TYPE_INT, "%13d|", &i, "  -2147483648|"},
       {PF_TYPE_SHORT, nullptr, &s, "-1"},        {PF_TYPE_SHORT, "%04d", &s, "-001"},
-      {PF_TYPE_REAL, nullptr, &f, "0.1"},        {PF_TYPE_REAL, "%.9g", &f, "0.100000001"},
+      {PF_TYPE_REAL, nullptr, &f, "0.333333"},   {PF_TYPE_REAL, "%.9g", &f, "0.333333343"},
       {PF_TYPE_DOUBLE, nullptr, &d, "1e-05"},    {PF_TYPE_DOUBLE, "%-8.1f|", &d, "0.0     |"},
       {PF_TYPE_STRING, nullptr, "", ""},         {PF_TYPE_STRING, "%.2s", "abc", "ab"},
       {PF_TYPE_STRING, nullptr, "abc", "abc"},
