@@ -37,12 +37,6 @@ struct ModelList {
   Def& default_of(std::int32_t type) { return defaults[std::size_t(type - PF_TYPE_INT)]; }
 };
 
-bool matches(const std::string& name, const std::string& wanted) {
-  const bool pattern = !wanted.empty() && wanted.find('*') == wanted.size() - 1;
-  return pattern ? name.compare(0, wanted.size() - 1, wanted, 0, wanted.size() - 1) == 0
-                 : name == wanted;
-}
-
 class ListModel : public TempFileTest {
  protected:
   void run(int steps) {
@@ -127,8 +121,10 @@ class ListModel : public TempFileTest {
   std::int32_t find(const std::string& wanted, std::int32_t without = -1) {
     std::int32_t found = -1;
     for (std::int32_t i = 0; i < model_->count(); ++i) {
-      if (i == without || !matches(model_->at(i).name, wanted)) continue;
-      if (found < 0 || model_->at(i).name < model_->at(found).name) found = i;
+      const std::string& name = model_->at(i).name;
+      if (i == without || TEV8R1_string_compare(name.c_str(), wanted.c_str()) != PF_NORMAL)
+        continue;
+      if (found < 0 || name < model_->at(found).name) found = i;
     }
     return found;
   }
