@@ -226,15 +226,27 @@ class ListModel : public TempFileTest {
   }
   void change_value() {
     Def changed = found_ < 0 ? Def{} : model_->at(found_);
+    if (found_ >= 0 && changed.type != PF_TYPE_STRING && chance(10)) {
+      std::swap(changed.max, changed.min);  // as only a file may have them
+      if (tevpf::is_floating_type(changed.type) && chance(4)) changed.max = NAN;
+      model_->at(found_) = changed;
+      list(name_).param_ptr[found_].def.part = to_c(changed).part;
+    }
     changed.value = any_value(changed.type);
+    if (changed.type == PF_TYPE_DOUBLE && chance(4)) {
+      changed.value = std::nextafter(changed.max, chance(2) ? 1e9 : -1e9);
+    }
     changed.text = letters(16, "value");
     const TEVPF_PARAM_DEF c = to_c(changed);
     char value[32];
     TEV8R1_load_param_value(&c, value);
     TEVPF_STATUS expected = find_wanted();
-    if (found_ >= 0 && changed.type != PF_TYPE_STRING &&
-        !(changed.value <= changed.max && changed.value >= changed.min)) {
-      expected = refuse(PF_RANGE, shown(changed.type, changed.value));
+    if (found_ >= 0 && changed.type != PF_TYPE_STRING) {
+      if (changed.max < changed.min) {
+        expected = PF_BADRANGE;
+      } else if (!(changed.value <= changed.max && changed.value >= changed.min)) {
+        expected = refuse(PF_RANGE, shown(changed.type, changed.value));
+      }
     }
     const TEVPF_STATUS actual = TEV8R1_PF_modify_param(list_name(), wanted(), value);
     if (expect(actual, expected)) model_->at(found_) = as_kept(changed);

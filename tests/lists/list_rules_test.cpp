@@ -2,7 +2,6 @@
 #include <gtest/gtest.h>
 
 #include <climits>
-#include <cmath>
 
 #include "core/heap.h"
 #include "lists/param_record.h"
@@ -25,28 +24,6 @@ class ListRules : public TempFileTest {
     }
   }
 };
-
-TEST_F(ListRules, BoundsOfAFileAreTakenAsTheyAre) {
-  ASSERT_EQ(add({PF_TYPE_DOUBLE, "p", "", {}, 0.5, 1, -1}), PF_NORMAL);
-  set_error_texts();
-  const struct {
-    double max, min, value;
-    TEVPF_STATUS status;
-    ErrorTexts texts;
-  } changes[] = {
-      {1, -1, 1.0000000001, PF_RANGE, {"1", ""}},
-      {-1, 1, 0, PF_BADRANGE, kUntouched},
-      {std::nan(""), -1, 0, PF_RANGE, {"0", ""}},
-      {INFINITY, 1, 1e300, PF_NORMAL, kUntouched},
-  };
-  for (const auto& change : changes) {
-    auto& part = list("list").param_ptr[0].def.part.f64;
-    part.max = change.max;
-    part.min = change.min;
-    expect_answer(TEV8R1_PF_modify_param("list", "p", &change.value), change.status, change.texts);
-    EXPECT_EQ(part.value + 0, change.status == PF_NORMAL ? change.value : 0.5);
-  }
-}
 
 TEST_F(ListRules, SizesBeyond31BitsAreRefusedBeforeAnythingChanges) {
   add({PF_TYPE_STRING, "s"});

@@ -1,6 +1,5 @@
 // Reports of whole files, lists and tables; larger ones are held against files of golden/.
 #include <filesystem>
-#include <functional>
 
 #include "reports/list_dump.h"
 #include "reports/row_text.h"
@@ -138,25 +137,21 @@ TEST_F(Reports, RefusalsAndWhatTheyLeave) {
       return TEV8R1_PF_print_table(table, path, 1, count, names, 0, 1);
     };
   };
-  const struct {
-    std::function<TEVPF_STATUS(const char*)> report;
-    TEVPF_STATUS status;
-    ErrorTexts texts;
-  } cases[] = {
-      {[](auto path) { return TEV8R1_PF_dump_list("No", path); }, PF_NOELEM, {"list", "No"}},
-      {[](auto path) { return TEV8R1_PF_dump_table("No", path); }, PF_NOELEM, {"table", "No"}},
-      {listing_of("No", 2), PF_NOELEM, {"table", "No"}},
-      {listing_of("t", 2), PF_NOCOLUMN, {"nowhere", ""}},
-      {listing_of("t", 0), PF_BADARG, {"0", ""}},
-      {listing_of("t", -3), PF_BADARG, {"-3", ""}},
-  };
-  for (const auto& c : cases) {
-    set_error_texts();
-    expect_answer(c.report("no/folder"), PF_OPENFAIL, {"no/folder", ""});
+  const auto expect_refused = [](auto report, TEVPF_STATUS status, const ErrorTexts& texts) {
+    expect_answer(report("no/folder"), PF_OPENFAIL, {"no/folder", ""});
     write_file("out.txt", "old");
-    expect_answer(c.report("out.txt"), c.status, c.texts);
+    expect_answer(report("out.txt"), status, texts);
     EXPECT_EQ(read_file("out.txt"), "");
-  }
+  };
+  set_error_texts();
+  expect_refused([](auto* path) { return TEV8R1_PF_dump_list("No", path); }, PF_NOELEM,
+                 {"list", "No"});
+  expect_refused([](auto* path) { return TEV8R1_PF_dump_table("No", path); }, PF_NOELEM,
+                 {"table", "No"});
+  expect_refused(listing_of("No", 2), PF_NOELEM, {"table", "No"});
+  expect_refused(listing_of("t", 2), PF_NOCOLUMN, {"nowhere", ""});
+  expect_refused(listing_of("t", 0), PF_BADARG, {"0", ""});
+  expect_refused(listing_of("t", -3), PF_BADARG, {"-3", ""});
 }
 
 TEST_F(Reports, ATableOfMixedColumnsInStorageOrder) {

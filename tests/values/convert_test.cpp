@@ -1,3 +1,4 @@
+// Texts to values, values to texts, and the order of texts.
 #include <gtest/gtest.h>
 
 #include <bit>
