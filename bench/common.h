@@ -25,7 +25,7 @@ inline constexpr std::int64_t kManyRows = 100'000;
 inline constexpr std::int64_t kFewOperations = 1'000;
 
 // So many random accesses are enough to time one that costs the same from the first on.
-inline constexpr std::int64_t kManyAccesses = 100'000;
+inline constexpr std::int64_t kManyAccesses = 1'000'000;
 
 [[noreturn]] inline void give_up(const char* what, long code) {
   std::fprintf(stderr, "%s failed: 0x%lx\n", what, static_cast<unsigned long>(code));

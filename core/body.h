@@ -39,9 +39,9 @@ class ByteReader {
  private:
   // Behind the next terminator; null when there is none. Most texts are shorter than a call is long.
   const unsigned char* end_of_text() const noexcept {
-    constexpr std::int64_t kWord = 8, kShort = 64;
+    constexpr std::int64_t kWord = 8, kFew = 64;
     const unsigned char* at = next_;
-    for (; at - next_ < kShort && end_ - at >= kWord; at += kWord) {
+    for (; at - next_ < kFew && end_ - at >= kWord; at += kWord) {
       const std::uint64_t zeros = zero_bytes(load_word(at));
       if (zeros != 0) return at + std::countr_zero(zeros) / 8 + 1;
     }

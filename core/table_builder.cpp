@@ -137,7 +137,7 @@ TEVPF_STATUS read_index(TEVPF_COLUMN& column, std::int32_t count, Input& input) 
 TEVPF_STATUS read_indexes(TEVPF_TABLE& table, std::int32_t num_rows, Input& input) noexcept {
   for (std::int32_t i = 0; i < table.num_cols; ++i) {
     TEVPF_COLUMN& column = table.col_array[i];
-    if (column.def.idx_flag != 0) PF_TRY(read_index(column, num_rows, input));
+    if (is_indexed(column)) PF_TRY(read_index(column, num_rows, input));
   }
   return PF_NORMAL;
 }
@@ -165,7 +165,7 @@ TEVPF_STATUS read_rows(TEVPF_TABLE& table, std::int32_t num_rows, Input& input) 
 TEVPF_STATUS build_missing_indexes(TEVPF_TABLE& table) noexcept {
   for (std::int32_t i = 0; i < table.num_cols; ++i) {
     TEVPF_COLUMN& column = table.col_array[i];
-    if (column.def.idx_flag == 0 || index_entries(column) != nullptr) continue;
+    if (!is_indexed(column) || index_entries(column) != nullptr) continue;
     NewIndex index;
     if (!build_index(table, column, table.num_rows, index)) return fail_empty(PF_NOMEM);
     adopt_index(column, std::move(index));

@@ -73,7 +73,7 @@ TEVPF_STATUS put_table(Sink& sink, const TEVPF_TABLE& table) noexcept {
   for (std::int32_t i = 0; i < table.num_cols; ++i) PF_TRY(put_column(sink, table.col_array[i]));
   for (std::int32_t i = 0; i < table.num_cols; ++i) {
     const TEVPF_COLUMN& column = table.col_array[i];
-    if (column.def.idx_flag != 0) put_index(sink, index_entries(column), table.num_rows);
+    if (is_indexed(column)) put_index(sink, index_entries(column), table.num_rows);
   }
   const auto rows = static_cast<std::uint64_t>(table.num_rows);
   if (rows != 0) sink.put(row_at(table, 0), rows * static_cast<std::uint64_t>(table.row_wid));

@@ -67,7 +67,7 @@ inline const std::int32_t* index_entries(const TEVPF_COLUMN& column) noexcept {
 // one.
 inline std::int32_t row_at_position(const TEVPF_TABLE& table, std::int32_t position) noexcept {
   const TEVPF_COLUMN* search = table.cur_col;
-  return search != nullptr && search->def.idx_flag != 0 ? search->idx_ptr[position] : position;
+  return search != nullptr && is_indexed(*search) ? search->idx_ptr[position] : position;
 }
 
 // ---- Entries, as rows come and go ---------------------------------------------------------------
@@ -77,6 +77,16 @@ inline std::int32_t row_at_position(const TEVPF_TABLE& table, std::int32_t posit
 [[nodiscard]] TEVPF_STATUS search_index(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
                                         std::int32_t first, std::int32_t count, const void* key,
                                         std::int32_t& pos) noexcept;
+
+// The same, and remembers that the column is searched: once that pays, its values are kept in index
+// order, and steps cost a quarter in a table that is larger than the cache.
+[[nodiscard]] TEVPF_STATUS find_in_index(const TEVPF_TABLE& table, TEVPF_COLUMN& column,
+                                         std::int32_t first, std::int32_t count, const void* key,
+                                         std::int32_t& pos) noexcept;
+
+// To be called when values of a column have changed in their rows; the operations on entries do so
+// themselves.
+void drop_search_keys(TEVPF_COLUMN& column) noexcept;
 
 // Raises every entry from row_number on by one in all indexes, ahead of the insertion of that row.
 void renumber_for_insertion(TEVPF_TABLE& table, std::int32_t row_number) noexcept;

@@ -1,10 +1,7 @@
 #include "tables/cursor.h"
 
 #include "core/directory.h"
-#include "core/short_copy.h"
 #include "core/status.h"
-#include "tables/column_index.h"
-#include "tables/row_store.h"
 
 namespace tevpf {
 namespace {
@@ -24,15 +21,6 @@ bool has_position(const TEVPF_TABLE& table, std::int32_t position) noexcept {
 }
 
 }  // namespace
-
-void deliver_row(TEVPF_TABLE& table, std::int32_t position, void* row_out) noexcept {
-  fetch_ahead(table, position);
-  const unsigned char* const row = row_at(table, row_at_position(table, position));
-  copy_short(row_out, row, table.row_wid);
-  table.cur_row = position;
-  table.next_row = position + 1;
-}
-
 }  // namespace tevpf
 
 using namespace tevpf;
@@ -57,6 +45,7 @@ TEVPF_STATUS TEV8R1_PF_get_next_row(const char* table_name, void* row_out) noexc
   TEVPF_TABLE* table;
   PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
   if (!has_position(*table, table->next_row)) return PF_NOMORE;
+  fetch_ahead(*table, table->next_row);
   deliver_row(*table, table->next_row, row_out);
   return PF_NORMAL;
 }

@@ -3,6 +3,9 @@
 
 #include <cstdint>
 
+#include "core/short_copy.h"
+#include "tables/column_index.h"
+#include "tables/row_store.h"
 #include "tables/table.h"
 
 extern "C" {
@@ -24,6 +27,10 @@ namespace tevpf {
 inline constexpr std::int32_t kRowsAhead = 12;
 
 // Copies the row at a position to row_out and makes it the current one.
-void deliver_row(TEVPF_TABLE& table, std::int32_t position, void* row_out) noexcept;
+inline void deliver_row(TEVPF_TABLE& table, std::int32_t position, void* row_out) noexcept {
+  copy_short(row_out, row_at(table, row_at_position(table, position)), table.row_wid);
+  table.cur_row = position;
+  table.next_row = position + 1;
+}
 
 }  // namespace tevpf

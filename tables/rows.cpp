@@ -157,6 +157,7 @@ void replace_row(TEVPF_TABLE& table, std::int32_t row_number, const unsigned cha
     if (is_indexed(column) && values_differ(column, stored, row)) {
       move_entry(table, column, row_number, row + column.offset);
     }
+    drop_search_keys(column);  // equal values need not be the same ones
   }
   store_row(table, row, row_number);
 }

@@ -53,13 +53,13 @@ std::int32_t walk_for_key(const TEVPF_TABLE& table, const TEVPF_COLUMN& column, 
 
 // The position from `first` on whose row has the key, or in nearest mode, which acts on the search
 // column only, the next greater value.
-TEVPF_STATUS find_position(const TEVPF_TABLE& table, const TEVPF_COLUMN& column, std::int8_t mode,
+TEVPF_STATUS find_position(const TEVPF_TABLE& table, TEVPF_COLUMN& column, std::int8_t mode,
                            const void* key, std::int32_t first, std::int32_t& position) noexcept {
   const std::int32_t remaining = table.num_rows - first;
   bool found = false;
   if (remaining > 0 && is_indexed(column) && &column == table.cur_col) {
     std::int32_t pos = 0;
-    const TEVPF_STATUS status = search_index(table, column, first, remaining, key, pos);
+    const TEVPF_STATUS status = find_in_index(table, column, first, remaining, key, pos);
     found = status == PF_NORMAL || (mode == kNearest && pos < remaining);
     position = first + pos;
   } else if (remaining > 0) {

@@ -38,7 +38,7 @@ bool copy_column(const TEVPF_COLUMN& source, std::int32_t num_rows, TEVPF_COLUMN
     copy.def.description = heap_copy(source.def.description);
     if (copy.def.description == nullptr) return false;
   }
-  if (source.def.idx_flag == 0 || num_rows == 0) return true;
+  if (!is_indexed(source) || num_rows == 0) return true;
   NewIndex index;
   if (!copy_index(source, num_rows, index)) return false;
   adopt_index(copy, std::move(index));

@@ -28,11 +28,6 @@ struct InsertionPoints {
 inline constexpr std::int32_t kNobody = -1;
 inline constexpr std::int32_t kAnybody = -2;
 
-inline bool is_indexed(const TEVPF_COLUMN& column) noexcept { return column.def.idx_flag != 0; }
-inline bool is_unique(const TEVPF_COLUMN& column) noexcept {
-  return column.def.idx_flag != 0 && column.def.unq_flag != 0;
-}
-
 // Checks every value of a row, in column order. A unique value that `holder` holds already (a row
 // number, kNobody or kAnybody) passes; the error context of the duplicate stays.
 [[nodiscard]] TEVPF_STATUS check_row(const TEVPF_TABLE& table, const unsigned char* row,
