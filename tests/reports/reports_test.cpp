@@ -36,14 +36,7 @@ class Reports : public TableTest {
   }
 
   static void add_rows(const std::vector<std::vector<const char*>>& rows) {
-    for (const auto& values : rows) {
-      std::string row(static_cast<std::size_t>(table().row_wid), '\x55');
-      for (int i = 0; i < table().num_cols; ++i) {
-        char* place = &row[static_cast<std::size_t>(column(i).offset)];
-        ASSERT_OK(TEV8R1_from_char(column(i).def.type, values[static_cast<std::size_t>(i)], place));
-      }
-      ASSERT_OK(TEV8R1_PF_add_row("t", row.data()));
-    }
+    for (const auto& values : rows) ASSERT_OK(add(values));
   }
 
   static void mixed_table() {

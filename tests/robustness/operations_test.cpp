@@ -49,14 +49,14 @@ TEST_F(OperationsTest, ElementsAreThoseOfTheCurrentFile) {
     close_all();
     set_error_texts();
     if (of_file || of_list || of_table) {
-      EXPECT_EQ(call.run(call.numbers.data()), PF_NOFILE);
-      EXPECT_EQ(error_texts(), operation == "PF_dump_file" ? kUntouched : kEmpty);
+      expect_answer(call.run(call.numbers.data()), PF_NOFILE,
+                    operation == "PF_dump_file" ? kUntouched : kEmpty);
       ++without_file;
     }
     if ((!of_list && !of_table) || operation == "check_list_unique") continue;
     ASSERT_EQ(TEV8R1_PF_open((dir_ / "new").c_str()), PF_NEWFILE);
-    EXPECT_EQ(call.run(call.numbers.data()), PF_NOELEM);
-    EXPECT_EQ(error_texts(), of_list ? (ErrorTexts{"list", "list"}) : (ErrorTexts{"table", "t"}));
+    expect_answer(call.run(call.numbers.data()), PF_NOELEM,
+                  of_list ? ErrorTexts{"list", "list"} : ErrorTexts{"table", "t"});
     EXPECT_EQ(tevpf::library.interactive, 0);
     ++without_element;
   }

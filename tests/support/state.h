@@ -12,27 +12,12 @@
 #include "core/library.h"
 #include "core/writer.h"
 #include "support/list_check.h"
+#include "support/param_def.h"
 #include "support/table_check.h"
 
 template <class... T>
 void put(std::string& all, const T&... values) {
   (all.append(reinterpret_cast<const char*>(&values), sizeof values), ...);
-}
-
-template <class Definition>
-void put_definitions(std::string& all, const Definition* five) {
-  for (int i = 0; five != nullptr && i < 5; ++i) {
-    Definition def = five[i];
-    if (def.description != nullptr) all += def.description;
-    def.description = nullptr;
-    if constexpr (std::is_same_v<Definition, TEVPF_PARAM_DEF>) {
-      if (def.type == PF_TYPE_STRING) {
-        all += def.part.str.value;
-        def.part.str.value = nullptr;
-      }
-    }
-    put(all, def);
-  }
 }
 
 inline void put_stored(std::string& all, const TEVPF_FILE& file) {
@@ -52,7 +37,12 @@ inline void put_table(std::string& all, const TEVPF_TABLE& table) {
     put(all, column.tolerance, &column == table.cur_col);
   }
   if (table.dft_row != nullptr) all.append(table.dft_row, table.dft_row + table.row_wid);
-  put_definitions(all, table.col_dft);
+  for (int i = 0; table.col_dft != nullptr && i < tevpf::kValueTypeCount; ++i) {
+    TEVPF_COL_DEF def = table.col_dft[i];
+    if (def.description != nullptr) all += def.description;
+    def.description = nullptr;
+    put(all, def);
+  }
 }
 
 inline std::string snapshot(bool with_spare_slots) {
@@ -66,7 +56,9 @@ inline std::string snapshot(bool with_spare_slots) {
     put_stored(all, *f);
     for (const TEVPF_LIST* list : std::span(f->list_ptr, f->num_lists)) {
       put(all, list->cur_param);
-      put_definitions(all, list->dft_ptr);
+      for (int i = 0; list->dft_ptr != nullptr && i < tevpf::kValueTypeCount; ++i) {
+        all += text_of(list->dft_ptr[i]);
+      }
       if (with_spare_slots) put(all, list->free_params);
     }
     for (const TEVPF_TABLE* table : std::span(f->table_ptr, f->num_tables)) {

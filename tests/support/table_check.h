@@ -8,29 +8,18 @@
 #include <vector>
 
 #include "core/element.h"
+#include "tables/layout.h"
 #include "tables/row_store.h"
-#include "values/value_type.h"
 
 namespace tevpf_test {
 
-inline std::int64_t size_of(const TEVPF_COLUMN& column) {
-  return tevpf::value_size(column.def.type, column.def.width);
-}
-
-// Offsets, width and padding: each value at the first aligned byte behind the one before it.
 inline const char* broken_layout(const TEVPF_TABLE& table) {
-  std::int64_t end = 0, unit = 0;
+  tevpf::Layout fresh;
   for (const TEVPF_COLUMN& column : std::span(table.col_array, table.num_cols)) {
-    const std::int64_t alignment = column.def.type == PF_TYPE_STRING ? 0 : size_of(column);
-    if (alignment > 0) end = (end + alignment - 1) / alignment * alignment;
-    if (column.offset != end) return "offset differs from a fresh layout";
-    end += size_of(column);
-    unit = std::max(unit, alignment);
+    if (column.offset != place_column(fresh, column.def)) return "offset of a fresh layout";
   }
-  const std::int64_t width = unit > 0 ? (end + unit - 1) / unit * unit : end;
-  if (table.row_wid != width) return "row_wid differs from a fresh layout";
-  if (table.mod != unit) return "mod is not the largest number's size";
-  return table.extra_bytes == width - end ? nullptr : "extra_bytes is not the row's last padding";
+  const bool same = table.row_wid == fresh.row_wid && table.mod == fresh.mod;
+  return same && table.extra_bytes == fresh.extra_bytes ? nullptr : "row of a fresh layout";
 }
 
 inline const char* broken_row(const TEVPF_TABLE& table, const unsigned char* row) {
@@ -40,7 +29,7 @@ inline const char* broken_row(const TEVPF_TABLE& table, const unsigned char* row
   };
   for (const TEVPF_COLUMN& column : std::span(table.col_array, table.num_cols)) {
     if (!only_zeros_to(column.offset)) return "padding is not zero";
-    end = column.offset + size_of(column);
+    end = column.offset + tevpf::column_size(column);
     if (column.def.type != PF_TYPE_STRING) continue;
     if (std::count(row + column.offset, row + end, 0) == 0) return "text without terminator";
   }

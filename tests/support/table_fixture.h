@@ -38,6 +38,15 @@ class TableTest : public TempFileTest {
   static void define(const std::vector<TEVPF_COL_DEF>& defs) {
     for (const TEVPF_COL_DEF& def : defs) ASSERT_OK(TEV8R1_PF_def_column("t", def)) << def.name;
   }
+  // Adds a row of values that stand here as texts; its padding is rubbish.
+  static TEVPF_STATUS add(const std::vector<const char*>& values) {
+    std::string row(table().row_wid, '\x55');
+    for (int i = 0; i < table().num_cols; ++i) {
+      char* const place = &row[column(i).offset];
+      EXPECT_EQ(TEV8R1_from_char(column(i).def.type, values[i], place), PF_NORMAL);
+    }
+    return TEV8R1_PF_add_row("t", row.data());
+  }
   static TEVPF_STATUS redefine(const char* name, const TEVPF_COL_DEF& def) {
     return TEV8R1_PF_modify_col_def("t", name, def);
   }

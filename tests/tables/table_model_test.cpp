@@ -400,8 +400,7 @@ class TableModelTest : public TableTest, public testing::WithParamInterface<unsi
 #define BOTH(expected, call) both(#call, expected, call)
   bool both(const char* call, const Result& expected, TEVPF_STATUS status) {
     last_ = call;
-    EXPECT_EQ(status, expected.status);
-    EXPECT_EQ(error_texts(), expected.texts);
+    expect_answer(status, expected.status, expected.texts);
     return !expected.failed() && !HasFailure();
   }
 
