@@ -437,10 +437,11 @@ void fill_list() {
   ASSERT_EQ(TEV8R1_set_cur_param("list", 1), PF_NORMAL);
 }
 
-void define_columns(const char* name) {
+void make_table(const char* name) {
+  ASSERT_EQ(TEV8R1_PF_create_elem(name, "", PF_ELEM_TABLE), PF_NORMAL);
   for (const std::int32_t i : {0, 2, 1, 3, 4}) {
-    const std::int32_t numbers[] = {PF_TYPE_INT + i,  8,     i == 0 ? 1000 : 99, 0, 3,
-                                    i == 0 || i == 2, i == 0};
+    const bool index = i == 0 || i == 2, unique = i == 0;
+    const std::int32_t numbers[] = {PF_TYPE_INT + i, 8, unique ? 1000 : 99, 0, 3, index, unique};
     ASSERT_EQ(TEV8R1_PF_def_column(name, column(kNames[i], numbers)), PF_NORMAL);
   }
 }
@@ -464,12 +465,9 @@ void make_elements() {
     const std::string name = i == 0 ? "list" : i == 1 ? "none" : std::to_string(i);
     ASSERT_EQ(TEV8R1_PF_create_elem(name.c_str(), "", PF_ELEM_LIST), PF_NORMAL);
   }
-  for (const char* name : {"t", "empty"}) {
-    ASSERT_EQ(TEV8R1_PF_create_elem(name, "", PF_ELEM_TABLE), PF_NORMAL);
-    ASSERT_NO_FATAL_FAILURE(define_columns(name));
-  }
-  ASSERT_NO_FATAL_FAILURE(fill_list());
-  ASSERT_NO_FATAL_FAILURE(fill_table());
+  fill_list();
+  for (const char* name : {"t", "empty"}) make_table(name);
+  fill_table();
 }
 
 std::vector<Call> all_calls(const TempDir& dir) {

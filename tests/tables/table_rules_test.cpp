@@ -1,6 +1,5 @@
 // Single rules of tables that random sequences do not reach: refused definitions, formats, tolerances
 // and values that are no numbers, the probes of a search, stored patterns, and limits of counts.
-#include <cmath>
 #include <limits>
 
 #include "reports/formats.h"
@@ -162,7 +161,7 @@ TEST_F(TableRules, InquiriesHandOutCopies) {
 
 // ---- Values and searches --------------------------------------------------------------------------
 
-TEST(CompareTest, RealsWithinTheToleranceAreEqual) {
+TEST_F(TableRules, RealsWithinTheToleranceAreEqual) {
   const std::int32_t five = 5, seven = 7;
   const std::int16_t minus = -1, plus = 1;
   const float half = 0.5F, one = 1;
@@ -178,7 +177,7 @@ TEST(CompareTest, RealsWithinTheToleranceAreEqual) {
 
 // What is not a number equals everything, and a stored pattern, which stands in front of what it
 // matches, can part equal texts: the first equal one is that of the run which the probes hit.
-TEST(SearchTest, ProbesOfWhatHasNoOrder) {
+TEST_F(TableRules, ProbesOfWhatHasNoOrder) {
   const double numbers[] = {1, 2, kNan, kNan, 9}, five = 5;
   const char texts[][3] = {"A", "A", "A*", "A", "A", "A", "A", "A"};
   const std::int32_t index[] = {0, 1, 2, 3, 4, 5, 6, 7};
