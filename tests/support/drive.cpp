@@ -26,13 +26,13 @@ namespace {
 
 constexpr std::int32_t kMostElements = 6, kMostEntries = 12;  // of those that a file holds
 
-std::span<TEVPF_LIST* const> lists() {
+auto lists() {
   const TEVPF_FILE& file = *tevpf::library.current_file;
-  return {file.list_ptr, std::size_t(std::min(file.num_lists, kMostElements))};
+  return std::span(file.list_ptr, std::min(file.num_lists, kMostElements));
 }
-std::span<TEVPF_TABLE* const> tables() {
+auto tables() {
   const TEVPF_FILE& file = *tevpf::library.current_file;
-  return {file.table_ptr, std::size_t(std::min(file.num_tables, kMostElements))};
+  return std::span(file.table_ptr, std::min(file.num_tables, kMostElements));
 }
 
 void read_list(const char* list) {
@@ -185,15 +185,11 @@ void require_rules() {
 void read_everything(const std::string& text) {
   require_rules();
   TEV8R1_PF_dump_file(text.c_str());
-  for (const TEVPF_LIST* list : lists()) {
-    read_list(list->header.elem_name);
-    TEV8R1_PF_dump_list(list->header.elem_name, text.c_str());
-  }
+  for (const TEVPF_LIST* list : lists()) read_list(list->header.elem_name);
   for (const TEVPF_TABLE* table : tables()) {
-    const char* const name = table->header.elem_name;
     read_table(*table);
-    TEV8R1_PF_dump_table(name, text.c_str());
-    TEV8R1_PF_print_table(name, text.c_str(), 1, PF_END_POS, nullptr, -1, PF_END_POS);
+    TEV8R1_PF_print_table(table->header.elem_name, text.c_str(), 1, PF_END_POS, nullptr, -1,
+                          PF_END_POS);
   }
   std::remove(text.c_str());
 }
