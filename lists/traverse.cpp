@@ -3,15 +3,12 @@
 #include <cstring>
 #include <limits>
 
+#include "core/fetch.h"
 #include "lists/find.h"
 #include "lists/param_record.h"
 
 namespace tevpf {
 namespace {
-
-// How far ahead of a walk records are asked for, 28 of them: a long list comes from memory, and the
-// processor of itself does not look beyond a page. Past the last one it does no harm.
-constexpr std::size_t kBytesAhead = 28 * sizeof(TEVPF_PARAM);
 
 void copy_text(char* out, const char* text) noexcept {
   std::memcpy(out, text, std::strlen(text) + 1);
@@ -44,7 +41,7 @@ TEVPF_STATUS TEV8R1_PF_get_next_param(const char* list_name, char* name_out,
   if (list->cur_param < std::numeric_limits<std::int32_t>::max()) ++list->cur_param;
   if (list->cur_param >= list->num_params) return PF_NOMORE;
   const TEVPF_PARAM_DEF& definition = list->param_ptr[list->cur_param].def;
-  __builtin_prefetch(reinterpret_cast<const char*>(&definition) + kBytesAhead);
+  fetch_along(&definition);
   std::memcpy(name_out, definition.name, sizeof definition.name);
   copy_value(definition, value_out);
   return PF_NORMAL;

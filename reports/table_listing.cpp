@@ -9,8 +9,8 @@
 #include "reports/row_text.h"
 #include "reports/segments.h"
 #include "reports/table_dump.h"
-#include "tables/column_index.h"
 #include "tables/column_record.h"
+#include "tables/cursor.h"
 #include "tables/row_store.h"
 
 namespace tevpf {
@@ -68,6 +68,7 @@ TEVPF_STATUS write_rows(TextOut& out, const TEVPF_TABLE& table, const Request& r
   segments.write_heading(out, rows.line());
   out.print('\n');
   for (std::int32_t pos = request.first; pos <= request.last; ++pos) {
+    fetch_ahead(table, pos);
     rows.write_row(row_at(table, row_at_position(table, pos)));
     segments.write_row(out, rows.line());
   }

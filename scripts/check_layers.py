@@ -15,7 +15,7 @@ import sys
 LAYERS = [
     ("interface", "include/*"),
     ("core, lower half", "core/status core/error_context core/heap core/library core/element "
-                         "core/text_field core/text_word core/short_copy core/number_text "
+                         "core/text_field core/text_word core/short_copy core/fetch core/number_text "
                          "core/leading_digits"),
     ("values", "values/*"),
     ("records", "lists/list lists/text_block lists/*_record lists/name_* lists/param_check "

@@ -10,16 +10,6 @@ bool has_position(const TEVPF_TABLE& table, std::int32_t position) noexcept {
   return position >= 0 && position < table.num_rows;
 }
 
-// In search order rows lie anywhere: ask for one some positions ahead, so that it is there in time.
-// As a function of its own it would have no effect that the compiler knows of, and be left out.
-[[gnu::always_inline]] inline void fetch_ahead(const TEVPF_TABLE& table,
-                                               std::int32_t position) noexcept {
-  if (table.cur_col == nullptr || table.num_rows - position <= kRowsAhead) return;
-  const unsigned char* const row = row_at(table, row_at_position(table, position + kRowsAhead));
-  __builtin_prefetch(row);
-  __builtin_prefetch(row + table.row_wid - 1);
-}
-
 }  // namespace
 }  // namespace tevpf
 

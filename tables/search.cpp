@@ -3,6 +3,7 @@
 #include <type_traits>
 
 #include "core/directory.h"
+#include "core/fetch.h"
 #include "core/status.h"
 #include "tables/column_index.h"
 #include "tables/column_record.h"
@@ -32,7 +33,7 @@ std::int32_t walk(const TEVPF_TABLE& table, const TEVPF_COLUMN& column, const st
   std::int32_t at = first;
   if (order == nullptr) {
     const unsigned char* value = base + at * stride;
-    for (; at < count && !key.equals(value); value += stride) ++at;
+    for (; at < count && !key.equals(value); ++at, value += stride) fetch_along(value);
     return at;
   }
   for (; at < count; ++at) {
