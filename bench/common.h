@@ -158,11 +158,18 @@ inline void backup(const Database& from, const Database& to) {
   sqlite3_backup_finish(job);
 }
 
-// The limits: one write() or read() of the same bytes, without anything else.
+// One write() of some bytes, without anything else; all the bytes of a file.
 void write_plainly(const std::string& path, std::span<const char> bytes);
 void write_and_sync(const std::string& path, std::span<const char> bytes);
-void read_plainly(const std::string& path, std::vector<char>& bytes);
 std::vector<char> contents(const std::string& path);
+
+// Whole files, timed: saving what is open into a new one, and opening one; and their limits, one
+// write() or read() of the same bytes. `operations` is what the time is divided by.
+void time_save(benchmark::State& state, std::int64_t operations);
+void time_backup(benchmark::State& state, const Database& from, std::int64_t operations);
+void time_write(benchmark::State& state, const std::string& source, std::int64_t operations);
+void time_open(benchmark::State& state, const std::string& path, std::int64_t operations);
+void time_read(benchmark::State& state, const std::string& path, std::int64_t operations);
 
 // Registers a benchmark under workload/contestant/n; its figure is time per operation. Large sizes,
 // which take long to set up, get one pass a run.

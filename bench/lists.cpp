@@ -309,26 +309,13 @@ void walk_vector(benchmark::State& state) {
 void save_ours(benchmark::State& state) {
   OpenFile file;
   fill_list("list", names(state.range(0)));
-  const std::string path = folder().file("saved.pf");
-  for (auto _ : state) {
-    std::filesystem::remove(path);
-    const Timer timer;
-    MUST(TEV8R1_PF_save(path.c_str()));
-    timer.stop(state, state.range(0));
-  }
+  time_save(state, state.range(0));
 }
 
 void save_sqlite(benchmark::State& state) {
   Database db;
   fill_database(db, names(state.range(0)));
-  const std::string path = folder().file("saved.db");
-  for (auto _ : state) {
-    std::filesystem::remove(path);
-    const Timer timer;
-    const Database to(path);
-    backup(db, to);
-    timer.stop(state, state.range(0));
-  }
+  time_backup(state, db, state.range(0));
 }
 
 void save_json(benchmark::State& state) {
@@ -354,20 +341,6 @@ void save_json(benchmark::State& state) {
   }
 }
 
-void save_limit(benchmark::State& state) {
-  OpenFile file;
-  fill_list("list", names(state.range(0)));
-  const std::string path = folder().file("saved.pf");
-  MUST(TEV8R1_PF_save(path.c_str()));
-  const std::vector<char> bytes = contents(path);
-  for (auto _ : state) {
-    std::filesystem::remove(path);
-    const Timer timer;
-    write_plainly(path, bytes);
-    timer.stop(state, state.range(0));
-  }
-}
-
 // Opening: one list of n, or n lists of a few. All names of a workload are in one file each.
 std::string saved_lists(std::int64_t lists, std::int64_t params) {
   const std::string path = folder().file("lists.pf");
@@ -382,13 +355,7 @@ std::string saved_lists(std::int64_t lists, std::int64_t params) {
 }
 
 void open_ours(benchmark::State& state, std::int64_t lists, std::int64_t params) {
-  const std::string path = saved_lists(lists, params);
-  for (auto _ : state) {
-    const Timer timer;
-    MUST(TEV8R1_PF_open(path.c_str()));
-    timer.stop(state, lists == 1 ? params : lists);
-    MUST(TEV8R1_PF_close(0));
-  }
+  time_open(state, saved_lists(lists, params), lists == 1 ? params : lists);
 }
 
 void open_sqlite(benchmark::State& state, std::int64_t lists, std::int64_t params) {
@@ -407,13 +374,11 @@ void open_sqlite(benchmark::State& state, std::int64_t lists, std::int64_t param
 }
 
 void open_limit(benchmark::State& state, std::int64_t lists, std::int64_t params) {
-  const std::string path = saved_lists(lists, params);
-  std::vector<char> bytes = contents(path);
-  for (auto _ : state) {
-    const Timer timer;
-    read_plainly(path, bytes);
-    timer.stop(state, lists == 1 ? params : lists);
-  }
+  time_read(state, saved_lists(lists, params), lists == 1 ? params : lists);
+}
+
+void save_limit(benchmark::State& state) {
+  time_write(state, saved_lists(1, state.range(0)), state.range(0));
 }
 
 template <void (*Open)(benchmark::State&, std::int64_t, std::int64_t), std::int64_t Params>
@@ -428,15 +393,8 @@ void open_one(benchmark::State& state) {
 
 template <int Params>
 void save_many_ours(benchmark::State& state) {
-  const std::string source = saved_lists(state.range(0), Params);
-  const std::string path = folder().file("saved.pf");
-  MUST(TEV8R1_PF_open(source.c_str()));
-  for (auto _ : state) {
-    std::filesystem::remove(path);
-    const Timer timer;
-    MUST(TEV8R1_PF_save(path.c_str()));
-    timer.stop(state, state.range(0));
-  }
+  MUST(TEV8R1_PF_open(saved_lists(state.range(0), Params).c_str()));
+  time_save(state, state.range(0));
   MUST(TEV8R1_PF_close(0));
 }
 
@@ -444,26 +402,12 @@ template <int Params>
 void save_many_sqlite(benchmark::State& state) {
   Database db;
   fill_database(db, names(Params), state.range(0));
-  const std::string path = folder().file("saved.db");
-  for (auto _ : state) {
-    std::filesystem::remove(path);
-    const Timer timer;
-    const Database to(path);
-    backup(db, to);
-    timer.stop(state, state.range(0));
-  }
+  time_backup(state, db, state.range(0));
 }
 
 template <int Params>
 void save_many_limit(benchmark::State& state) {
-  const std::vector<char> bytes = contents(saved_lists(state.range(0), Params));
-  const std::string path = folder().file("saved.pf");
-  for (auto _ : state) {
-    std::filesystem::remove(path);
-    const Timer timer;
-    write_plainly(path, bytes);
-    timer.stop(state, state.range(0));
-  }
+  time_write(state, saved_lists(state.range(0), Params), state.range(0));
 }
 
 const int registered = [] {

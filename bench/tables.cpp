@@ -369,13 +369,7 @@ void replace_sqlite(benchmark::State& state) {
 void save_ours(benchmark::State& state) {
   OpenFile file;
   fill_table(rows_of(state.range(0)));
-  const std::string path = folder().file("saved.pf");
-  for (auto _ : state) {
-    std::filesystem::remove(path);
-    const Timer timer;
-    MUST(TEV8R1_PF_save(path.c_str()));
-    timer.stop(state, state.range(0));
-  }
+  time_save(state, state.range(0));
 }
 
 void save_sqlite(benchmark::State& state) {
@@ -402,14 +396,7 @@ std::string saved_table(std::int64_t n) {
 }
 
 void save_limit(benchmark::State& state) {
-  const std::vector<char> bytes = contents(saved_table(state.range(0)));
-  const std::string path = folder().file("saved.pf");
-  for (auto _ : state) {
-    std::filesystem::remove(path);
-    const Timer timer;
-    write_plainly(path, bytes);
-    timer.stop(state, state.range(0));
-  }
+  time_write(state, saved_table(state.range(0)), state.range(0));
 }
 
 void save_in_place_ours(benchmark::State& state) {
@@ -450,13 +437,7 @@ void save_in_place_limit(benchmark::State& state) {
 }
 
 void open_ours(benchmark::State& state) {
-  const std::string path = saved_table(state.range(0));
-  for (auto _ : state) {
-    const Timer timer;
-    MUST(TEV8R1_PF_open(path.c_str()));
-    timer.stop(state, state.range(0));
-    MUST(TEV8R1_PF_close(0));
-  }
+  time_open(state, saved_table(state.range(0)), state.range(0));
 }
 
 void open_sqlite(benchmark::State& state) {
@@ -475,13 +456,7 @@ void open_sqlite(benchmark::State& state) {
 }
 
 void open_limit(benchmark::State& state) {
-  const std::string path = saved_table(state.range(0));
-  std::vector<char> bytes = contents(path);
-  for (auto _ : state) {
-    const Timer timer;
-    read_plainly(path, bytes);
-    timer.stop(state, state.range(0));
-  }
+  time_read(state, saved_table(state.range(0)), state.range(0));
 }
 
 void dump_ours(benchmark::State& state) {

@@ -1,0 +1,102 @@
+// Saving and opening whole files, and the plain system calls that they are held against.
+#include <fcntl.h>
+#include <unistd.h>
+
+#include "common.h"
+
+namespace bench {
+
+namespace {
+
+void write_all(const std::string& path, std::span<const char> bytes, bool sync) {
+  const int fd = open(path.c_str(), O_WRONLY | O_CREAT | O_TRUNC, 0644);
+  std::size_t done = 0;
+  while (done < bytes.size()) {
+    const ssize_t n = write(fd, bytes.data() + done, bytes.size() - done);
+    if (n <= 0) give_up("write", n);
+    done += static_cast<std::size_t>(n);
+  }
+  if (sync) fsync(fd);
+  close(fd);
+}
+
+void read_plainly(const std::string& path, std::vector<char>& bytes) {
+  const int fd = open(path.c_str(), O_RDONLY);
+  std::size_t done = 0;
+  while (done < bytes.size()) {
+    const ssize_t n = read(fd, bytes.data() + done, bytes.size() - done);
+    if (n <= 0) give_up("read", n);
+    done += static_cast<std::size_t>(n);
+  }
+  close(fd);
+}
+
+}  // namespace
+
+void write_plainly(const std::string& path, std::span<const char> bytes) {
+  write_all(path, bytes, false);
+}
+
+void write_and_sync(const std::string& path, std::span<const char> bytes) {
+  write_all(path, bytes, true);
+}
+
+std::vector<char> contents(const std::string& path) {
+  std::vector<char> bytes(std::filesystem::file_size(path));
+  read_plainly(path, bytes);
+  return bytes;
+}
+
+void time_save(benchmark::State& state, std::int64_t operations) {
+  const std::string path = folder().file("saved.pf");
+  for (auto _ : state) {
+    std::filesystem::remove(path);
+    const Timer timer;
+    MUST(TEV8R1_PF_save(path.c_str()));
+    timer.stop(state, operations);
+  }
+}
+
+void time_backup(benchmark::State& state, const Database& from, std::int64_t operations) {
+  const std::string path = folder().file("saved.db");
+  for (auto _ : state) {
+    std::filesystem::remove(path);
+    const Timer timer;
+    const Database to(path);
+    backup(from, to);
+    timer.stop(state, operations);
+  }
+}
+
+void time_write(benchmark::State& state, const std::string& source, std::int64_t operations) {
+  const std::vector<char> bytes = contents(source);
+  const std::string path = folder().file("saved.pf");
+  for (auto _ : state) {
+    std::filesystem::remove(path);
+    const Timer timer;
+    write_plainly(path, bytes);
+    timer.stop(state, operations);
+  }
+}
+
+void time_open(benchmark::State& state, const std::string& path, std::int64_t operations) {
+  for (auto _ : state) {
+    const Timer timer;
+    MUST(TEV8R1_PF_open(path.c_str()));
+    timer.stop(state, operations);
+    MUST(TEV8R1_PF_close(0));
+  }
+}
+
+void time_read(benchmark::State& state, const std::string& path, std::int64_t operations) {
+  std::vector<char> bytes = contents(path);
+  for (auto _ : state) {
+    const Timer timer;
+    read_plainly(path, bytes);
+    timer.stop(state, operations);
+  }
+}
+
+}  // namespace bench
+
+BENCHMARK_MAIN();
