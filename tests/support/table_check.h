@@ -45,10 +45,10 @@ inline const char* broken_index(const TEVPF_TABLE& table, const TEVPF_COLUMN& co
     const int row = column.idx_ptr[i];
     if (row < 0 || row >= table.num_rows || seen[row]) return "index entries are all row numbers";
     seen[row] = true;
-    const std::int64_t size = size_of(column);
+    const std::int32_t size = tevpf::column_size(column);
     const unsigned char* const value = tevpf::row_at(table, row) + column.offset;
     if (column.keys.values != nullptr &&
-        std::memcmp(column.keys.values + i * size, value, size) != 0) {
+        std::memcmp(column.keys.values + std::int64_t{i} * size, value, size) != 0) {
       return "search keys are the values";
     }
   }
