@@ -5,7 +5,6 @@
 #include <random>
 
 #include "core/heap.h"
-#include "core/reader.h"
 #include "support/drive.h"
 #include "support/param_def.h"
 #include "support/temp_file.h"
@@ -207,30 +206,6 @@ TEST_F(FormatTest, HalfAFileIsWholeElements) {
     if (n > 0) drive();
     if (!failed) break;
   }
-}
-
-// Bodies and rows larger than any buffer on the way.
-TEST_F(FormatTest, LargeElementsAreReadWhole) {
-  ASSERT_EQ(open_bytes(example_), PF_NORMAL);
-  const std::string text(300'000, 'x');
-  const Def large{.type = PF_TYPE_STRING, .name = "TEXT", .description = text, .text = text};
-  const TEVPF_PARAM_DEF def = to_c(large);
-  ASSERT_EQ(TEV8R1_PF_add_param("DRILL", &def, 0), PF_NORMAL);
-  ASSERT_EQ(TEV8R1_PF_create_elem("T", "", PF_ELEM_TABLE), PF_NORMAL);
-  const TEVPF_COL_DEF column = tevpf::indexed(tevpf::col("i", PF_TYPE_INT, 6, {0, 1e6}));
-  ASSERT_EQ(TEV8R1_PF_def_column("T", column), PF_NORMAL);
-  for (std::int32_t i = 0; i < 100'000; ++i) {
-    ASSERT_EQ(TEV8R1_PF_add_row("T", &i), PF_NORMAL);
-  }
-  EXPECT_NO_THROW(drive_current_file(dir_.path(), {}));
-  // From a stream that does not say how long it is.
-  const std::string bytes = saved_bytes(), fifo = dir_ / "fifo";
-  const std::string writes = "mkfifo " + fifo + "; cat " + (dir_ / "saved") + " > " + fifo + " &";
-  ASSERT_EQ(std::system(writes.c_str()), 0);
-  std::FILE* stream = std::fopen(fifo.c_str(), "rb");
-  ASSERT_EQ(TEV8R1_add_file(stream, "pipe", 1), PF_NORMAL);
-  EXPECT_EQ(tevpf::load_file(*tevpf::library.current_file), PF_NORMAL);
-  EXPECT_EQ(saved_bytes(), bytes);
 }
 
 TEST(ArrayTest, GrowsBehindWhatItHolds) {

@@ -1,5 +1,6 @@
 // A list that is longer than what is read ahead, with texts that are: opened, changed where its texts
-// lie in one block, cut off.
+// lie in one block, cut off, read from a pipe.
+#include "core/reader.h"
 #include "support/list_check.h"
 #include "support/param_def.h"
 #include "support/temp_file.h"
@@ -23,6 +24,13 @@ std::vector<Def> long_list() {
 
 class LongListTest : public TempFileTest {
  protected:
+  static void make_list(const std::vector<Def>& all) {
+    ASSERT_EQ(TEV8R1_PF_create_elem("long", "", PF_ELEM_LIST), PF_NORMAL);
+    for (const Def& def : all) {
+      const TEVPF_PARAM_DEF c = to_c(def);
+      ASSERT_EQ(TEV8R1_PF_add_param("long", &c, PF_END_POS), PF_NORMAL);
+    }
+  }
   void expect_list(const std::vector<Def>& expected) {
     const TEVPF_LIST& found = list("long");
     ASSERT_EQ(broken_rule(found), nullptr) << broken_rule(found);
@@ -35,11 +43,7 @@ class LongListTest : public TempFileTest {
 
 TEST_F(LongListTest, OpensAndChangesLikeAnyOther) {
   std::vector<Def> all = long_list();
-  ASSERT_EQ(TEV8R1_PF_create_elem("long", "", PF_ELEM_LIST), PF_NORMAL);
-  for (const Def& def : all) {
-    const TEVPF_PARAM_DEF c = to_c(def);
-    ASSERT_EQ(TEV8R1_PF_add_param("long", &c, PF_END_POS), PF_NORMAL);
-  }
+  make_list(all);
   save_and_reopen();
   expect_list(all);
   const std::string image = read_file(path_);
@@ -68,6 +72,26 @@ TEST_F(LongListTest, OpensAndChangesLikeAnyOther) {
     ASSERT_EQ(TEV8R1_PF_open(path_.c_str()), in_index ? PF_BADFORMAT : PF_BADFILE) << size;
     ASSERT_EQ(error_texts(), in_index ? ErrorTexts("list index", "") : ErrorTexts(path_, ""));
   }
+}
+
+// With a table as long behind it, from a stream that does not say how long it is.
+TEST_F(LongListTest, ComesThroughAPipe) {
+  const std::vector<Def> all = long_list();
+  make_list(all);
+  ASSERT_EQ(TEV8R1_PF_create_elem("rows", "", PF_ELEM_TABLE), PF_NORMAL);
+  const TEVPF_COL_DEF column = tevpf::indexed(tevpf::col("i", PF_TYPE_INT, 6, {0, 1e6}));
+  ASSERT_EQ(TEV8R1_PF_def_column("rows", column), PF_NORMAL);
+  for (std::int32_t i = 0; i < 100'000; ++i) ASSERT_EQ(TEV8R1_PF_add_row("rows", &i), PF_NORMAL);
+  save_and_reopen();
+  expect_list(all);
+  const std::string pipe = dir_ / "pipe", copy = dir_ / "copy";
+  const std::string writes = "mkfifo " + pipe + "; cat " + path_ + " > " + pipe + " &";
+  ASSERT_EQ(std::system(writes.c_str()), 0);
+  ASSERT_EQ(TEV8R1_add_file(std::fopen(pipe.c_str(), "rb"), "pipe", 1), PF_NORMAL);
+  EXPECT_EQ(tevpf::load_file(*tevpf::library.current_file), PF_NORMAL);
+  expect_list(all);
+  EXPECT_EQ(TEV8R1_PF_save(copy.c_str()), PF_NORMAL);
+  EXPECT_TRUE(read_file(copy) == read_file(path_));
 }
 
 }  // namespace

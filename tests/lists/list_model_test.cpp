@@ -275,38 +275,38 @@ class ListModel : public TempFileTest {
   // The sizes of a definition and the definition itself, selected in one of four ways.
   void definition() {
     const char* const list = list_name();
-    std::int32_t position = -1, type = -1, value_size = -1, desc_size = -1;
+    std::int32_t position = -1, told[] = {-1, -1, -1};
     DefBuffers out(kRoom, kRoom);
     TEVPF_STATUS sized, delivered, refusal = PF_NOMORE;
     switch (below(4)) {
       case 0:
         position = next();
-        sized = TEV8R1_PF_inq_next_param_size(list, &type, &value_size, &desc_size);
+        sized = TEV8R1_PF_inq_next_param_size(list, told, told + 1, told + 2);
         delivered = TEV8R1_PF_get_next_param_def(list, &out.c);
         break;
       case 1:
         position = std::clamp(model_->cursor, 0, model_->count()) - 1;
         delivered = sized = TEV8R1_PF_get_prev_param_def(list, &out.c);
         if (position >= 0)
-          TEV8R1_PF_inq_param_size_by_pos(list, position, &type, &value_size, &desc_size);
+          TEV8R1_PF_inq_param_size_by_pos(list, position, told, told + 1, told + 2);
         break;
       case 2:
         position = found_;
         refusal = find_wanted();
-        sized = TEV8R1_PF_inq_param_size(list, wanted(), &type, &value_size, &desc_size);
+        sized = TEV8R1_PF_inq_param_size(list, wanted(), told, told + 1, told + 2);
         delivered = TEV8R1_PF_get_param_def(list, wanted(), &out.c);
         break;
       default:
         if (is_inside(asked_)) position = asked_;
         if (position < 0)
           refusal = refuse(PF_BADPOS, std::to_string(asked_), std::to_string(model_->count()));
-        sized = TEV8R1_PF_inq_param_size_by_pos(list, asked_, &type, &value_size, &desc_size);
+        sized = TEV8R1_PF_inq_param_size_by_pos(list, asked_, told, told + 1, told + 2);
         delivered = TEV8R1_PF_get_param_def_by_pos(list, asked_, &out.c);
     }
     EXPECT_EQ(sized, delivered);
     EXPECT_TRUE(out.c.description == out.description.data()) << "the caller's pointer stays";
     if (!expect(delivered, position < 0 ? refusal : PF_NORMAL)) {
-      EXPECT_EQ(type + value_size + desc_size, -3);
+      EXPECT_EQ(told[0] + told[1] + told[2], -3);
       return;
     }
     Def def = model_->at(position);
@@ -314,9 +314,9 @@ class ListModel : public TempFileTest {
     EXPECT_EQ(text_of(out.c), text_of(def));
     EXPECT_EQ(out.description, in_room(*def.description));
     EXPECT_TRUE(def.type != PF_TYPE_STRING || out.value == in_room(def.text));
-    EXPECT_EQ(type, def.type);
-    EXPECT_EQ(value_size, tevpf::value_size(def.type, def.length));
-    EXPECT_EQ(desc_size, std::ssize(*def.description) + 1);
+    EXPECT_EQ(told[0], def.type);
+    EXPECT_EQ(told[1], tevpf::value_size(def.type, def.length));
+    EXPECT_EQ(told[2], std::ssize(*def.description) + 1);
     model_->cursor = position;
   }
 

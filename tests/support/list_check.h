@@ -16,17 +16,12 @@ inline const char* broken_rule(const TEVPF_PARAM& param, std::int64_t& bytes) {
   if (!tevpf::is_value_type(def.type)) return "value type";
   if (std::memchr(def.name, '\0', sizeof def.name) == nullptr) return "terminated name";
   if (std::memchr(def.units, '\0', sizeof def.units) == nullptr) return "terminated units";
+  const bool string = def.type == PF_TYPE_STRING;
+  const auto& [length, value] = def.part.str;
+  if (string && (value == nullptr || std::size_t(length) != std::strlen(value))) return "string";
   constexpr std::int64_t kParts[] = {12, 16, 5, 28, 6};
-  std::int64_t size = 44 + kParts[def.type - PF_TYPE_INT];
-  std::int64_t description_place = size - 8;
-  if (def.type == PF_TYPE_STRING) {
-    const auto& string = def.part.str;
-    if (string.value == nullptr || std::size_t(string.length) != std::strlen(string.value))
-      return "length of the string value";
-    size += string.length;
-    description_place = 1;
-  }
-  if (def.description == nullptr) description_place = 0;
+  std::int64_t size = 44 + kParts[def.type - PF_TYPE_INT] + (string ? length : 0);
+  const std::int64_t description_place = def.description == nullptr ? 0 : string ? 1 : size - 8;
   if (def.description != nullptr)
     size += static_cast<std::int64_t>(std::strlen(def.description)) + 1;
   bytes += size;
