@@ -660,7 +660,9 @@ TEVPF_API TEVPF_STATUS TEV8R1_PF_define_table_search(const char* table_name,
                                                      const char* column_name) TEVPF_NOEXCEPT;
 
 /* Searches from the next position on for a row whose column holds the key, copies it to row_out
- * (row_wid bytes) and makes it current. O(log n) in the search column, else O(n).
+ * (row_wid bytes) and makes it current. O(log n) in the search column, else O(n). Every 4,096
+ * searches without a change of rows in between, a search column of numbers may take O(n) once to
+ * copy its values, which the next ones search faster; the copy goes with the next change.
  *   mode  1: in the search column, take the next greater value when there is no equal one
  *   key   binary value of the column's type; a text may end in "*" and then finds what it starts
  *   PF_NOTFOUND  no such row; the cursor stays

@@ -56,8 +56,9 @@ std::int64_t redefined_row_width(const TEVPF_TABLE& table, std::int32_t position
   return layout.row_wid;
 }
 
+// Whether the definition may take the column's place; gives the width of a row with it.
 TEVPF_STATUS check_redefinition(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
-                                const TEVPF_COL_DEF& definition) noexcept {
+                                const TEVPF_COL_DEF& definition, std::int64_t& row_wid) noexcept {
   PF_TRY(check_new_name(table, column.def.name, definition.name));
   if (definition.type != column.def.type && table.num_rows > 0) return PF_TYPECHG;
   PF_TRY(TEV8R1_validate_col_range(&definition));
@@ -66,9 +67,8 @@ TEVPF_STATUS check_redefinition(const TEVPF_TABLE& table, const TEVPF_COLUMN& co
   } else {
     PF_TRY(TEV8R1_check_column_values(&table, column.offset, definition, column.tolerance));
   }
-  const std::int64_t width =
-      redefined_row_width(table, column_position(table, &column), definition);
-  return width > kMaxRowWidth ? PF_BADWIDTH : PF_NORMAL;
+  row_wid = redefined_row_width(table, column_position(table, &column), definition);
+  return row_wid > kMaxRowWidth ? PF_BADWIDTH : PF_NORMAL;
 }
 
 // The index as the redefinition leaves it: built when it is switched on, and built anew when a
@@ -97,7 +97,8 @@ TEVPF_STATUS prepare_index(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
 }
 
 TEVPF_STATUS prepare(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
-                     const TEVPF_COL_DEF& definition, Redefinition& next) noexcept {
+                     const TEVPF_COL_DEF& definition, std::int64_t row_wid,
+                     Redefinition& next) noexcept {
   next.record = column;
   next.record.def = definition;
   next.record.def.desc_byte = 0;
@@ -114,9 +115,7 @@ TEVPF_STATUS prepare(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
     next.description.reset(heap_copy(definition.description));
     if (!next.description) return fail_empty(PF_NOMEM);
   }
-  const std::int64_t width =
-      redefined_row_width(table, column_position(table, &column), definition);
-  next.default_row = new_zeroed<unsigned char>(static_cast<std::uint64_t>(width));
+  next.default_row = new_zeroed<unsigned char>(static_cast<std::uint64_t>(row_wid));
   return next.default_row ? PF_NORMAL : fail_empty(PF_NOMEM);
 }
 
@@ -176,10 +175,11 @@ TEVPF_STATUS TEV8R1_PF_modify_col_def(const char* table_name, const char* column
   PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
   PF_TRY(TEV8R1_get_col_ptr(table, column_name, &column));
   terminate_texts(definition);
-  PF_TRY(check_redefinition(*table, *column, definition));
+  std::int64_t row_wid = 0;
+  PF_TRY(check_redefinition(*table, *column, definition, row_wid));
 
   Redefinition next;
-  PF_TRY(prepare(*table, *column, definition, next));
+  PF_TRY(prepare(*table, *column, definition, row_wid, next));
   apply(*table, *column, std::move(next));
   return PF_NORMAL;
 }
