@@ -45,7 +45,7 @@ class ListModel : public TempFileTest {
     static constexpr void (M::*operations[])() = {
         &M::add, &M::add, &M::add, &M::add, &M::add, &M::remove, &M::redefine, &M::redefine,
         &M::rename, &M::move, &M::change_value, &M::change_value, &M::value, &M::value,
-        &M::definition, &M::definition, &M::definition, &M::definition, &M::inquire,
+        &M::definition, &M::definition, &M::definition, &M::sizes, &M::sizes, &M::inquire,
         &M::set_cursor, &M::reset, &M::inquire_default, &M::set_default, &M::replace_by_copy,
         &M::reopen};
     // clang-format on
@@ -149,8 +149,8 @@ class ListModel : public TempFileTest {
 
   // Whether the operation was to be done.
   bool expect(TEVPF_STATUS actual, TEVPF_STATUS expected) {
-    EXPECT_EQ(actual, expected);
-    EXPECT_EQ(error_texts(), texts_);
+    expect_answer(actual, expected, texts_);
+    texts_ = kUntouched;
     return expected == PF_NORMAL;
   }
   void compare(const std::string& name, ModelList& model) {
@@ -272,51 +272,59 @@ class ListModel : public TempFileTest {
     EXPECT_EQ(value, expected);
   }
 
-  // The sizes of a definition and the definition itself, selected in one of four ways.
+  enum Way { kNext, kByName, kByPosition, kPrevious };
+  // The position that one of these ways leads to; -1, and then why.
+  std::int32_t select(Way way, TEVPF_STATUS& expected) {
+    expected = PF_NOMORE;
+    std::int32_t position = -1;
+    if (way == kNext) position = next();
+    if (way == kPrevious) position = std::clamp(model_->cursor, 0, model_->count()) - 1;
+    if (way == kByName) {
+      position = found_;
+      expected = find_wanted();
+    } else if (way == kByPosition && is_inside(asked_)) {
+      position = asked_;
+    } else if (way == kByPosition) {
+      expected = refuse(PF_BADPOS, std::to_string(asked_), std::to_string(model_->count()));
+    }
+    if (position >= 0) expected = PF_NORMAL;
+    return position;
+  }
+  void sizes() {
+    const char* const list = list_name();
+    const Way way = Way(below(3));
+    std::int32_t type = -1, value = -1, text = -1;
+    TEVPF_STATUS expected;
+    const std::int32_t position = select(way, expected);
+    expect(way == kNext     ? TEV8R1_PF_inq_next_param_size(list, &type, &value, &text)
+           : way == kByName ? TEV8R1_PF_inq_param_size(list, wanted(), &type, &value, &text)
+                            : TEV8R1_PF_inq_param_size_by_pos(list, asked_, &type, &value, &text),
+           expected);
+    EXPECT_EQ(type < 0 && value < 0 && text < 0, position < 0);
+    if (position < 0) return;
+    const Def& def = model_->at(position);
+    EXPECT_EQ(type, def.type);
+    EXPECT_EQ(value, tevpf::value_size(def.type, def.length));
+    EXPECT_EQ(text, std::ssize(def.description.value_or("")) + 1);
+  }
   void definition() {
     const char* const list = list_name();
-    std::int32_t position = -1, told[] = {-1, -1, -1};
+    const Way way = Way(below(4));
     DefBuffers out(kRoom, kRoom);
-    TEVPF_STATUS sized, delivered, refusal = PF_NOMORE;
-    switch (below(4)) {
-      case 0:
-        position = next();
-        sized = TEV8R1_PF_inq_next_param_size(list, told, told + 1, told + 2);
-        delivered = TEV8R1_PF_get_next_param_def(list, &out.c);
-        break;
-      case 1:
-        position = std::clamp(model_->cursor, 0, model_->count()) - 1;
-        delivered = sized = TEV8R1_PF_get_prev_param_def(list, &out.c);
-        if (position >= 0)
-          TEV8R1_PF_inq_param_size_by_pos(list, position, told, told + 1, told + 2);
-        break;
-      case 2:
-        position = found_;
-        refusal = find_wanted();
-        sized = TEV8R1_PF_inq_param_size(list, wanted(), told, told + 1, told + 2);
-        delivered = TEV8R1_PF_get_param_def(list, wanted(), &out.c);
-        break;
-      default:
-        if (is_inside(asked_)) position = asked_;
-        if (position < 0)
-          refusal = refuse(PF_BADPOS, std::to_string(asked_), std::to_string(model_->count()));
-        sized = TEV8R1_PF_inq_param_size_by_pos(list, asked_, told, told + 1, told + 2);
-        delivered = TEV8R1_PF_get_param_def_by_pos(list, asked_, &out.c);
-    }
-    EXPECT_EQ(sized, delivered);
+    TEVPF_STATUS expected;
+    const std::int32_t position = select(way, expected);
+    const TEVPF_STATUS actual = way == kNext       ? TEV8R1_PF_get_next_param_def(list, &out.c)
+                                : way == kPrevious ? TEV8R1_PF_get_prev_param_def(list, &out.c)
+                                : way == kByName
+                                    ? TEV8R1_PF_get_param_def(list, wanted(), &out.c)
+                                    : TEV8R1_PF_get_param_def_by_pos(list, asked_, &out.c);
     EXPECT_TRUE(out.c.description == out.description.data()) << "the caller's pointer stays";
-    if (!expect(delivered, position < 0 ? refusal : PF_NORMAL)) {
-      EXPECT_EQ(told[0] + told[1] + told[2], -3);
-      return;
-    }
+    if (!expect(actual, expected)) return;
     Def def = model_->at(position);
     def.description = def.description.value_or("");
     EXPECT_EQ(text_of(out.c), text_of(def));
     EXPECT_EQ(out.description, in_room(*def.description));
     EXPECT_TRUE(def.type != PF_TYPE_STRING || out.value == in_room(def.text));
-    EXPECT_EQ(told[0], def.type);
-    EXPECT_EQ(told[1], tevpf::value_size(def.type, def.length));
-    EXPECT_EQ(told[2], std::ssize(*def.description) + 1);
     model_->cursor = position;
   }
 
@@ -343,10 +351,9 @@ class ListModel : public TempFileTest {
     if (expect(TEV8R1_set_cur_param(list_name(), asked_), expected)) model_->cursor = asked_;
   }
   void reset() {
-    if (!chance(4)) return;
     expect(TEV8R1_PF_reset_param(list_name()), PF_NORMAL);
     model_->cursor = -1;
-    if (chance(3)) list(name_).cur_param = model_->cursor = INT_MAX - 1;  // after many reads
+    if (chance(2)) list(name_).cur_param = model_->cursor = INT_MAX - number(0, 1);
   }
   void inquire_default() {
     const std::int32_t type = number(10, 16);
@@ -378,7 +385,7 @@ class ListModel : public TempFileTest {
   void reopen() {
     if (!chance(10)) return;
     save_and_reopen();
-    set_error_texts(texts_);
+    set_error_texts();
     for (auto& [name, model] : lists_) {
       model.cursor = -1;
       model.free = 0;
