@@ -65,6 +65,12 @@ TEST_F(LongListTest, OpensAndChangesLikeAnyOther) {
     ASSERT_EQ(TEV8R1_PF_delete_list("copy"), PF_NORMAL);
   }
 
+  // An index that holds a position twice is made anew.
+  ASSERT_EQ(TEV8R1_PF_close(0), PF_NORMAL);
+  write_file(path_, image.substr(0, image.size() - 4) + image.substr(image.size() - 8, 4));
+  ASSERT_EQ(TEV8R1_PF_open(path_.c_str()), PF_NORMAL);
+  expect_list(long_list());
+
   for (std::size_t size = image.size() - 1; size > 108; size -= std::min<std::size_t>(size, 9973)) {
     TEV8R1_PF_close(0);  // of one that was refused there is nothing to close
     write_file(path_, image.substr(0, size));
