@@ -98,5 +98,3 @@ void time_read(benchmark::State& state, const std::string& path, std::int64_t op
 }
 
 }  // namespace bench
-
-BENCHMARK_MAIN();
