@@ -6,7 +6,6 @@
 #include <random>
 #include <vector>
 
-#include "core/heap.h"
 #include "support/temp_file.h"
 
 namespace {
@@ -196,17 +195,6 @@ TEST_F(DirectoryTest, RefusalsSayWhyAndChangeNothing) {
   expect_answer(TEV8R1_get_list_array_pos(nullptr, &pos), PF_NOELEM);
   EXPECT_EQ(snapshot(true), before);
   EXPECT_EQ(pos, 7);
-}
-
-TEST_F(DirectoryTest, WhatWasHandedOutBeforeMemoryRanOutIsTheCallers) {
-  for (const Kind& kind : kKinds) ASSERT_EQ(kind.create("A"), PF_NORMAL);
-  for (int n = 0; n <= 4; ++n) {
-    tevpf::heap_fail_at(n);
-    const Elements kept;
-    EXPECT_EQ(kept.status, tevpf::heap_fail_off() ? PF_NOMEM : PF_NORMAL);
-    const void* const blocks[] = {kept.names[0], kept.descs[0], kept.names[1], kept.descs[1]};
-    EXPECT_EQ(std::count(blocks, blocks + 4, nullptr), 4 - n);
-  }
 }
 
 }  // namespace

@@ -482,7 +482,7 @@ class TableModelTest : public TableTest, public testing::WithParamInterface<unsi
   void replace_row() {
     Row row = random_row();
     if (model_.cur >= 0 && chance(70)) {  // change one value only
-      const int changed = any_column();
+      const int changed = !model_.search.empty() && chance(70) ? model_.searched() : any_column();
       Row old = model_.rows[model_.row_at(model_.cur)];
       old[changed] = row[changed];
       row = old;

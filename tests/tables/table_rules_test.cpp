@@ -218,20 +218,6 @@ TEST_F(TableRules, APatternIsADuplicateOfWhatItMatches) {
   EXPECT_EQ(library.dup_row, 2);
 }
 
-// A replaced value that equals the old one stays where it is in the index; searches see the new one.
-TEST_F(TableRules, SearchesSeeAValueReplacedByAnEqualOne) {
-  define({indexed(col("d", kDouble, 8, {0, 10, 1}))});
-  for (const char* d : {"1", "3", "5", "7"}) ASSERT_OK(add({d}));
-  ASSERT_OK(TEV8R1_PF_define_table_search("t", "d"));
-  const double old_value = 1, near = 1.009, nearer = 1.018;
-  double found = 0;
-  ASSERT_OK(TEV8R1_PF_get_row_by_value("t", 0, "d", &old_value, &found));
-  ASSERT_OK(TEV8R1_PF_replace_row("t", &near));
-  ASSERT_OK(TEV8R1_PF_reset_table("t"));
-  ASSERT_OK(TEV8R1_PF_get_row_by_value("t", 0, "d", &nearer, &found));
-  EXPECT_EQ(found, near);
-}
-
 TEST_F(TableRules, AnIndexBuiltIsOrderedExactly) {
   define({col("d", kDouble, 8, {0, 10})});
   const auto add_number = [](double d) { return TEV8R1_PF_add_row("t", &d); };
