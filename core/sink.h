@@ -7,6 +7,7 @@
 #include <cstring>
 
 #include "core/heap.h"
+#include "core/short_copy.h"
 
 namespace tevpf {
 
@@ -32,7 +33,7 @@ class Sink {
 
   void put(const void* bytes, std::uint64_t count) noexcept {
     if (count > room()) return put_large(bytes, count);
-    if (count != 0) std::memcpy(buffer_ + used_, bytes, static_cast<std::size_t>(count));
+    copy_short(buffer_ + used_, bytes, static_cast<std::int64_t>(count));
     used_ += static_cast<std::size_t>(count);
   }
 
