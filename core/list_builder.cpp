@@ -75,19 +75,14 @@ Parsed parse_param(ByteReader& bytes, TEVPF_PARAM& param, TextSizes& sizes) noex
   return parse_description(bytes, param, sizes);
 }
 
-// The same for the next parameter of a body, of which more is fetched when it goes on behind what is
-// at hand. Leaves the texts until the body is touched again.
-Parsed take_param(Body& body, TEVPF_PARAM& param, TextSizes& sizes) noexcept {
-  for (;;) {
-    ByteReader bytes = body.at_hand();
-    const std::int64_t at_hand = bytes.left();
-    const Parsed parsed = parse_param(bytes, param, sizes);
-    if (parsed == Parsed::kWhole) body.take(at_hand - bytes.left());
-    if (parsed != Parsed::kCutOff) return parsed;
-    const Input::Got got = body.fetch_more();
-    if (got == Input::Got::kPart) return Parsed::kBroken;
-    if (got == Input::Got::kNoMemory) return Parsed::kNoMemory;
-  }
+// Gets more of a body to hand behind what is left at hand.
+Parsed fetch_more(Body& body, ByteReader& at_hand) noexcept {
+  body.take(body.at_hand().left() - at_hand.left());
+  const Input::Got got = body.fetch_more();
+  at_hand = body.at_hand();
+  return got == Input::Got::kAll    ? Parsed::kWhole
+         : got == Input::Got::kPart ? Parsed::kBroken
+                                    : Parsed::kNoMemory;
 }
 
 // Takes the parameters off the body, up to the first one of an unknown type, whose size nobody
@@ -95,14 +90,23 @@ Parsed take_param(Body& body, TEVPF_PARAM& param, TextSizes& sizes) noexcept {
 Parsed take_params(Body& body, std::int32_t count, TEVPF_LIST& list) noexcept {
   TextPacker packer;
   if (!packer.reserve(text_room(body.left(), count), list.texts)) return Parsed::kNoMemory;
-  for (; list.num_params < count; ++list.num_params) {
+  ByteReader at_hand = body.at_hand();
+  while (list.num_params < count) {
     TEVPF_PARAM& param = list.param_ptr[list.num_params];
     TextSizes sizes;
-    const Parsed parsed = take_param(body, param, sizes);
+    ByteReader behind = at_hand;
+    Parsed parsed = parse_param(behind, param, sizes);
+    if (parsed == Parsed::kCutOff) {
+      parsed = fetch_more(body, at_hand);
+      if (parsed == Parsed::kWhole) continue;
+    }
     if (parsed != Parsed::kWhole) return parsed;
     if (!own_texts(param.def, sizes, packer, list.texts)) return Parsed::kNoMemory;
     list.header.btf += static_cast<std::int32_t>(stored_size(param.def.type, sizes));
+    ++list.num_params;
+    at_hand = behind;
   }
+  body.take(body.at_hand().left() - at_hand.left());
   return body.left() == 0 ? Parsed::kWhole : Parsed::kBroken;
 }
 
