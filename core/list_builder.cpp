@@ -106,6 +106,7 @@ Parsed take_params(Body& body, std::int32_t count, TEVPF_LIST& list) noexcept {
     ++list.num_params;
     at_hand = behind;
   }
+  packer.finish(list.texts);
   body.take(body.at_hand().left() - at_hand.left());
   return body.left() == 0 ? Parsed::kWhole : Parsed::kBroken;
 }

@@ -22,6 +22,7 @@ bool copy_params(const TEVPF_LIST& source, TEVPF_LIST& half) noexcept {
     TEVPF_PARAM_DEF& definition = (half.param_ptr[i] = source.param_ptr[i]).def;
     if (!own_texts(definition, text_sizes(definition), packer, half.texts)) return false;
   }
+  packer.finish(half.texts);
   return true;
 }
 

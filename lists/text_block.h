@@ -56,6 +56,13 @@ class TextPacker {
     return copy;
   }
 
+  // Gives the block back when it holds no text.
+  void finish(TextBlock& block) const noexcept {
+    if (next_ != block.begin) return;
+    heap_free(block.begin);
+    block = {};
+  }
+
  private:
   char* next_ = nullptr;
   char* end_ = nullptr;
