@@ -91,7 +91,7 @@ TEST_F(Reports, AFileWithAllKindsOfLists) {
   new_list("Plain", "100%s",
            {{PF_TYPE_INT, "count", "pcs", {}, 42},
             {PF_TYPE_SHORT, "level", "", {}, -5, 32767, -32768},
-            {PF_TYPE_REAL, "pi", "rad", {}, 3.14159, 10, 0, 3},
+            {PF_TYPE_REAL, "pi", "rad", {}, 3.14159, 12345.6, 0, 3},
             {PF_TYPE_DOUBLE, "far", "", {}, 1e-7, 1e300, -1e300},
             text("tabbed", "a\tb\n"),
             text("blank", "ends "),
