@@ -32,12 +32,6 @@ Input::Got read_body(Input& input, std::int32_t bytes, Scratch& scratch) noexcep
   return input.read(scratch.block.get(), count) == count ? Input::Got::kAll : Input::Got::kPart;
 }
 
-// The file ends inside this element, or contradicts itself. The file may be gone afterwards.
-TEVPF_STATUS refuse(TEVPF_FILE& file, const TEVPF_ELEM_HEADER& header) noexcept {
-  PF_TRY(TEV8R1_check_valid_file(&file));
-  return fail(PF_BADFORMAT, header.elem_name);
-}
-
 // Builds the element whose header was read last.
 TEVPF_STATUS build_element(const TEVPF_ELEM_HEADER& header, Input& input,
                            Scratch& scratch) noexcept {
@@ -85,7 +79,10 @@ TEVPF_STATUS load_file(TEVPF_FILE& file) noexcept {
       file.new_file = 0;
       return PF_NORMAL;
     }
-    if (got != sizeof header) return refuse(file, header);
+    if (got != sizeof header) {
+      PF_TRY(TEV8R1_check_valid_file(&file));
+      return fail(PF_BADFORMAT, header.elem_name);
+    }
     PF_TRY(load_element(file, header, input, scratch));
   }
 }
