@@ -70,7 +70,7 @@ class Body {
     return {input_->unread(), std::min<std::int64_t>(left_, input_->buffered())};
   }
 
-  // Takes the next `count` bytes, which few enough for any buffer; they stay until the body is
+  // Takes the next `count` bytes, few enough for any buffer; they stay until the body is
   // touched again. Null when the body, or the stream, ends inside them.
   [[nodiscard]] const unsigned char* take_fields(std::int32_t count) noexcept;
 
