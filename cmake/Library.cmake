@@ -38,6 +38,12 @@ if(WIN32)
   tevpf_library_options(tevpf_static)
 else()
   add_library(tevpf_static STATIC $<TARGET_OBJECTS:tevpf_objects>)
+  if(CMAKE_OBJCOPY)
+    # What the compiler keeps in objects for optimising across files suits no other version of it.
+    add_custom_command(TARGET tevpf_static POST_BUILD COMMAND "${CMAKE_OBJCOPY}" -w
+      --remove-section=.gnu.lto_* --remove-section=.gnu.debuglto_* "$<TARGET_FILE:tevpf_static>"
+      VERBATIM)
+  endif()
 endif()
 add_library(tevpf::tevpf_static ALIAS tevpf_static)
 tevpf_public_header(tevpf_static)

@@ -38,7 +38,7 @@ function(tevpf_library_options target)
   endif()
   if(CMAKE_CXX_COMPILER_ID STREQUAL "GNU" AND CMAKE_BUILD_TYPE STREQUAL "Release" AND NOT WIN32)
     # Small operations spend a sixth of their time on calls between files. The objects hold plain
-    # code too, for those who link the static library with another compiler.
+    # code too, for the static library.
     target_compile_options(${target} PRIVATE -flto=auto -ffat-lto-objects)
   endif()
 endfunction()

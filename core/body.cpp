@@ -11,9 +11,16 @@ const unsigned char* Body::take_fields(std::int32_t count) noexcept {
   return fields;
 }
 
+bool Body::take_rest() noexcept {
+  do {
+    take(at_hand().left());
+  } while (left_ != 0 && fetch_more() == Input::Got::kAll);
+  return left_ == 0;
+}
+
 Input::Got Body::fetch_more() noexcept {
   if (at_hand().left() == left_) return Input::Got::kPart;
-  return input_->fetch_more();
+  return input_->fetch_more(left_);
 }
 
 }  // namespace tevpf

@@ -54,7 +54,7 @@ class ByteReader {
 };
 
 // A whole body: in memory, or still in the stream and at hand only as far as it is read ahead, so
-// that a body of any length goes by without a block of its length.
+// that a body of any length goes by without a block of its length, unless one text fills it.
 class Body {
  public:
   Body(const void* bytes, std::int32_t count) noexcept
@@ -83,6 +83,9 @@ class Body {
       input_->skip(count);
     }
   }
+
+  // Takes all that is left. False when the stream ends inside it.
+  [[nodiscard]] bool take_rest() noexcept;
 
   // Gets more bytes to hand, which moves those that are. kPart: there are no more.
   [[nodiscard]] Input::Got fetch_more() noexcept;

@@ -61,17 +61,18 @@ Input::Claim Input::weigh(std::uint64_t bytes) const noexcept {
   return bytes <= static_cast<std::uint64_t>(left + buffered()) ? Claim::kFits : Claim::kTooLarge;
 }
 
-Input::Got Input::fetch_more() noexcept {
+Input::Got Input::fetch_more(std::int64_t most) noexcept {
   const auto kept = static_cast<std::size_t>(buffered());
   if (kept != 0) std::memmove(buffer_.get(), next_, kept);
   next_ = buffer_.get();
   end_ = next_ + kept;
   if (kept == room_) {
-    void* const larger = heap_resize(buffer_.get(), room_ * 2, 1);
+    const std::uint64_t room = std::min(room_ * 2, static_cast<std::uint64_t>(most));
+    void* const larger = heap_resize(buffer_.get(), room, 1);
     if (larger == nullptr) return Got::kNoMemory;
     (void)buffer_.release();
     buffer_.reset(static_cast<unsigned char*>(larger));
-    room_ *= 2;
+    room_ = room;
     next_ = buffer_.get();
   }
   const std::uint64_t got = read_stream(buffer_.get() + kept, room_ - kept);

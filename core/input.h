@@ -40,8 +40,9 @@ class Input {
 
   enum class Got { kAll, kPart, kNoMemory };
 
-  // Reads further ahead, into a larger buffer when this one is full. kPart: the stream has ended.
-  [[nodiscard]] Got fetch_more() noexcept;
+  // Reads further ahead, into a larger buffer when this one is full, but of no more than `most` bytes,
+  // which are more than are read ahead. kPart: the stream has ended.
+  [[nodiscard]] Got fetch_more(std::int64_t most) noexcept;
 
   // Reads a block of so many bytes, allocated as far as the stream holds them.
   [[nodiscard]] Got read_block(std::uint64_t bytes, Owned<unsigned char>& out) noexcept;

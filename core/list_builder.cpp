@@ -17,10 +17,11 @@ namespace {
 
 constexpr std::size_t kTypePlace = stored_place(kParamFields, offsetof(TEVPF_PARAM, def.type));
 
-// Takes the value of a string, whose length stands in `def`, and the terminator behind it.
-Parsed parse_string_value(ByteReader& bytes, TEVPF_PARAM_DEF& def) noexcept {
+// Takes the value of a string, whose length stands in `def`, and the terminator behind it. `to_come`:
+// bytes of the body behind those at hand.
+Parsed parse_string_value(ByteReader& bytes, std::int64_t to_come, TEVPF_PARAM_DEF& def) noexcept {
   const std::int32_t length = def.part.str.length;
-  if (length < 0) return Parsed::kBroken;
+  if (length < 0 || length >= bytes.left() + to_come) return Parsed::kBroken;
   const unsigned char* text = bytes.take(std::int64_t{length} + 1);
   if (text == nullptr) return Parsed::kCutOff;
   // A terminator before the stated length ends the value.
@@ -46,7 +47,8 @@ Parsed parse_description(ByteReader& bytes, TEVPF_PARAM& param, TextSizes& sizes
 }
 
 // Takes one stored parameter. Its texts are left where they are.
-Parsed parse_param(ByteReader& bytes, TEVPF_PARAM& param, TextSizes& sizes) noexcept {
+Parsed parse_param(ByteReader& bytes, std::int64_t to_come, TEVPF_PARAM& param,
+                   TextSizes& sizes) noexcept {
   param = {};
   sizes = {};
   const unsigned char* fields = bytes.take(stored_size(kParamFields));
@@ -63,7 +65,7 @@ Parsed parse_param(ByteReader& bytes, TEVPF_PARAM& param, TextSizes& sizes) noex
   if (part == nullptr) return Parsed::kCutOff;
   if (type == PF_TYPE_STRING) {
     def.part.str.length = load<std::int32_t>(part);
-    const Parsed parsed = parse_string_value(bytes, def);
+    const Parsed parsed = parse_string_value(bytes, to_come, def);
     if (parsed != Parsed::kWhole) return parsed;
     sizes.value = std::int64_t{def.part.str.length} + 1;
   } else {
@@ -85,21 +87,31 @@ Parsed fetch_more(Body& body, ByteReader& at_hand) noexcept {
                                     : Parsed::kNoMemory;
 }
 
+// How many of a body's bytes can be texts, at most: their number is known when it has been gone
+// through. What is too much, up to 24 bytes a number, stays at the end of the list's text block.
+std::int64_t text_room(const Body& body, std::int32_t count) noexcept {
+  constexpr std::int32_t kLeastPart = value_type(PF_TYPE_STRING).param_part;
+  return body.left() - std::int64_t{count} * (kParamHead + kLeastPart);
+}
+
 // Takes the parameters off the body, up to the first one of an unknown type, whose size nobody
 // knows, and gives them texts of their own. The list counts those it has got, and their bytes.
 Parsed take_params(Body& body, std::int32_t count, TEVPF_LIST& list) noexcept {
   TextPacker packer;
-  if (!packer.reserve(text_room(body.left(), count), list.texts)) return Parsed::kNoMemory;
+  if (!packer.reserve(text_room(body, count), list.texts)) return Parsed::kNoMemory;
   ByteReader at_hand = body.at_hand();
+  std::int64_t to_come = body.left() - at_hand.left();
   while (list.num_params < count) {
     TEVPF_PARAM& param = list.param_ptr[list.num_params];
     TextSizes sizes;
     ByteReader behind = at_hand;
-    Parsed parsed = parse_param(behind, param, sizes);
+    Parsed parsed = parse_param(behind, to_come, param, sizes);
     if (parsed == Parsed::kCutOff) {
       parsed = fetch_more(body, at_hand);
+      to_come = body.left() - at_hand.left();
       if (parsed == Parsed::kWhole) continue;
     }
+    if (parsed == Parsed::kUnknownType) packer.finish(list.texts);
     if (parsed != Parsed::kWhole) return parsed;
     if (!own_texts(param.def, sizes, packer, list.texts)) return Parsed::kNoMemory;
     list.header.btf += static_cast<std::int32_t>(stored_size(param.def.type, sizes));
@@ -113,6 +125,7 @@ Parsed take_params(Body& body, std::int32_t count, TEVPF_LIST& list) noexcept {
 
 // Makes room for the parameters that the body claims, when it can hold so many, and takes them.
 Parsed take_body(Body& body, TEVPF_LIST& list) noexcept {
+  if (list.header.btf < kListHead) return Parsed::kBroken;
   const unsigned char* const fields = body.take_fields(kListHead);
   if (fields == nullptr) return Parsed::kBroken;
   TEVPF_LIST head;
@@ -128,7 +141,9 @@ Parsed take_body(Body& body, TEVPF_LIST& list) noexcept {
     if (list.param_ptr == nullptr || list.index_ptr == nullptr) return Parsed::kNoMemory;
     list.param_room = count;
   }
-  return take_params(body, count, list);
+  const Parsed parsed = take_params(body, count, list);
+  // A body that is cut short is none, whatever stands in it.
+  return parsed == Parsed::kUnknownType && !body.take_rest() ? Parsed::kBroken : parsed;
 }
 
 // Gives what a body held an element of its own. A body that is no list makes none; one that is cut
@@ -137,9 +152,10 @@ TEVPF_STATUS create(Parsed parsed, const TEVPF_LIST& loaded, TEVPF_LIST*& list) 
   if (parsed == Parsed::kNoMemory) return fail_empty(PF_NOMEM);
   if (parsed == Parsed::kBroken) return fail(PF_BADFORMAT, loaded.header.elem_name);
   PF_TRY(TEV8R1_create_list(loaded.header, &list));
-  const std::int32_t cursor = list->cur_param;
+  const TEVPF_LIST created = *list;
   *list = loaded;
-  list->cur_param = cursor;
+  list->header = created.header;
+  list->cur_param = created.cur_param;
   return PF_NORMAL;
 }
 

@@ -1,8 +1,6 @@
 // Loads a file, element after element, in one pass.
 #include "core/reader.h"
 
-#include <cstring>
-
 #include "core/element_builder.h"
 #include "core/file.h"
 #include "core/input.h"
@@ -20,6 +18,11 @@ struct Scratch {
   Owned<unsigned char> block;
   std::int32_t room = 0;
 };
+
+void terminate_texts(TEVPF_ELEM_HEADER& header) noexcept {
+  terminate_field(header.elem_name);
+  terminate_field(header.elem_desc);
+}
 
 // The body of the element that was announced last, in the scratch block.
 Input::Got read_body(Input& input, std::int32_t bytes, Scratch& scratch) noexcept {
@@ -73,8 +76,7 @@ TEVPF_STATUS load_file(TEVPF_FILE& file) noexcept {
   for (;;) {
     TEVPF_ELEM_HEADER header = {};
     const std::uint64_t got = input.read(&header, sizeof header);
-    terminate_field(header.elem_name);
-    terminate_field(header.elem_desc);
+    terminate_texts(header);
     if (got == 0 && !input.has_failed()) {
       file.new_file = 0;
       return PF_NORMAL;
@@ -102,11 +104,13 @@ TEVPF_STATUS TEV8R1_check_valid_file(TEVPF_FILE* file) noexcept {
 TEVPF_STATUS TEV8R1_format_list(TEVPF_ELEM_HEADER header, const void* body,
                                 std::FILE* stream) noexcept {
   Input input(stream);
+  terminate_texts(header);
   return build_list(header, Body(body, header.btf), input);
 }
 
 TEVPF_STATUS TEV8R1_format_table(TEVPF_ELEM_HEADER header, const void* body,
                                  std::FILE* stream) noexcept {
   Input input(stream);
+  terminate_texts(header);
   return build_table(header, body, input);
 }

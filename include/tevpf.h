@@ -660,9 +660,10 @@ TEVPF_API TEVPF_STATUS TEV8R1_PF_define_table_search(const char* table_name,
                                                      const char* column_name) TEVPF_NOEXCEPT;
 
 /* Searches from the next position on for a row whose column holds the key, copies it to row_out
- * (row_wid bytes) and makes it current. O(log n) in the search column, else O(n). Every 4,096
- * searches without a change of rows in between, a search column of numbers may take O(n) once to
- * copy its values, which the next ones search faster; the copy goes with the next change.
+ * (row_wid bytes) and makes it current. O(log n) in the search column, else O(n). After 4,096
+ * searches (n / 256 beyond a million rows) without a change of rows in between, a search column of
+ * numbers takes O(n) once to copy its values, which the next searches go through faster; the copy
+ * goes with the next change.
  *   mode  1: in the search column, take the next greater value when there is no equal one
  *   key   binary value of the column's type; a text may end in "*" and then finds what it starts
  *   PF_NOTFOUND  no such row; the cursor stays
@@ -673,7 +674,8 @@ TEVPF_API TEVPF_STATUS TEV8R1_PF_get_row_by_value(const char* table_name, int8_t
 
 /* Copies the value that the named column has in the first row whose first column holds the key. The
  * cursor is the same afterwards. A table without columns: PF_NORMAL, nothing is written.
- * O(log n) when the first column is the search column, else O(n).
+ * O(log n) when the first column is the search column, else O(n); copies values like the operation
+ * above.
  *   value_out  storage of the column's value size
  *   PF_NOTFOUND  no such row; PF_NOCOLUMN  no such column */
 TEVPF_API TEVPF_STATUS TEV8R1_PF_get_value(const char* table_name, const char* column_name,

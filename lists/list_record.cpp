@@ -11,18 +11,24 @@
 namespace tevpf {
 namespace {
 
+// What all texts of a list take: the rest of btf is known from the types.
+std::int64_t text_bytes(const TEVPF_LIST& list) noexcept {
+  std::int64_t bytes = list.header.btf - kListHead;
+  for (std::int32_t i = 0; i < list.num_params; ++i) {
+    bytes -= stored_size(list.param_ptr[i].def.type, TextSizes{});
+  }
+  return bytes;
+}
+
 // The array of copied records in `half`; num_params counts those that are whole.
 bool copy_params(const TEVPF_LIST& source, TEVPF_LIST& half) noexcept {
   half.param_ptr = new_array<TEVPF_PARAM>(static_cast<std::uint32_t>(source.num_params)).release();
   TextPacker packer;
-  if (half.param_ptr == nullptr ||
-      !packer.reserve(text_room(source.header.btf - kListHead, source.num_params), half.texts))
-    return false;
+  if (half.param_ptr == nullptr || !packer.reserve(text_bytes(source), half.texts)) return false;
   for (std::int32_t& i = half.num_params; i < source.num_params; ++i) {
     TEVPF_PARAM_DEF& definition = (half.param_ptr[i] = source.param_ptr[i]).def;
     if (!own_texts(definition, text_sizes(definition), packer, half.texts)) return false;
   }
-  packer.finish(half.texts);
   return true;
 }
 

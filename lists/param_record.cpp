@@ -59,11 +59,6 @@ TextSizes text_sizes(const TEVPF_PARAM_DEF& definition) noexcept {
   return {string ? text_size(definition.part.str.value) : 0, text_size(definition.description)};
 }
 
-std::int64_t text_room(std::int64_t bytes, std::int64_t params) noexcept {
-  constexpr std::int32_t kLeastPart = value_type(PF_TYPE_STRING).param_part;
-  return bytes - params * (kParamHead + kLeastPart);
-}
-
 bool own_texts(TEVPF_PARAM_DEF& definition) noexcept {
   TextPacker none;  // each text gets a block of its own
   return own_texts(definition, text_sizes(definition), none, {});

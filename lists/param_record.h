@@ -41,9 +41,6 @@ constexpr std::int64_t stored_size(std::int32_t type, const TextSizes& texts) no
 std::int64_t stored_size(std::int32_t type, const char* description, std::int64_t length) noexcept;
 std::int64_t stored_size(const TEVPF_PARAM_DEF& definition) noexcept;
 
-// How many of the bytes that some stored parameters take can be texts, at most.
-std::int64_t text_room(std::int64_t bytes, std::int64_t params) noexcept;
-
 // The desc_loc of a record with that definition.
 inline std::int8_t description_place(const TEVPF_PARAM_DEF& definition) noexcept {
   constexpr std::int32_t kHeadBeforeDef = 8;  // desc_loc counts from behind it

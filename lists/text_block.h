@@ -5,9 +5,7 @@
 // does not fit becomes a block of its own.
 #pragma once
 
-#include <cstddef>
 #include <cstdint>
-#include <cstring>
 
 #include "core/heap.h"
 #include "core/short_copy.h"

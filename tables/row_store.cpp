@@ -47,6 +47,7 @@ class Eraser {
       case 3:
         return has_zeros<3>();
       default:
+        static_assert(kMost == 4);
         return has_zeros<kMost>();
     }
   }

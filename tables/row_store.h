@@ -6,7 +6,6 @@
 #pragma once
 
 #include <cstdint>
-#include <cstring>
 
 #include "core/heap.h"
 #include "tables/table.h"

@@ -8,7 +8,6 @@
 
 #include <cstddef>
 #include <cstdint>
-#include <cstring>
 
 #include "core/text_word.h"
 #include "values/text_compare.h"

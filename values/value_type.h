@@ -102,6 +102,11 @@ auto& number_part(Def& definition) noexcept {
   }
 }
 
+static_assert(sizeof(TEVPF_PARAM_DEF{}.part.i32) == value_type(PF_TYPE_INT).param_part &&
+              sizeof(TEVPF_PARAM_DEF{}.part.f32) == value_type(PF_TYPE_REAL).param_part &&
+              sizeof(TEVPF_PARAM_DEF{}.part.f64) == value_type(PF_TYPE_DOUBLE).param_part &&
+              sizeof(TEVPF_PARAM_DEF{}.part.i16) == value_type(PF_TYPE_SHORT).param_part);
+
 template <class T, class Def>
 auto& limits_of(Def& definition) noexcept {
   if constexpr (std::is_same_v<T, std::int32_t>) {

@@ -5,6 +5,7 @@
 #include <random>
 
 #include "core/heap.h"
+#include "core/reader.h"
 #include "support/drive.h"
 #include "support/param_def.h"
 #include "support/temp_file.h"
@@ -41,6 +42,7 @@ constexpr std::size_t kRowCount = 0x163;     // of the table
 constexpr std::size_t kColumnIndex = 0x1e1;  // of the table
 constexpr std::size_t kRows = 0x1ed;
 constexpr std::size_t kHead = 108;  // an element's head
+constexpr std::size_t kFirstType = kHead + 20;
 
 class FormatTest : public LibraryTest {
  protected:
@@ -98,6 +100,10 @@ TEST_F(FormatTest, AFileCutAnywhereKeepsWhatCameBefore) {
       expect_opened(bytes, PF_NORMAL, kUntouched, bytes);
     } else if (size < kNameIndex) {
       expect_opened(bytes, PF_BADFILE, {path_, ""}, {});
+      if (size <= kFirstType) continue;
+      std::string unknown = bytes;  // what is cut short is so whatever stands in it
+      unknown[kFirstType] = 16;
+      expect_opened(unknown, PF_BADFILE, {path_, ""}, {});
     } else if (size < kListBytes) {
       expect_opened(bytes, PF_BADFORMAT, {"list index", ""}, list);
     } else if (size < kColumnIndex) {
@@ -108,6 +114,20 @@ TEST_F(FormatTest, AFileCutAnywhereKeepsWhatCameBefore) {
       expect_opened(bytes, PF_BADFORMAT, {item, ""}, without_rows);
     }
   }
+}
+
+TEST_F(FormatTest, TextsOfAHeaderEndInTheirFields) {
+  ASSERT_EQ(TEV8R1_PF_open(path_.c_str()), PF_NEWFILE);
+  TEVPF_ELEM_HEADER header;
+  std::memcpy(&header, example_.data(), sizeof header);
+  std::fill_n(header.elem_name, sizeof header.elem_name, 'x');
+  std::fill_n(header.elem_desc, sizeof header.elem_desc, 'y');
+  std::FILE* const index = fmemopen(nullptr, 8, "r+");
+  EXPECT_EQ(TEV8R1_format_list(header, &example_[kHead], index), PF_NORMAL);
+  std::fclose(index);
+  TEVPF_LIST* list;
+  ASSERT_EQ(TEV8R1_get_list_ptr(std::string(19, 'x').c_str(), &list), PF_NORMAL);
+  EXPECT_EQ(list->header.elem_desc, std::string(79, 'y'));
 }
 
 struct Patch {
