@@ -27,6 +27,23 @@ inline const unsigned char* column_base(const TEVPF_TABLE& table,
   return table.row_data == nullptr ? nullptr : table.row_data + column.offset;
 }
 
+// These values by row number.
+struct Values {
+  const unsigned char* base;
+  std::int64_t stride;
+
+  const unsigned char* of(std::int32_t row) const noexcept { return base + row * stride; }
+};
+
+inline Values values_of(const TEVPF_TABLE& table, const TEVPF_COLUMN& column) noexcept {
+  return {column_base(table, column), table.row_wid};
+}
+
+// Bytes that can be read from the start of a column's value in every row.
+inline std::int64_t readable_bytes(const TEVPF_TABLE& table, const TEVPF_COLUMN& column) noexcept {
+  return std::int64_t{table.row_wid} - column.offset;
+}
+
 // Makes room for num_rows + spare rows of row_wid bytes; only row_data and row_room change. False
 // when memory runs out: the block is as it was. Row bytes that are new are not zeroed. Afterwards
 // row_data is not null, even where rows have no bytes.
