@@ -97,7 +97,8 @@ constexpr auto joined() noexcept {
   std::size_t last = 0;
   for (const Field& field : Fields) {
     Field& run = runs[last];
-    const bool goes_on = field.place != kNowhere && field.place == run.place + run.bytes;
+    const bool in_record = field.place != kNowhere && run.place != kNowhere;
+    const bool goes_on = in_record && field.place == run.place + run.bytes;
     if (run.bytes == 0 || goes_on) {
       run = {run.bytes == 0 ? field.place : run.place, run.bytes + field.bytes};
     } else {
