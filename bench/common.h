@@ -163,6 +163,11 @@ void write_plainly(const std::string& path, std::span<const char> bytes);
 void write_and_sync(const std::string& path, std::span<const char> bytes);
 std::vector<char> contents(const std::string& path);
 
+// To be called ahead of passes that take much fresh memory, in the program or as cached files: has the
+// host of a virtual machine provide it. That takes milliseconds for 2 MB, in no order, and would be part
+// of some figures; a few seconds after memory was given back the host may have taken it again.
+void warm_memory();
+
 // Whole files, timed: saving what is open into a new one, and opening one; and their limits, one
 // write() or read() of the same bytes. `operations` is what the time is divided by.
 void time_save(benchmark::State& state, std::int64_t operations);
@@ -171,14 +176,19 @@ void time_write(benchmark::State& state, const std::string& source, std::int64_t
 void time_open(benchmark::State& state, const std::string& path, std::int64_t operations);
 void time_read(benchmark::State& state, const std::string& path, std::int64_t operations);
 
-// Registers a benchmark under workload/contestant/n; its figure is time per operation. Large sizes,
-// which take long to set up, get one pass a run.
+// Registers a benchmark under workload/contestant/n; its figure is time per operation. Sizes that take
+// long to set up get a fixed number of passes a run.
+inline constexpr std::int64_t kLongSetUp = 20'000;  // entries from which on it does
+inline constexpr std::int64_t kFewPasses = 5;       // of what one set-up serves
+inline constexpr std::int64_t kManyPasses = 50;     // of a few milliseconds each
+inline const std::vector<std::int64_t> kSizes = {1'000, 10'000, 100'000, 1'000'000};
+
 inline void add(const char* workload, const char* contestant, void (*body)(benchmark::State&),
-                const std::vector<std::int64_t>& sizes = {1'000, 10'000, 100'000, 1'000'000}) {
+                std::int64_t passes = 1, const std::vector<std::int64_t>& sizes = kSizes) {
   const std::string name = std::string(workload) + "/" + contestant;
   for (const std::int64_t n : sizes) {
     auto* entry = benchmark::RegisterBenchmark(name.c_str(), body)->Arg(n)->UseManualTime();
-    if (n > 10'000) entry->Iterations(1);
+    if (n >= kLongSetUp) entry->Iterations(passes);
   }
 }
 

@@ -1,6 +1,9 @@
 // Saving and opening whole files, and the plain system calls that they are held against.
 #include <fcntl.h>
+#include <sys/mman.h>
 #include <unistd.h>
+
+#include <cstring>
 
 #include "common.h"
 
@@ -47,8 +50,19 @@ std::vector<char> contents(const std::string& path) {
   return bytes;
 }
 
+void warm_memory() {
+  constexpr std::size_t kBytes = std::size_t{256} << 20;
+  void* const block =
+      mmap(nullptr, kBytes, PROT_READ | PROT_WRITE, MAP_PRIVATE | MAP_ANONYMOUS, -1, 0);
+  if (block == MAP_FAILED) return;
+  madvise(block, kBytes, MADV_HUGEPAGE);
+  std::memset(block, 1, kBytes);
+  munmap(block, kBytes);
+}
+
 void time_save(benchmark::State& state, std::int64_t operations) {
   const std::string path = folder().file("saved.pf");
+  warm_memory();
   for (auto _ : state) {
     std::filesystem::remove(path);
     const Timer timer;
@@ -59,6 +73,7 @@ void time_save(benchmark::State& state, std::int64_t operations) {
 
 void time_backup(benchmark::State& state, const Database& from, std::int64_t operations) {
   const std::string path = folder().file("saved.db");
+  warm_memory();
   for (auto _ : state) {
     std::filesystem::remove(path);
     const Timer timer;
@@ -71,6 +86,7 @@ void time_backup(benchmark::State& state, const Database& from, std::int64_t ope
 void time_write(benchmark::State& state, const std::string& source, std::int64_t operations) {
   const std::vector<char> bytes = contents(source);
   const std::string path = folder().file("saved.pf");
+  warm_memory();
   for (auto _ : state) {
     std::filesystem::remove(path);
     const Timer timer;
@@ -80,6 +96,7 @@ void time_write(benchmark::State& state, const std::string& source, std::int64_t
 }
 
 void time_open(benchmark::State& state, const std::string& path, std::int64_t operations) {
+  warm_memory();
   for (auto _ : state) {
     const Timer timer;
     MUST(TEV8R1_PF_open(path.c_str()));
@@ -90,6 +107,7 @@ void time_open(benchmark::State& state, const std::string& path, std::int64_t op
 
 void time_read(benchmark::State& state, const std::string& path, std::int64_t operations) {
   std::vector<char> bytes = contents(path);
+  warm_memory();
   for (auto _ : state) {
     const Timer timer;
     read_plainly(path, bytes);

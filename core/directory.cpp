@@ -108,13 +108,17 @@ template <class Record>
 // Every operation starts here, and mostly with the element of the last one and a short name: that
 // case calls nothing.
 template <class Record>
+Record* last_element(const char* name) noexcept {
+  if (library.current_file == nullptr) return nullptr;
+  Record* const last = library.current_file->*Kind<Record>::kLast;
+  return last != nullptr && holds_short_text(last->header.elem_name, name) ? last : nullptr;
+}
+
+template <class Record>
 TEVPF_STATUS find_element(const char* name, Record** element_out) noexcept {
-  if (library.current_file != nullptr) {
-    Record* const last = library.current_file->*Kind<Record>::kLast;
-    if (last != nullptr && holds_short_text(last->header.elem_name, name)) {
-      *element_out = last;
-      return PF_NORMAL;
-    }
+  if (Record* const last = last_element<Record>(name)) {
+    *element_out = last;
+    return PF_NORMAL;
   }
   return find_in_directory(name, element_out);
 }
@@ -318,6 +322,10 @@ TEVPF_STATUS TEV8R1_insert_list(TEVPF_LIST** list_out) noexcept { return insert_
 
 TEVPF_STATUS TEV8R1_insert_table(TEVPF_TABLE** table_out) noexcept {
   return insert_element(table_out);
+}
+
+TEVPF_TABLE* tevpf::last_table(const char* name) noexcept {
+  return last_element<TEVPF_TABLE>(name);
 }
 
 TEVPF_STATUS TEV8R1_get_list_ptr(const char* name, TEVPF_LIST** list_out) noexcept {

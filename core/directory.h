@@ -24,3 +24,11 @@ TEVPF_API TEVPF_STATUS TEV8R1_get_table_array_pos(const TEVPF_TABLE* table,
 TEVPF_API TEVPF_STATUS TEV8R1_free_list(TEVPF_LIST* list) noexcept;
 TEVPF_API TEVPF_STATUS TEV8R1_free_table(TEVPF_TABLE* table) noexcept;
 }
+
+namespace tevpf {
+
+// The table that was found last if it has this name, of fewer than 8 characters; else null, and
+// TEV8R1_get_table_ptr finds it.
+TEVPF_TABLE* last_table(const char* name) noexcept;
+
+}  // namespace tevpf

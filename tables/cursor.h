@@ -38,9 +38,10 @@ inline constexpr std::int32_t kRowsAhead = 12;
 
 // Copies the row at a position to row_out and makes it the current one.
 inline void deliver_row(TEVPF_TABLE& table, std::int32_t position, void* row_out) noexcept {
-  copy_short(row_out, row_at(table, row_at_position(table, position)), table.row_wid);
+  const unsigned char* const row = row_at(table, row_at_position(table, position));
   table.cur_row = position;
   table.next_row = position + 1;
+  copy_short(row_out, row, table.row_wid);
 }
 
 }  // namespace tevpf
