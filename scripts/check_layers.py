@@ -20,7 +20,8 @@ LAYERS = [
     ("values", "values/*"),
     ("records", "lists/list lists/text_block lists/*_record lists/name_* lists/param_check "
                 "lists/default_table tables/table tables/*_record tables/layout tables/row_store "
-                "tables/row_order tables/column_index tables/default_row tables/templates reports/formats"),
+                "tables/row_order tables/search_keys tables/column_index tables/default_row "
+                "tables/templates reports/formats"),
     ("core, upper half", "core/*"),
     ("operations", "lists/* tables/*"),
     ("reports", "reports/*"),

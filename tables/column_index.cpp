@@ -8,6 +8,7 @@
 #include "core/status.h"
 #include "tables/row_order.h"
 #include "tables/row_store.h"
+#include "tables/search_keys.h"
 #include "values/compare.h"
 
 namespace tevpf {
@@ -120,33 +121,8 @@ TEVPF_STATUS search_entries(const Values& values, std::int32_t count, const Key&
   return PF_NOTFOUND;
 }
 
-// ---- Search keys --------------------------------------------------------------------------------
-
-// Gathering keys takes about as long as the searches before it have taken: 5 ms in both with a
-// million rows that lie in the order of their keys, a twentieth of it with ten thousand, and beyond a
-// million both grow. So keys that the next change drops again cost about as much time as was
-// spent without them. Small tables lie in the cache anyway.
-#ifdef TEVPF_TEST_HOOKS
-constexpr std::int32_t kSearchesBeforeKeys = 1, kRowsWorthKeys = 4;
-#else
-constexpr std::int32_t kSearchesBeforeKeys = 4096, kRowsWorthKeys = 1024;
-#endif
-constexpr std::int32_t kRowsPerSearch = 256;
-
-template <class T>
-bool has_search_keys(const TEVPF_TABLE& table, TEVPF_COLUMN& column) noexcept {
-  if (column.keys.values != nullptr) return true;
-  const std::int32_t count = table.num_rows;
-  const std::int32_t enough = std::max(kSearchesBeforeKeys, count / kRowsPerSearch);
-  if (count < kRowsWorthKeys || ++column.keys.searches < enough) return false;
-  column.keys.searches = 0;  // not again at once when there is no memory
-  auto keys = new_array<T>(static_cast<std::uint32_t>(count));
-  if (!keys) return false;
-  const ValuesByRow values{values_of(table, column), column.idx_ptr};
-  for (std::int32_t i = 0; i < count; ++i) keys[i] = load<T>(values.at(i));
-  column.keys.values = reinterpret_cast<unsigned char*>(keys.release());
-  return true;
-}
+// What a search costs, as so many rows looked at one after the other.
+constexpr std::int64_t kRowsPerSearch = 256;
 
 // What TEV8R1_sort_comp compares: the column whose index was built last.
 struct SortContext {
@@ -326,19 +302,14 @@ TEVPF_STATUS find_in_index(const TEVPF_TABLE& table, TEVPF_COLUMN& column, std::
   if (column.def.type == PF_TYPE_STRING) return search_index(table, column, first, count, key, pos);
   pos = 0;
   if (count < 1) return PF_NOTFOUND;
+  count_search(column, kRowsPerSearch);
+  const unsigned char* const keys = search_keys(table, column, column.idx_ptr);
+  if (keys == nullptr) return search_index(table, column, first, count, key, pos);
   return with_number(column.def.type, [&](auto tag) {
     using T = decltype(tag);
-    if (!has_search_keys<T>(table, column))
-      return search_index(table, column, first, count, key, pos);
-    const ValuesInLine<T> values{column.keys.values + first * std::ptrdiff_t{sizeof(T)},
-                                 column.idx_ptr + first};
+    const ValuesInLine<T> values{keys + first * std::ptrdiff_t{sizeof(T)}, column.idx_ptr + first};
     return search_entries(values, count, NumberKey<T>(key, column.tolerance), pos);
   });
-}
-
-void drop_search_keys(TEVPF_COLUMN& column) noexcept {
-  heap_free(column.keys.values);
-  column.keys = {};
 }
 
 void renumber_for_insertion(TEVPF_TABLE& table, std::int32_t row_number) noexcept {
@@ -361,8 +332,8 @@ void insert_entry(TEVPF_COLUMN& column, std::int32_t count, std::int32_t positio
 void remove_row_from_indexes(TEVPF_TABLE& table, std::int32_t row_number,
                              std::int32_t* positions) noexcept {
   for (std::int32_t i = 0; i < table.num_cols; ++i) {
-    if (!is_indexed(table.col_array[i])) continue;
     drop_search_keys(table.col_array[i]);
+    if (!is_indexed(table.col_array[i])) continue;
     const std::int32_t position =
         remove_row(table.col_array[i].idx_ptr, table.num_rows, row_number);
     if (positions != nullptr) positions[i] = position;

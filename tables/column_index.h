@@ -70,7 +70,7 @@ inline std::int32_t row_at_position(const TEVPF_TABLE& table, std::int32_t posit
   return search != nullptr && is_indexed(*search) ? search->idx_ptr[position] : position;
 }
 
-// ---- Entries, as rows come and go ---------------------------------------------------------------
+// ---- Entries, as rows come and go; search keys go with every change -----------------------------
 
 // Searches `count` entries from position `first` on for a key; gives the status and the position
 // (from `first`) that TEV8R1_binary_search gives.
@@ -78,15 +78,11 @@ inline std::int32_t row_at_position(const TEVPF_TABLE& table, std::int32_t posit
                                         std::int32_t first, std::int32_t count, const void* key,
                                         std::int32_t& pos) noexcept;
 
-// The same, and remembers that the column is searched: once that pays, its values are kept in index
-// order, and steps cost a quarter in a table that is larger than the cache.
+// The same for searches that callers ask for: a column that is searched often gets search keys, with
+// which steps cost a quarter in a table that is larger than the cache.
 [[nodiscard]] TEVPF_STATUS find_in_index(const TEVPF_TABLE& table, TEVPF_COLUMN& column,
                                          std::int32_t first, std::int32_t count, const void* key,
                                          std::int32_t& pos) noexcept;
-
-// To be called when values of a column have changed in their rows; the operations on entries do so
-// themselves.
-void drop_search_keys(TEVPF_COLUMN& column) noexcept;
 
 // Raises every entry from row_number on by one in all indexes, ahead of the insertion of that row.
 void renumber_for_insertion(TEVPF_TABLE& table, std::int32_t row_number) noexcept;

@@ -12,6 +12,7 @@
 #include "tables/cursor.h"
 #include "tables/layout.h"
 #include "tables/row_store.h"
+#include "tables/search_keys.h"
 #include "tables/validate.h"
 
 using namespace tevpf;
@@ -78,6 +79,7 @@ void insert_entries(TEVPF_TABLE& table, const unsigned char* row, std::int32_t r
   std::int32_t known = 0;
   for (std::int32_t i = 0; i < table.num_cols; ++i) {
     TEVPF_COLUMN& column = table.col_array[i];
+    drop_search_keys(column);
     if (!is_indexed(column)) continue;
     std::int32_t position = 0;
     if (is_unique(column) && known < points.count) {

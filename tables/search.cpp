@@ -10,6 +10,7 @@
 #include "tables/cursor.h"
 #include "tables/layout.h"
 #include "tables/row_store.h"
+#include "tables/search_keys.h"
 #include "tables/validate.h"
 #include "values/compare.h"
 #include "values/value_text.h"
@@ -22,34 +23,64 @@ constexpr std::int8_t kExact = 0;
 constexpr std::int8_t kNearest = 1;
 
 // The first position from `first` on whose row has a value equal to the key, walking in storage
-// order (order null) or through an index; num_rows when there is none. At the speed of memory: one
+// order (order null) or through an index; `count` when there is none. At the speed of memory: one
 // typed comparison a row.
 template <class Key>
-std::int32_t walk(const TEVPF_TABLE& table, const TEVPF_COLUMN& column, const std::int32_t* order,
+std::int32_t walk(const Values& values, std::int32_t count, const std::int32_t* order,
                   std::int32_t first, const Key& key) noexcept {
-  const unsigned char* const base = column_base(table, column);
-  const std::int64_t stride = table.row_wid;
-  const std::int32_t count = table.num_rows;
   std::int32_t at = first;
   if (order == nullptr) {
-    const unsigned char* value = base + at * stride;
-    for (; at < count && !key.equals(value); ++at, value += stride) fetch_along(value);
+    const unsigned char* value = values.of(at);
+    for (; at < count && !key.equals(value); ++at, value += values.stride) fetch_along(value);
     return at;
   }
   for (; at < count; ++at) {
-    if (count - at > kRowsAhead) __builtin_prefetch(base + order[at + kRowsAhead] * stride);
-    if (key.equals(base + order[at] * stride)) break;
+    if (count - at > kRowsAhead) __builtin_prefetch(values.of(order[at + kRowsAhead]));
+    if (key.equals(values.of(order[at]))) break;
   }
   return at;
 }
 
-std::int32_t walk_for_key(const TEVPF_TABLE& table, const TEVPF_COLUMN& column, std::int32_t first,
+// The same over values side by side, many at a time.
+template <class T>
+std::int32_t walk_in_line(const unsigned char* values, std::int32_t count, std::int32_t first,
+                          const NumberKey<T>& key) noexcept {
+  constexpr std::int32_t kBlock = NumberKey<T>::kBlock;
+  const auto place = [&](std::int32_t at) { return values + at * std::ptrdiff_t{sizeof(T)}; };
+  std::int32_t at = first;
+  while (count - at >= kBlock && !key.may_equal_one_of(place(at))) at += kBlock;
+  while (at < count && !key.equals(place(at))) ++at;
+  return at;
+}
+
+std::int32_t walk_along_keys(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
+                             const unsigned char* keys, const std::int32_t* order,
+                             std::int32_t first, const void* key) noexcept {
+  return with_number(column.def.type, [&](auto tag) {
+    using T = decltype(tag);
+    const NumberKey<T> prepared(key, column.tolerance);
+    if (order == nullptr) return walk_in_line(keys, table.num_rows, first, prepared);
+    return walk(Values{keys, sizeof(T)}, table.num_rows, order, first, prepared);
+  });
+}
+
+std::int32_t walk_for_key(const TEVPF_TABLE& table, TEVPF_COLUMN& column, std::int32_t first,
                           const void* key) noexcept {
   const std::int32_t* const order =
       table.cur_col != nullptr ? index_entries(*table.cur_col) : nullptr;
-  return with_key(
-      column.def.type, column.tolerance, key, table.row_wid - column.offset,
-      [&](const auto& prepared) { return walk(table, column, order, first, prepared); });
+  // The keys of an indexed column follow its own index, not the traversal.
+  const bool may_have_keys = is_number_type(column.def.type) && !is_indexed(column);
+  if (may_have_keys) {
+    const unsigned char* const keys = search_keys(table, column, nullptr);
+    if (keys != nullptr) return walk_along_keys(table, column, keys, order, first, key);
+  }
+  const std::int32_t position =
+      with_key(column.def.type, column.tolerance, key, readable_bytes(table, column),
+               [&](const auto& prepared) {
+                 return walk(values_of(table, column), table.num_rows, order, first, prepared);
+               });
+  if (may_have_keys) count_search(column, std::int64_t{position} - first + 1);
+  return position;
 }
 
 // The position from `first` on whose row has the key, or in nearest mode, which acts on the search

@@ -16,11 +16,10 @@
 
 namespace tevpf {
 
-// A number column's values in the order of its index, side by side: what is searched often is found
-// without a step through the index to a row at each probe. The state of tables/column_index.
+// The state of tables/search_keys.
 struct SearchKeys {
-  unsigned char* values;  // null while there are none
-  std::int32_t searches;  // since rows or index changed
+  unsigned char* values;  // a number column's values side by side; null while there are none
+  std::int64_t effort;    // of searches since the last change, in rows looked at
 };
 
 }  // namespace tevpf

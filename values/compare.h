@@ -51,7 +51,40 @@ class NumberKey {
     }
   }
 
+  // False when none of kBlock values side by side equals the key.
+#ifdef TEVPF_TEST_HOOKS
+  static constexpr int kBlock = 4;  // small tables too have blocks
+#else
+  static constexpr int kBlock = 64;
+#endif
+  bool may_equal_one_of(const unsigned char* block) const noexcept {
+    if constexpr (kIsFloating<T>) {
+      return !(tolerance_ >= 0) || is_near_one_of(block);
+    } else {
+      using Flag = std::make_unsigned_t<T>;  // as wide as a value: compilers make vectors of them
+      Flag found = 0;
+      for (int i = 0; i < kBlock; ++i, block += sizeof(T)) {
+        found = static_cast<Flag>(found | Flag{equals(block)});
+      }
+      return found != 0;
+    }
+  }
+
  private:
+  // Counted in two doubles by turns: no branch, no move out of their registers, no long chain of sums.
+  bool is_near_one_of(const unsigned char* block) const noexcept {
+    const double y = key_, tolerance = tolerance_;
+    double near[2] = {0, 0};
+    for (std::size_t i = 0; i < kBlock; i += 2) {
+      for (std::size_t k = 0; k < 2; ++k) {
+        const double x = load<T>(block + (i + k) * sizeof(T));
+        const double not_above = x - tolerance > y ? 0 : 1;
+        near[k] += x + tolerance < y ? 0 : not_above;
+      }
+    }
+    return near[0] + near[1] != 0;
+  }
+
   T key_;
   double tolerance_;  // of no use to integers
 };

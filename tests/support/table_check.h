@@ -36,6 +36,17 @@ inline const char* broken_row(const TEVPF_TABLE& table, const unsigned char* row
   return only_zeros_to(table.row_wid) ? nullptr : "padding is not zero";
 }
 
+// In the order of the index, or without one of the rows.
+inline bool are_search_keys_true(const TEVPF_TABLE& table, const TEVPF_COLUMN& column) {
+  const std::int32_t size = tevpf::column_size(column);
+  for (int i = 0; column.keys.values != nullptr && i < table.num_rows; ++i) {
+    const int row = column.idx_ptr != nullptr ? column.idx_ptr[i] : i;
+    const unsigned char* const value = tevpf::row_at(table, row) + column.offset;
+    if (std::memcmp(column.keys.values + std::int64_t{i} * size, value, size) != 0) return false;
+  }
+  return true;
+}
+
 inline const char* broken_index(const TEVPF_TABLE& table, const TEVPF_COLUMN& column) {
   const int room = table.num_rows + table.free_rows;
   if (column.def.idx_flag == 0) return column.idx_ptr != nullptr ? "index without flag" : nullptr;
@@ -45,12 +56,6 @@ inline const char* broken_index(const TEVPF_TABLE& table, const TEVPF_COLUMN& co
     const int row = column.idx_ptr[i];
     if (row < 0 || row >= table.num_rows || seen[row]) return "index entries are all row numbers";
     seen[row] = true;
-    const std::int32_t size = tevpf::column_size(column);
-    const unsigned char* const value = tevpf::row_at(table, row) + column.offset;
-    if (column.keys.values != nullptr &&
-        std::memcmp(column.keys.values + std::int64_t{i} * size, value, size) != 0) {
-      return "search keys are the values";
-    }
   }
   return nullptr;
 }
@@ -78,6 +83,7 @@ inline const char* broken_rule(const TEVPF_TABLE& table) {
   if (const char* rule = broken_row(table, table.dft_row)) return rule;
   for (const TEVPF_COLUMN& column : std::span(table.col_array, table.num_cols)) {
     if (const char* rule = broken_index(table, column)) return rule;
+    if (!are_search_keys_true(table, column)) return "search keys are not the values";
   }
   if (table.cur_col != nullptr) {
     const auto place = table.cur_col - table.col_array;

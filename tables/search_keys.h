@@ -1,0 +1,30 @@
+// A column's values side by side, kept while the column is searched often: in the order of its index,
+// or without one in the order of the rows. What is searched then comes densely out of memory, and
+// without a step through the index at each probe. For columns of numbers.
+#pragma once
+
+#include <cstdint>
+
+#include "core/heap.h"
+#include "tables/table.h"
+
+namespace tevpf {
+
+// The values, if they are there or it is time for them: as soon as searches since the last change have
+// cost about what gathering costs. Null else, and when memory is short. `index`: the column's, null
+// when it has none.
+[[nodiscard]] const unsigned char* search_keys(const TEVPF_TABLE& table, TEVPF_COLUMN& column,
+                                               const std::int32_t* index) noexcept;
+
+// Counts a search that cost as much as looking at so many rows one after the other.
+inline void count_search(TEVPF_COLUMN& column, std::int64_t rows) noexcept {
+  if (column.keys.values == nullptr) column.keys.effort += rows;
+}
+
+// To be called when the column's values, its rows or its index change.
+inline void drop_search_keys(TEVPF_COLUMN& column) noexcept {
+  if (column.keys.values != nullptr) heap_free(column.keys.values);
+  column.keys = {};
+}
+
+}  // namespace tevpf
