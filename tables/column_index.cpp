@@ -23,19 +23,16 @@ struct ValuesByRow {
   const unsigned char* at(std::int32_t position) const noexcept {
     return values.of(entries[position]);
   }
-  void fetch_entry(std::int32_t) const noexcept {}  // read on the way
 };
 
 template <class T>
 struct ValuesInLine {
   const unsigned char* first;
-  const std::int32_t* entries;
 
   const unsigned char* at(std::int32_t position) const noexcept {
     return first + position * std::ptrdiff_t{sizeof(T)};
   }
-  // Asks for the entry that a search is about to end at: who searches wants the row.
-  void fetch_entry(std::int32_t position) const noexcept { __builtin_prefetch(entries + position); }
+  ValuesInLine from(std::int32_t position) const noexcept { return {at(position)}; }
 };
 
 // ---- Searching ----------------------------------------------------------------------------------
@@ -53,7 +50,6 @@ TEVPF_STATUS search_entries(const Values& values, std::int32_t count, const Numb
   }
   std::int32_t first = 0;  // the answer is one of `length` entries from there on, or behind them
   std::int32_t length = count;
-  constexpr std::int32_t kNearTheEnd = 64;
   const auto less = [&](std::int32_t place) {
     return static_cast<std::int32_t>(key.is_above(values.at(first + place - 1)));
   };
@@ -61,7 +57,6 @@ TEVPF_STATUS search_entries(const Values& values, std::int32_t count, const Numb
     const std::int32_t quarter = length / 4;
     first += quarter * (less(quarter) + less(2 * quarter) + less(3 * quarter));
     length -= 3 * quarter;
-    if (length <= kNearTheEnd) values.fetch_entry(first);
   }
   std::int32_t behind = 0;
   for (std::int32_t place = 1; place <= length; ++place) behind += less(place);
@@ -121,8 +116,37 @@ TEVPF_STATUS search_entries(const Values& values, std::int32_t count, const Key&
   return PF_NOTFOUND;
 }
 
+// ---- Searching along search keys ----------------------------------------------------------------
+
 // What a search costs, as so many rows looked at one after the other.
 constexpr std::int64_t kRowsPerSearch = 256;
+
+template <class T>
+TEVPF_STATUS search_keys_from(const ValuesInLine<T>& values, std::int32_t first, std::int32_t count,
+                              const std::int32_t*, const NumberKey<T>& key,
+                              std::int32_t& pos) noexcept {
+  return search_entries(values.from(first), count - first, key, pos);
+}
+
+// Integers: along the fences, then within the one line of values that they lead to. Whoever searches
+// wants the row, so the index entries that belong to it are asked for at once.
+template <class T>
+TEVPF_STATUS search_keys_from(const ValuesInLine<T>& values, std::int32_t first, std::int32_t count,
+                              const std::int32_t* entries, const NumberKey<T>& key,
+                              std::int32_t& pos) noexcept requires(!kIsFloating<T>) {
+  std::int32_t fence = 0, place = 0;
+  if (fence_count(count) > 0) {
+    (void)search_entries(values.from(count), fence_count(count), key, fence);
+  }
+  const std::int32_t start = fence * kFenceStep;
+  if (start < count) {
+    __builtin_prefetch(entries + start);
+    (void)search_entries(values.from(start), std::min(kFenceStep, count - start), key, place);
+  }
+  const std::int32_t found = std::max(first, start + place);
+  pos = found - first;
+  return found < count && key.equals(values.at(found)) ? PF_NORMAL : PF_NOTFOUND;
+}
 
 // What TEV8R1_sort_comp compares: the column whose index was built last.
 struct SortContext {
@@ -307,8 +331,8 @@ TEVPF_STATUS find_in_index(const TEVPF_TABLE& table, TEVPF_COLUMN& column, std::
   if (keys == nullptr) return search_index(table, column, first, count, key, pos);
   return with_number(column.def.type, [&](auto tag) {
     using T = decltype(tag);
-    const ValuesInLine<T> values{keys + first * std::ptrdiff_t{sizeof(T)}, column.idx_ptr + first};
-    return search_entries(values, count, NumberKey<T>(key, column.tolerance), pos);
+    return search_keys_from(ValuesInLine<T>{keys}, first, first + count, column.idx_ptr,
+                            NumberKey<T>(key, column.tolerance), pos);
   });
 }
 

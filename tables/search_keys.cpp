@@ -41,9 +41,12 @@ const unsigned char* search_keys(const TEVPF_TABLE& table, TEVPF_COLUMN& column,
   }
   keys.effort = 0;  // not again at once when there is no memory
   return with_number(column.def.type, [&](auto tag) -> const unsigned char* {
-    auto values = new_array<decltype(tag)>(static_cast<std::uint32_t>(count));
+    const std::int32_t fences =
+        index == nullptr || kIsFloating<decltype(tag)> ? 0 : fence_count(count);
+    auto values = new_array<decltype(tag)>(static_cast<std::uint64_t>(count) + fences);
     if (!values) return nullptr;
     gather(values_of(table, column), index, count, values.get());
+    for (std::int32_t i = 0; i < fences; ++i) values[count + i] = values[(i + 1) * kFenceStep - 1];
     return keys.values = reinterpret_cast<unsigned char*>(values.release());
   });
 }
