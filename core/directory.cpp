@@ -324,6 +324,7 @@ TEVPF_STATUS TEV8R1_insert_table(TEVPF_TABLE** table_out) noexcept {
   return insert_element(table_out);
 }
 
+TEVPF_LIST* tevpf::last_list(const char* name) noexcept { return last_element<TEVPF_LIST>(name); }
 TEVPF_TABLE* tevpf::last_table(const char* name) noexcept {
   return last_element<TEVPF_TABLE>(name);
 }

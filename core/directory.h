@@ -27,8 +27,9 @@ TEVPF_API TEVPF_STATUS TEV8R1_free_table(TEVPF_TABLE* table) noexcept;
 
 namespace tevpf {
 
-// The table that was found last if it has this name, of fewer than 8 characters; else null, and
-// TEV8R1_get_table_ptr finds it.
+// The element that was found last if it has this name, of fewer than 8 characters; else null, and the
+// operations above find it.
+TEVPF_LIST* last_list(const char* name) noexcept;
 TEVPF_TABLE* last_table(const char* name) noexcept;
 
 }  // namespace tevpf

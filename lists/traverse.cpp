@@ -29,22 +29,34 @@ void deliver(TEVPF_LIST& list, std::int32_t position, TEVPF_PARAM_DEF& out) noex
   list.cur_param = position;
 }
 
+inline TEVPF_STATUS step(TEVPF_LIST& list, char* name_out, void* value_out) noexcept {
+  if (list.cur_param < std::numeric_limits<std::int32_t>::max()) ++list.cur_param;
+  if (list.cur_param >= list.num_params) return PF_NOMORE;
+  const TEVPF_PARAM_DEF& definition = list.param_ptr[list.cur_param].def;
+  fetch_along(&definition, sizeof definition);
+  std::memcpy(name_out, definition.name, sizeof definition.name);
+  copy_value(definition, value_out);
+  return PF_NORMAL;
+}
+
+[[gnu::noinline]] TEVPF_STATUS find_and_step(const char* list_name, char* name_out,
+                                             void* value_out) noexcept {
+  TEVPF_LIST* list;
+  PF_TRY(TEV8R1_get_list_ptr(list_name, &list));
+  return step(*list, name_out, value_out);
+}
+
 }  // namespace
 }  // namespace tevpf
 
 using namespace tevpf;
 
+// Lists are walked by the million, one call a parameter: the usual case keeps nothing across a call.
 TEVPF_STATUS TEV8R1_PF_get_next_param(const char* list_name, char* name_out,
                                       void* value_out) noexcept {
-  TEVPF_LIST* list;
-  PF_TRY(TEV8R1_get_list_ptr(list_name, &list));
-  if (list->cur_param < std::numeric_limits<std::int32_t>::max()) ++list->cur_param;
-  if (list->cur_param >= list->num_params) return PF_NOMORE;
-  const TEVPF_PARAM_DEF& definition = list->param_ptr[list->cur_param].def;
-  fetch_along(&definition);
-  std::memcpy(name_out, definition.name, sizeof definition.name);
-  copy_value(definition, value_out);
-  return PF_NORMAL;
+  TEVPF_LIST* const list = last_list(list_name);
+  return list != nullptr ? step(*list, name_out, value_out)
+                         : find_and_step(list_name, name_out, value_out);
 }
 
 TEVPF_STATUS TEV8R1_PF_get_next_param_def(const char* list_name,
