@@ -33,21 +33,20 @@ void gather(const Values& values, const std::int32_t* order, std::int32_t count,
 
 const unsigned char* search_keys(const TEVPF_TABLE& table, TEVPF_COLUMN& column,
                                  const std::int32_t* index) noexcept {
-  SearchKeys& keys = column.keys;
+  if (column.keys.values != nullptr) return column.keys.values;
   const std::int32_t count = table.num_rows;
-  if (keys.values != nullptr) return keys.values;
-  if (count < kRowsWorthKeys || keys.effort < std::max<std::int64_t>(kEffortBeforeKeys, count)) {
-    return nullptr;
-  }
-  keys.effort = 0;  // not again at once when there is no memory
+  const std::int64_t enough = std::max<std::int64_t>(kEffortBeforeKeys, count);
+  if (count < kRowsWorthKeys || column.keys.effort < enough) return nullptr;
+  column.keys.effort = 0;  // not again at once when there is no memory
   return with_number(column.def.type, [&](auto tag) -> const unsigned char* {
-    const std::int32_t fences =
-        index == nullptr || kIsFloating<decltype(tag)> ? 0 : fence_count(count);
-    auto values = new_array<decltype(tag)>(static_cast<std::uint64_t>(count) + fences);
+    using T = decltype(tag);
+    const std::int32_t fences = index == nullptr || kIsFloating<T> ? 0 : fence_count(count);
+    auto values = new_array<T>(static_cast<std::uint64_t>(count) + fences);
     if (!values) return nullptr;
     gather(values_of(table, column), index, count, values.get());
     for (std::int32_t i = 0; i < fences; ++i) values[count + i] = values[(i + 1) * kFenceStep - 1];
-    return keys.values = reinterpret_cast<unsigned char*>(values.release());
+    column.keys.values = reinterpret_cast<unsigned char*>(values.release());
+    return column.keys.values;
   });
 }
 
