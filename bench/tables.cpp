@@ -128,6 +128,7 @@ template <Order order, bool interactive>
 void append_ours(benchmark::State& state) {
   const std::vector<Row> all = rows_to_append(state.range(0), order);
   const auto start = static_cast<std::ptrdiff_t>(already_there(state.range(0), order));
+  warm_memory();
   for (auto _ : state) {
     OpenFile file;
     if (start > 0) {
@@ -147,6 +148,7 @@ template <Order order>
 void append_sqlite(benchmark::State& state) {
   const std::vector<Row> all = rows_to_append(state.range(0), order);
   const auto start = static_cast<std::ptrdiff_t>(already_there(state.range(0), order));
+  warm_memory();
   for (auto _ : state) {
     Database db;
     fill_sqlite(db, {all.begin(), all.begin() + start});

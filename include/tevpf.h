@@ -660,10 +660,11 @@ TEVPF_API TEVPF_STATUS TEV8R1_PF_define_table_search(const char* table_name,
                                                      const char* column_name) TEVPF_NOEXCEPT;
 
 /* Searches from the next position on for a row whose column holds the key, copies it to row_out
- * (row_wid bytes) and makes it current. O(log n) in the search column, else O(n). After 4,096
- * searches (n / 256 beyond a million rows) without a change of rows in between, a search column of
- * numbers takes O(n) once to copy its values, which the next searches go through faster; the copy
- * goes with the next change.
+ * (row_wid bytes) and makes it current. O(log n) in the search column, else O(n).
+ * A column of numbers that is searched often without a change of rows in between gets a copy of its
+ * values, which the next searches go through faster: the search column after 4,096 searches (n / 256
+ * beyond a million rows), a column without index when searches have looked at a million rows (n,
+ * beyond). The copy takes O(n) once and a value's size a row, and goes with the next change.
  *   mode  1: in the search column, take the next greater value when there is no equal one
  *   key   binary value of the column's type; a text may end in "*" and then finds what it starts
  *   PF_NOTFOUND  no such row; the cursor stays
