@@ -36,8 +36,7 @@ TEVPF_STATUS write_column_definition(TextOut& out, const TEVPF_COLUMN& column) n
   } else {
     write_no_bounds(out, 11);
   }
-  const bool unique = def.idx_flag != 0 && def.unq_flag != 0;
-  out.print(def.idx_flag != 0 ? "  T " : "  F ", unique ? "  T  " : "  F  ");
+  out.print(is_indexed(column) ? "  T " : "  F ", is_unique(column) ? "  T  " : "  F  ");
   if (def.description != nullptr) {
     write_wrapped(out, FirstLine::kGoesOn, kDescriptionWidth, def.description, kDescriptionIndent);
   } else {

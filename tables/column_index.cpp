@@ -128,16 +128,14 @@ TEVPF_STATUS search_keys_from(const ValuesInLine<T>& values, std::int32_t first,
   return search_entries(values.from(first), count - first, key, pos);
 }
 
-// Integers: along the fences, then within the one line of values that they lead to. Whoever searches
-// wants the row, so the index entries that belong to it are asked for at once.
+// Integers: along the fences, then among the few values that they lead to. Whoever searches wants the
+// row, so the index entries that belong to these are asked for at once.
 template <class T>
 TEVPF_STATUS search_keys_from(const ValuesInLine<T>& values, std::int32_t first, std::int32_t count,
                               const std::int32_t* entries, const NumberKey<T>& key,
                               std::int32_t& pos) noexcept requires(!kIsFloating<T>) {
   std::int32_t fence = 0, place = 0;
-  if (fence_count(count) > 0) {
-    (void)search_entries(values.from(count), fence_count(count), key, fence);
-  }
+  (void)search_entries(values.from(count), fence_count(count), key, fence);
   const std::int32_t start = fence * kFenceStep;
   if (start < count) {
     __builtin_prefetch(entries + start);
@@ -190,19 +188,6 @@ bool reserve_entries(TEVPF_COLUMN& column, std::int64_t needed) noexcept {
 // ---- Passes over entries, written so that the compiler makes vectors of them --------------------
 
 constexpr std::int32_t kBlock = 64;
-
-// The position of a row number from `first` on; count when it is not there.
-std::int32_t find_entry(const std::int32_t* entries, std::int32_t first, std::int32_t count,
-                        std::int32_t row) noexcept {
-  std::int32_t at = first;
-  for (; count - at >= kBlock; at += kBlock) {
-    std::uint32_t seen = 0;
-    for (std::int32_t i = 0; i < kBlock; ++i) seen |= entries[at + i] == row ? 1u : 0u;
-    if (seen != 0) break;
-  }
-  while (at < count && entries[at] != row) ++at;
-  return at;
-}
 
 // Lowers by one every entry above `row` up to the entry that is `row`, and returns its position;
 // count when there is none.
@@ -347,7 +332,6 @@ void renumber_for_insertion(TEVPF_TABLE& table, std::int32_t row_number) noexcep
 
 void insert_entry(TEVPF_COLUMN& column, std::int32_t count, std::int32_t position,
                   std::int32_t row_number) noexcept {
-  drop_search_keys(column);
   std::int32_t* const place = column.idx_ptr + position;
   move_entries(place + 1, place, count - position);
   *place = row_number;
@@ -356,7 +340,6 @@ void insert_entry(TEVPF_COLUMN& column, std::int32_t count, std::int32_t positio
 void remove_row_from_indexes(TEVPF_TABLE& table, std::int32_t row_number,
                              std::int32_t* positions) noexcept {
   for (std::int32_t i = 0; i < table.num_cols; ++i) {
-    drop_search_keys(table.col_array[i]);
     if (!is_indexed(table.col_array[i])) continue;
     const std::int32_t position =
         remove_row(table.col_array[i].idx_ptr, table.num_rows, row_number);
@@ -370,9 +353,10 @@ void move_entry(const TEVPF_TABLE& table, TEVPF_COLUMN& column, std::int32_t row
   const unsigned char* const stored = values_of(table, column).of(row_number);
   std::int32_t first = 0;
   if (search_index(table, column, 0, count, stored, first) != PF_NORMAL) first = 0;
-  std::int32_t position = find_entry(column.idx_ptr, first, count, row_number);
+  const NumberKey<std::int32_t> entry(&row_number, 0);
+  std::int32_t position = find_in_line(column.idx_ptr, count, first, entry);
   // Values that drifted within the tolerance can stand where their search does not lead.
-  if (position == count) position = find_entry(column.idx_ptr, 0, first, row_number);
+  if (position == count) position = find_in_line(column.idx_ptr, first, 0, entry);
 
   std::int32_t* const place = column.idx_ptr + position;
   move_entries(place, place + 1, count - 1 - position);

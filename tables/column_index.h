@@ -70,7 +70,7 @@ inline std::int32_t row_at_position(const TEVPF_TABLE& table, std::int32_t posit
   return search != nullptr && is_indexed(*search) ? search->idx_ptr[position] : position;
 }
 
-// ---- Entries, as rows come and go; search keys go with every change -----------------------------
+// ---- Entries, as rows come and go; the table's search keys are dropped ahead of it --------------
 
 // Searches `count` entries from position `first` on for a key; gives the status and the position
 // (from `first`) that TEV8R1_binary_search gives.

@@ -51,7 +51,7 @@ std::int8_t description_flag(const TEVPF_COL_DEF& definition) noexcept;
 [[nodiscard]] TEVPF_STATUS copy_definition(const TEVPF_COL_DEF& source,
                                            TEVPF_COL_DEF& copy) noexcept;
 
-// Releases what the record owns: description and index.
+// Releases what the record owns: description, index and search keys.
 void release_column(TEVPF_COLUMN& column) noexcept;
 
 // The place of a column of this table; -1 for null.

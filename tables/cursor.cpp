@@ -2,6 +2,7 @@
 
 #include "core/directory.h"
 #include "core/status.h"
+#include "tables/search_keys.h"
 
 namespace tevpf {
 namespace {
@@ -30,6 +31,7 @@ using namespace tevpf;
 
 TEVPF_STATUS TEV8R1_get_next_row_ptr(TEVPF_TABLE* table, void** row_ptr_out,
                                      int32_t* row_number_out) noexcept {
+  drop_search_keys(*table);  // the row can be written through the pointer
   const bool exists = has_position(*table, table->next_row);
   *row_number_out = exists ? row_at_position(*table, table->next_row) : table->next_row;
   *row_ptr_out = exists ? row_at(*table, *row_number_out) : nullptr;
@@ -39,6 +41,7 @@ TEVPF_STATUS TEV8R1_get_next_row_ptr(TEVPF_TABLE* table, void** row_ptr_out,
 TEVPF_STATUS TEV8R1_get_cur_row_ptr(TEVPF_TABLE* table, void** row_ptr_out,
                                     int32_t* row_number_out) noexcept {
   if (!has_position(*table, table->cur_row)) return fail_empty(PF_NOCURROW);
+  drop_search_keys(*table);
   *row_number_out = row_at_position(*table, table->cur_row);
   *row_ptr_out = row_at(*table, *row_number_out);
   return PF_NORMAL;

@@ -11,7 +11,8 @@
 extern "C" {
 
 // The row at position next_row, and its row number. Without a next row: null, and the position.
-// Always PF_NORMAL.
+// Always PF_NORMAL. Values that no index covers may be written through the pointer, of both
+// operations, until the table is searched again.
 TEVPF_API TEVPF_STATUS TEV8R1_get_next_row_ptr(TEVPF_TABLE* table, void** row_ptr_out,
                                                std::int32_t* row_number_out) noexcept;
 

@@ -76,10 +76,10 @@ void open_slot(TEVPF_TABLE& table, const void* row, std::int32_t row_number) noe
 // Gives a row its entries in all indexes, at the points that the value checks have found.
 void insert_entries(TEVPF_TABLE& table, const unsigned char* row, std::int32_t row_number,
                     const InsertionPoints& points) noexcept {
+  drop_search_keys(table);
   std::int32_t known = 0;
   for (std::int32_t i = 0; i < table.num_cols; ++i) {
     TEVPF_COLUMN& column = table.col_array[i];
-    drop_search_keys(column);
     if (!is_indexed(column)) continue;
     std::int32_t position = 0;
     if (is_unique(column) && known < points.count) {
@@ -113,6 +113,7 @@ TEVPF_STATUS insert_row(TEVPF_TABLE& table, const void* row, std::int32_t row_nu
 
 // Takes a row out; positions as remove_row_from_indexes has them.
 void erase_row(TEVPF_TABLE& table, std::int32_t row_number, std::int32_t* positions) noexcept {
+  drop_search_keys(table);
   remove_row_from_indexes(table, row_number, positions);
   close_row_gap(table, row_number);
   --table.num_rows;
@@ -153,13 +154,13 @@ bool values_differ(const TEVPF_COLUMN& column, const unsigned char* stored_row,
 }
 
 void replace_row(TEVPF_TABLE& table, std::int32_t row_number, const unsigned char* row) noexcept {
+  drop_search_keys(table);
   const unsigned char* const stored = row_at(table, row_number);
   for (std::int32_t i = 0; i < table.num_cols; ++i) {
     TEVPF_COLUMN& column = table.col_array[i];
     if (is_indexed(column) && values_differ(column, stored, row)) {
       move_entry(table, column, row_number, row + column.offset);
     }
-    drop_search_keys(column);  // equal values need not be the same ones
   }
   store_row(table, row, row_number);
 }

@@ -41,25 +41,13 @@ std::int32_t walk(const Values& values, std::int32_t count, const std::int32_t* 
   return at;
 }
 
-// The same over values side by side, many at a time.
-template <class T>
-std::int32_t walk_in_line(const unsigned char* values, std::int32_t count, std::int32_t first,
-                          const NumberKey<T>& key) noexcept {
-  constexpr std::int32_t kBlock = NumberKey<T>::kBlock;
-  const auto place = [&](std::int32_t at) { return values + at * std::ptrdiff_t{sizeof(T)}; };
-  std::int32_t at = first;
-  while (count - at >= kBlock && !key.may_equal_one_of(place(at))) at += kBlock;
-  while (at < count && !key.equals(place(at))) ++at;
-  return at;
-}
-
 std::int32_t walk_along_keys(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
                              const unsigned char* keys, const std::int32_t* order,
                              std::int32_t first, const void* key) noexcept {
   return with_number(column.def.type, [&](auto tag) {
     using T = decltype(tag);
     const NumberKey<T> prepared(key, column.tolerance);
-    if (order == nullptr) return walk_in_line(keys, table.num_rows, first, prepared);
+    if (order == nullptr) return find_in_line(keys, table.num_rows, first, prepared);
     return walk(Values{keys, sizeof(T)}, table.num_rows, order, first, prepared);
   });
 }

@@ -19,6 +19,10 @@ constexpr std::int32_t kRowsWorthKeys = 4;
 constexpr std::int64_t kEffortBeforeKeys = std::int64_t{1} << 20;
 constexpr std::int32_t kRowsWorthKeys = 1024;
 #endif
+static_assert(kRowsWorthKeys >= kFenceStep, "who searches along fences need not ask for one");
+
+// An index can name the row that is about to be added, ahead of the row itself: a value for it too.
+constexpr std::int32_t kRowToCome = 1;
 
 template <class T>
 void gather(const Values& values, const std::int32_t* order, std::int32_t count, T* out) noexcept {
@@ -38,13 +42,18 @@ const unsigned char* search_keys(const TEVPF_TABLE& table, TEVPF_COLUMN& column,
   const std::int64_t enough = std::max<std::int64_t>(kEffortBeforeKeys, count);
   if (count < kRowsWorthKeys || column.keys.effort < enough) return nullptr;
   column.keys.effort = 0;  // not again at once when there is no memory
+  const std::int32_t more = index == nullptr                    ? kRowToCome
+                            : is_floating_type(column.def.type) ? 0
+                                                                : fence_count(count);
   return with_number(column.def.type, [&](auto tag) -> const unsigned char* {
     using T = decltype(tag);
-    const std::int32_t fences = index == nullptr || kIsFloating<T> ? 0 : fence_count(count);
-    auto values = new_array<T>(static_cast<std::uint64_t>(count) + fences);
+    auto values = new_array<T>(static_cast<std::uint64_t>(count) + more);
     if (!values) return nullptr;
     gather(values_of(table, column), index, count, values.get());
-    for (std::int32_t i = 0; i < fences; ++i) values[count + i] = values[(i + 1) * kFenceStep - 1];
+    T* const behind = values.get() + count;
+    for (std::int32_t i = 0; i < more; ++i) {
+      behind[i] = index == nullptr ? T{} : values[(i + 1) * kFenceStep - 1];
+    }
     column.keys.values = reinterpret_cast<unsigned char*>(values.release());
     return column.keys.values;
   });

@@ -11,7 +11,7 @@
 namespace tevpf {
 
 // Of integers in the order of an index, the last value of every so many stands once more behind all the
-// values: such fences fit the cache where the values do not, and lead to one line of it.
+// values: such fences fit the cache where the values do not, and lead to one or two lines of it.
 #ifdef TEVPF_TEST_HOOKS
 inline constexpr std::int32_t kFenceStep = 3;  // small tables too have fences
 #else
@@ -30,10 +30,13 @@ inline void count_search(TEVPF_COLUMN& column, std::int64_t rows) noexcept {
   if (column.keys.values == nullptr) column.keys.effort += rows;
 }
 
-// To be called when the column's values, its rows or its index change.
+// To be called when the column's values or its index change, and when the table's rows do.
 inline void drop_search_keys(TEVPF_COLUMN& column) noexcept {
   if (column.keys.values != nullptr) heap_free(column.keys.values);
   column.keys = {};
+}
+inline void drop_search_keys(TEVPF_TABLE& table) noexcept {
+  for (std::int32_t i = 0; i < table.num_cols; ++i) drop_search_keys(table.col_array[i]);
 }
 
 }  // namespace tevpf

@@ -64,6 +64,9 @@ struct TEVPF_TABLE {
 
 static_assert(sizeof(void*) != 4 || sizeof(TEVPF_COL_DEF) == 68);
 static_assert(offsetof(TEVPF_COLUMN, def) == 8);
+static_assert(offsetof(TEVPF_COLUMN, keys) % alignof(tevpf::SearchKeys) == 0 &&
+                  sizeof(TEVPF_COLUMN) % alignof(tevpf::SearchKeys) == 0,
+              "search keys lie where they may be referred to");
 }
 
 namespace tevpf {

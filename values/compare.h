@@ -89,6 +89,21 @@ class NumberKey {
   double tolerance_;  // of no use to integers
 };
 
+// The position of the first of `count` values side by side, from `first` on, that equals the key;
+// `count` when there is none. Many at a time.
+template <class T>
+std::int32_t find_in_line(const void* values, std::int32_t count, std::int32_t first,
+                          const NumberKey<T>& key) noexcept {
+  constexpr std::int32_t kBlock = NumberKey<T>::kBlock;
+  const auto place = [&](std::int32_t at) {
+    return static_cast<const unsigned char*>(values) + at * std::ptrdiff_t{sizeof(T)};
+  };
+  std::int32_t at = first;
+  while (count - at >= kBlock && !key.may_equal_one_of(place(at))) at += kBlock;
+  while (at < count && !key.equals(place(at))) ++at;
+  return at;
+}
+
 inline constexpr std::size_t kHeadSize = 8;
 
 // The first eight bytes of a text as a number that orders as they do; zeros behind its terminator.

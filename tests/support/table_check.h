@@ -10,6 +10,7 @@
 #include "core/element.h"
 #include "tables/layout.h"
 #include "tables/row_store.h"
+#include "tables/search_keys.h"
 
 namespace tevpf_test {
 
@@ -36,13 +37,18 @@ inline const char* broken_row(const TEVPF_TABLE& table, const unsigned char* row
   return only_zeros_to(table.row_wid) ? nullptr : "padding is not zero";
 }
 
-// In the order of the index, or without one of the rows.
+// In the order of the index, or without one of the rows; integers with an index have fences behind.
 inline bool are_search_keys_true(const TEVPF_TABLE& table, const TEVPF_COLUMN& column) {
-  const std::int32_t size = tevpf::column_size(column);
-  for (int i = 0; column.keys.values != nullptr && i < table.num_rows; ++i) {
+  if (column.keys.values == nullptr) return true;
+  const std::int32_t size = tevpf::column_size(column), count = table.num_rows;
+  const auto key = [&](int i) { return column.keys.values + std::int64_t{i} * size; };
+  for (int i = 0; i < count; ++i) {
     const int row = column.idx_ptr != nullptr ? column.idx_ptr[i] : i;
-    const unsigned char* const value = tevpf::row_at(table, row) + column.offset;
-    if (std::memcmp(column.keys.values + std::int64_t{i} * size, value, size) != 0) return false;
+    if (std::memcmp(key(i), tevpf::row_at(table, row) + column.offset, size) != 0) return false;
+  }
+  const bool fenced = column.idx_ptr != nullptr && !tevpf::is_floating_type(column.def.type);
+  for (int i = fenced ? count / tevpf::kFenceStep : 0; i > 0; --i) {
+    if (std::memcmp(key(count + i - 1), key(i * tevpf::kFenceStep - 1), size) != 0) return false;
   }
   return true;
 }

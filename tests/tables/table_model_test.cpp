@@ -526,7 +526,7 @@ class TableModelTest : public TableTest, public testing::WithParamInterface<unsi
     const bool indexed = !model_.search.empty() && chance(60);
     const int column = indexed ? model_.searched() : any_column();
     const char* const name = model_.columns[column].def.name;
-    for (int n = below(8); n >= 0; n -= 2) {
+    for (int n = 1 + below(4); n > 0; --n) {
       if (chance(40)) reset();
       const auto mode = std::int8_t(below(3));
       const Value key = random_key(column);
