@@ -197,7 +197,7 @@ TEST_F(Reports, HeadingsAndRowsOfSomeColumns) {
   char heading[60];
   std::memset(heading, '#', sizeof heading);
   std::int32_t lead = -1;
-  ASSERT_OK(TEV8R1_create_table_header("t", 2, 5, 1, 25, &lead, heading));
+  ASSERT_OK(TEV8R1_create_table_header("t", 2, INT32_MAX, 1, 25, &lead, heading));
   EXPECT_EQ(lead, 3);
   EXPECT_STREQ(heading, "   x     y  s    t");
   EXPECT_EQ(std::string(heading + 19, 7), "      #");

@@ -92,6 +92,7 @@ TEST_F(TableRules, FormatsAreRemadeWhereTheirWidthChangesInInteractiveMode) {
   ASSERT_OK(TEV8R1_set_interactive_table("t"));
   ASSERT_OK(redefine("n", col("long number", kInt)));
   EXPECT_STREQ(column(0).format, "%6d");
+  EXPECT_STREQ(column(1).format, "%-4s");
   ASSERT_OK(redefine("long number", col("long number", kInt, 8)));
   EXPECT_STREQ(column(0).format, "%11d");
   ASSERT_OK(redefine("r", col("r", kReal, INT32_MAX, {-10, 10, INT32_MAX})));
