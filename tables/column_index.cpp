@@ -121,19 +121,12 @@ TEVPF_STATUS search_entries(const Values& values, std::int32_t count, const Key&
 // What a search costs, as so many rows looked at one after the other.
 constexpr std::int64_t kRowsPerSearch = 256;
 
+// Integers from position `first` on: along the fences of all, then among the few values that they lead
+// to. Whoever searches wants the row, so the index entries that belong to these are asked for at once.
 template <class T>
-TEVPF_STATUS search_keys_from(const ValuesInLine<T>& values, std::int32_t first, std::int32_t count,
-                              const std::int32_t*, const NumberKey<T>& key,
-                              std::int32_t& pos) noexcept {
-  return search_entries(values.from(first), count - first, key, pos);
-}
-
-// Integers: along the fences, then among the few values that they lead to. Whoever searches wants the
-// row, so the index entries that belong to these are asked for at once.
-template <class T>
-TEVPF_STATUS search_keys_from(const ValuesInLine<T>& values, std::int32_t first, std::int32_t count,
-                              const std::int32_t* entries, const NumberKey<T>& key,
-                              std::int32_t& pos) noexcept requires(!kIsFloating<T>) {
+TEVPF_STATUS search_along_fences(const ValuesInLine<T>& values, std::int32_t first,
+                                 std::int32_t count, const std::int32_t* entries,
+                                 const NumberKey<T>& key, std::int32_t& pos) noexcept {
   std::int32_t fence = 0, place = 0;
   (void)search_entries(values.from(count), fence_count(count), key, fence);
   const std::int32_t start = fence * kFenceStep;
@@ -316,8 +309,13 @@ TEVPF_STATUS find_in_index(const TEVPF_TABLE& table, TEVPF_COLUMN& column, std::
   if (keys == nullptr) return search_index(table, column, first, count, key, pos);
   return with_number(column.def.type, [&](auto tag) {
     using T = decltype(tag);
-    return search_keys_from(ValuesInLine<T>{keys}, first, first + count, column.idx_ptr,
-                            NumberKey<T>(key, column.tolerance), pos);
+    const ValuesInLine<T> values{keys};
+    const NumberKey<T> prepared(key, column.tolerance);
+    if constexpr (kIsFloating<T>) {
+      return search_entries(values.from(first), count, prepared, pos);
+    } else {
+      return search_along_fences(values, first, first + count, column.idx_ptr, prepared, pos);
+    }
   });
 }
 

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <cstring>
+#include <type_traits>
 
 #include "tables/layout.h"
 #include "values/value_type.h"
@@ -152,6 +153,19 @@ bool copy_rows(const TEVPF_TABLE& source, TEVPF_TABLE& copy) noexcept {
   if (bytes > 0) std::memcpy(rows.get(), source.row_data, static_cast<std::size_t>(bytes));
   adopt_rows(copy, std::move(rows), bytes);
   return true;
+}
+
+void copy_values(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
+                 unsigned char* out) noexcept {
+  const unsigned char* value = column_base(table, column);
+  const auto copy = [&](auto size) {  // a constant for numbers, so that each copy is a plain move
+    for (std::int32_t row = 0; row < table.num_rows; ++row, value += table.row_wid, out += size) {
+      std::memcpy(out, value, size);
+    }
+  };
+  if (column.def.type == PF_TYPE_STRING) return copy(static_cast<std::size_t>(column_size(column)));
+  with_number(column.def.type,
+              [&](auto tag) { copy(std::integral_constant<std::size_t, sizeof tag>{}); });
 }
 
 void widen_rows(TEVPF_TABLE& table, std::int64_t new_wid, std::int64_t offset, const void* value,

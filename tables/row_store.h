@@ -70,6 +70,9 @@ void adopt_rows(TEVPF_TABLE& table, Owned<unsigned char> rows, std::int64_t room
 // rows.
 [[nodiscard]] bool copy_rows(const TEVPF_TABLE& source, TEVPF_TABLE& copy) noexcept;
 
+// Copies one column's values of all rows, side by side in storage order.
+void copy_values(const TEVPF_TABLE& table, const TEVPF_COLUMN& column, unsigned char* out) noexcept;
+
 // ---- Changes of layout --------------------------------------------------------------------------
 
 // Widens all rows in place from row_wid to new_wid, which have room for it, and puts `value` (size

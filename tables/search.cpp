@@ -1,6 +1,5 @@
 // Rows found by value, and one column's values of all rows.
 #include <cstring>
-#include <type_traits>
 
 #include "core/directory.h"
 #include "core/fetch.h"
@@ -89,19 +88,6 @@ TEVPF_STATUS find_position(const TEVPF_TABLE& table, TEVPF_COLUMN& column, std::
   return found ? PF_NORMAL : fail(PF_NOTFOUND, ValueText(column.def.type, key).c_str());
 }
 
-void copy_column(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
-                 unsigned char* out) noexcept {
-  const unsigned char* value = column_base(table, column);
-  const auto copy = [&](auto size) {  // a constant for numbers, so that each copy is a plain move
-    for (std::int32_t row = 0; row < table.num_rows; ++row, value += table.row_wid, out += size) {
-      std::memcpy(out, value, size);
-    }
-  };
-  if (column.def.type == PF_TYPE_STRING) return copy(static_cast<std::size_t>(column_size(column)));
-  with_number(column.def.type,
-              [&](auto tag) { copy(std::integral_constant<std::size_t, sizeof tag>{}); });
-}
-
 }  // namespace
 
 TEVPF_STATUS TEV8R1_PF_define_table_search(const char* table_name,
@@ -154,6 +140,6 @@ TEVPF_STATUS TEV8R1_PF_get_col_values(const char* table_name, const char* column
   PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
   if (table->num_rows == 0) return PF_NOMORE;
   PF_TRY(TEV8R1_get_col_ptr(table, column_name, &column));
-  copy_column(*table, *column, static_cast<unsigned char*>(values_out));
+  copy_values(*table, *column, static_cast<unsigned char*>(values_out));
   return PF_NORMAL;
 }

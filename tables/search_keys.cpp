@@ -1,6 +1,7 @@
 #include "tables/search_keys.h"
 
 #include <algorithm>
+#include <cstring>
 
 #include "tables/row_store.h"
 #include "values/value_type.h"
@@ -24,13 +25,29 @@ static_assert(kRowsWorthKeys >= kFenceStep, "who searches along fences need not 
 // An index can name the row that is about to be added, ahead of the row itself: a value for it too.
 constexpr std::int32_t kRowToCome = 1;
 
+unsigned char* gather_by_row(const TEVPF_TABLE& table, const TEVPF_COLUMN& column) noexcept {
+  const auto slots = static_cast<std::uint64_t>(table.num_rows) + kRowToCome;
+  const auto size = static_cast<std::uint64_t>(value_type(column.def.type).size);
+  auto* const values = static_cast<unsigned char*>(heap_alloc(slots, size));
+  if (values == nullptr) return nullptr;
+  copy_values(table, column, values);
+  std::memset(values + static_cast<std::uint64_t>(table.num_rows) * size, 0, size);
+  return values;
+}
+
+// An index that a file brought in another order keeps the answers of its own probes: fences would lead
+// elsewhere, so integers get no keys then. Null for that, and when memory is short.
 template <class T>
-void gather(const Values& values, const std::int32_t* order, std::int32_t count, T* out) noexcept {
-  if (order == nullptr) {
-    for (std::int32_t i = 0; i < count; ++i) out[i] = load<T>(values.of(i));
-  } else {
-    for (std::int32_t i = 0; i < count; ++i) out[i] = load<T>(values.of(order[i]));
-  }
+unsigned char* gather_by_index(const Values& stored, const std::int32_t* index,
+                               std::int32_t count) noexcept {
+  const std::int32_t fences = kIsFloating<T> ? 0 : fence_count(count);
+  auto values = new_array<T>(static_cast<std::uint64_t>(count) + fences);
+  if (!values) return nullptr;
+  for (std::int32_t i = 0; i < count; ++i) values[i] = load<T>(stored.of(index[i]));
+  T* const behind = values.get() + count;
+  if (fences > 0 && !std::is_sorted(values.get(), behind)) return nullptr;
+  for (std::int32_t i = 0; i < fences; ++i) behind[i] = values[(i + 1) * kFenceStep - 1];
+  return reinterpret_cast<unsigned char*>(values.release());
 }
 
 }  // namespace
@@ -41,22 +58,15 @@ const unsigned char* search_keys(const TEVPF_TABLE& table, TEVPF_COLUMN& column,
   const std::int32_t count = table.num_rows;
   const std::int64_t enough = std::max<std::int64_t>(kEffortBeforeKeys, count);
   if (count < kRowsWorthKeys || column.keys.effort < enough) return nullptr;
-  column.keys.effort = 0;  // not again at once when there is no memory
-  const std::int32_t more = index == nullptr                    ? kRowToCome
-                            : is_floating_type(column.def.type) ? 0
-                                                                : fence_count(count);
-  return with_number(column.def.type, [&](auto tag) -> const unsigned char* {
-    using T = decltype(tag);
-    auto values = new_array<T>(static_cast<std::uint64_t>(count) + more);
-    if (!values) return nullptr;
-    gather(values_of(table, column), index, count, values.get());
-    T* const behind = values.get() + count;
-    for (std::int32_t i = 0; i < more; ++i) {
-      behind[i] = index == nullptr ? T{} : values[(i + 1) * kFenceStep - 1];
-    }
-    column.keys.values = reinterpret_cast<unsigned char*>(values.release());
-    return column.keys.values;
-  });
+  column.keys.effort = 0;  // not again at once when there are none to be had
+  if (index == nullptr) {
+    column.keys.values = gather_by_row(table, column);
+  } else {
+    column.keys.values = with_number(column.def.type, [&](auto tag) {
+      return gather_by_index<decltype(tag)>(values_of(table, column), index, count);
+    });
+  }
+  return column.keys.values;
 }
 
 }  // namespace tevpf

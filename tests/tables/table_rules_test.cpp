@@ -258,6 +258,30 @@ TEST_F(TableRules, WithoutRowsAndColumns) {
   expect_answer(TEV8R1_PF_get_value("t", "x", &value, &number), PF_NOCOLUMN, {"x", ""});
 }
 
+TEST_F(TableRules, SearchKeysChangeNoAnswer) {
+  define({indexed(col("a", kInt)), col("b", kInt)});
+  for (const char* n : {"0", "1", "2", "3", "4", "5", "6", "7", "8"})
+    EXPECT_EQ(add({n, n}), PF_NORMAL);
+  // What is written through the pointer to a row is found, also when the column was searched before.
+  std::int32_t row[2], number = 0, key = 99;
+  void* pointer = nullptr;
+  for (int i = 0; i < 3; ++i)
+    EXPECT_EQ(TEV8R1_PF_get_row_by_value("t", 0, "b", &key, row), PF_NOTFOUND);
+  EXPECT_NE(column(1).keys.values, nullptr);
+  EXPECT_EQ(TEV8R1_get_next_row_ptr(&table(), &pointer, &number), PF_NORMAL);
+  std::memcpy(static_cast<char*>(pointer) + column(1).offset, &key, sizeof key);
+  EXPECT_EQ(TEV8R1_PF_get_row_by_value("t", 0, "b", &key, row), PF_NORMAL);
+  // An index may come in any order; which entries a search of it meets is settled by its probes.
+  std::int32_t* const entries = column(0).idx_ptr;
+  std::swap(entries[1], entries[6]);
+  for (key = -1; key < 10; ++key) {
+    std::int32_t found = -1, expected = -1;
+    EXPECT_EQ(find_in_index(table(), column(0), 0, 9, &key, found),
+              search_index(table(), column(0), 0, 9, &key, expected));
+    EXPECT_EQ(found, expected) << key;
+  }
+}
+
 TEST_F(TableRules, SlotsAreCountedUpToTheLargestCount) {
   define({indexed(col("a", kInt))});
   for (const char* n : {"0", "1", "2"}) EXPECT_EQ(add({n}), PF_NORMAL);
