@@ -1,4 +1,0 @@
-// Runs the benchmarks.
-#include <benchmark/benchmark.h>
-
-BENCHMARK_MAIN();
