@@ -26,12 +26,13 @@ static_assert(kRowsWorthKeys >= kFenceStep, "who searches along fences need not 
 constexpr std::int32_t kRowToCome = 1;
 
 unsigned char* gather_by_row(const TEVPF_TABLE& table, const TEVPF_COLUMN& column) noexcept {
-  const auto slots = static_cast<std::uint64_t>(table.num_rows) + kRowToCome;
-  const auto size = static_cast<std::uint64_t>(value_type(column.def.type).size);
-  auto* const values = static_cast<unsigned char*>(heap_alloc(slots, size));
+  const auto rows = static_cast<std::size_t>(table.num_rows);
+  const auto size = static_cast<std::size_t>(value_type(column.def.type).size);
+  auto* const values =
+      static_cast<unsigned char*>(heap_alloc(std::uint64_t{rows} + kRowToCome, size));
   if (values == nullptr) return nullptr;
   copy_values(table, column, values);
-  std::memset(values + static_cast<std::uint64_t>(table.num_rows) * size, 0, size);
+  std::memset(values + rows * size, 0, size);
   return values;
 }
 
