@@ -33,6 +33,7 @@ struct Kind<TEVPF_LIST> {
   static constexpr auto kRoom = &TEVPF_FILE::list_room;
   static constexpr auto kLast = &TEVPF_FILE::last_list;
   static constexpr auto kNames = &TEVPF_FILE::list_names;
+  static constexpr auto kUnhashed = &TEVPF_FILE::lists_unhashed;
 
   static void start(TEVPF_LIST& list) noexcept { list.cur_param = -1; }
   static void release(TEVPF_LIST* list) noexcept { release_list(list); }
@@ -51,6 +52,7 @@ struct Kind<TEVPF_TABLE> {
   static constexpr auto kRoom = &TEVPF_FILE::table_room;
   static constexpr auto kLast = &TEVPF_FILE::last_table;
   static constexpr auto kNames = &TEVPF_FILE::table_names;
+  static constexpr auto kUnhashed = &TEVPF_FILE::tables_unhashed;
 
   static void start(TEVPF_TABLE& table) noexcept { table.cur_row = -1; }
   static void release(TEVPF_TABLE* table) noexcept { release_table(table); }
@@ -65,7 +67,7 @@ template <class Record>
 bool names_are_hashed(TEVPF_FILE& file) noexcept {
   const std::int32_t count = file.*Kind<Record>::kCount;
   NameSet& names = file.*Kind<Record>::kNames;
-  if (count < kWorthHashing) return false;
+  if (count < kWorthHashing || file.*Kind<Record>::kUnhashed != 0) return false;
   if (names.count == count) return true;
   drop_names(names);
   for (std::int32_t i = 0; i < count && names.count == i; ++i) {
@@ -171,6 +173,15 @@ TEVPF_STATUS insert_element(Record** element_out) noexcept {
   if (!element || !make_slot<Record>(*library.current_file)) return fail_empty(PF_NOMEM);
   *element_out = element.release();
   append(*library.current_file, *element_out);
+  return PF_NORMAL;
+}
+
+// The same for a caller outside, who gives the record its name afterwards.
+template <class Record>
+TEVPF_STATUS insert_unnamed(Record** element_out) noexcept {
+  PF_TRY(insert_element(element_out));
+  library.current_file->*Kind<Record>::kUnhashed = 1;
+  drop_names(library.current_file->*Kind<Record>::kNames);
   return PF_NORMAL;
 }
 
@@ -318,10 +329,10 @@ TEVPF_STATUS TEV8R1_create_table(TEVPF_ELEM_HEADER header, TEVPF_TABLE** table_o
   return create_element(header, table_out);
 }
 
-TEVPF_STATUS TEV8R1_insert_list(TEVPF_LIST** list_out) noexcept { return insert_element(list_out); }
+TEVPF_STATUS TEV8R1_insert_list(TEVPF_LIST** list_out) noexcept { return insert_unnamed(list_out); }
 
 TEVPF_STATUS TEV8R1_insert_table(TEVPF_TABLE** table_out) noexcept {
-  return insert_element(table_out);
+  return insert_unnamed(table_out);
 }
 
 TEVPF_LIST* tevpf::last_list(const char* name) noexcept { return last_element<TEVPF_LIST>(name); }

@@ -28,9 +28,12 @@ struct TEVPF_FILE {
   std::int32_t list_room;  // slots that the two arrays really have
   std::int32_t table_room;
 
-  // Beside the directory, so that names are found and checked in O(1).
+  // Beside the directory, so that names are found and checked in O(1). Not used for elements of a kind
+  // once a caller outside has appended a record of it, whose name the library does not learn.
   tevpf::NameSet list_names;
   tevpf::NameSet table_names;
+  std::uint8_t lists_unhashed;
+  std::uint8_t tables_unhashed;
 };
 
 TEVPF_API TEVPF_STATUS TEV8R1_add_file(std::FILE* stream, const char* name,

@@ -20,7 +20,7 @@ namespace tevpf {
 
 namespace {
 
-// Rows read and cleaned while they are in the cache.
+// Rows are read in parts that the cache holds while their texts are looked at.
 constexpr std::int64_t kBatchBytes = std::int64_t{256} * 1024;
 
 // Takes one stored column off the body. Its description is left where it is in the body.
@@ -67,14 +67,6 @@ bool is_well_formed(ByteReader body, std::int32_t num_cols, std::int32_t row_wid
   return body.left() == 0 && (num_cols == 0 || layout.row_wid == row_wid);
 }
 
-void drop_columns(TEVPF_TABLE& table) noexcept {
-  for (std::int32_t i = 0; i < table.num_cols; ++i) release_column(table.col_array[i]);
-  heap_free(std::exchange(table.col_array, nullptr));
-  table.num_cols = 0;
-  table.header.btf = kTableHead;
-  set_layout(table, {});
-}
-
 TEVPF_STATUS build_column(TEVPF_TABLE& table, ByteReader& body, Layout& layout) noexcept {
   TEVPF_COLUMN& column = table.col_array[table.num_cols];
   if (parse_column(body, column) == Parsed::kUnknownType) {
@@ -94,7 +86,7 @@ TEVPF_STATUS build_column(TEVPF_TABLE& table, ByteReader& body, Layout& layout) 
   return PF_NORMAL;
 }
 
-// Builds the columns and the default row. What a failure leaves is a table of fewer columns.
+// Builds the columns. What a failure leaves is a table of fewer columns.
 TEVPF_STATUS build_columns(TEVPF_TABLE& table, ByteReader body, std::int32_t num_cols) noexcept {
   Owned<TEVPF_COLUMN> columns = new_array<TEVPF_COLUMN>(static_cast<std::uint64_t>(num_cols));
   if (!columns) return fail_empty(PF_NOMEM);
@@ -105,12 +97,7 @@ TEVPF_STATUS build_columns(TEVPF_TABLE& table, ByteReader body, std::int32_t num
     status = build_column(table, body, layout);
   }
   set_layout(table, layout);
-  if (table.num_cols == 0) {
-    drop_columns(table);
-  } else if (!make_default_row(table)) {
-    drop_columns(table);
-    status = fail_empty(PF_NOMEM);
-  }
+  if (table.num_cols == 0) heap_free(std::exchange(table.col_array, nullptr));
   return status;
 }
 
@@ -156,7 +143,7 @@ TEVPF_STATUS read_rows(TEVPF_TABLE& table, std::int32_t num_rows, Input& input) 
     unsigned char* place = row_at(table, table.num_rows);
     const auto wanted = static_cast<std::uint64_t>(rows * table.row_wid);
     if (input.read(place, wanted) != wanted) return fail(PF_BADFORMAT, "table data");
-    clean_rows(table, place, rows);
+    end_texts(table, place, rows);
     table.num_rows += static_cast<std::int32_t>(rows);
   }
   return PF_NORMAL;
@@ -202,8 +189,10 @@ TEVPF_STATUS build_table(TEVPF_ELEM_HEADER header, const void* body_bytes, Input
   std::memcpy(table->RESERVED, head.RESERVED, sizeof table->RESERVED);
   if (num_cols == 0) return PF_NORMAL;
   PF_TRY(build_columns(*table, body, num_cols));
-  if (head.num_rows <= 0) return PF_NORMAL;
-  return read_contents(*table, head.num_rows, input);
+  if (head.num_rows > 0) PF_TRY(read_contents(*table, head.num_rows, input));
+  // Last, because it alone may be larger than the file: no block of that size for a file that is
+  // refused.
+  return make_default_row(*table) ? TEVPF_STATUS{PF_NORMAL} : fail_empty(PF_NOMEM);
 }
 
 }  // namespace tevpf

@@ -1,9 +1,13 @@
 // Texts in the fixed fields of records: names, units, descriptions.
 #pragma once
 
+#include <bit>
 #include <cstddef>
+#include <cstdint>
 #include <cstring>
+#include <type_traits>
 
+#include "core/text_word.h"
 #include "include/tevpf.h"
 
 namespace tevpf {
@@ -17,10 +21,45 @@ void set_field(char (&field)[N], const char* text) noexcept {
   std::memset(field + length, 0, N - length);
 }
 
-// Puts a terminator into the last byte of a field that came from a file or a caller.
+// Gives a field that came from a file or a caller a terminator in its last byte when it has none.
+// Nothing else of it changes.
 template <std::size_t N>
 void terminate_field(char (&field)[N]) noexcept {
-  field[N - 1] = '\0';
+  if (field[N - 1] != '\0' && std::memchr(field, '\0', N) == nullptr) field[N - 1] = '\0';
+}
+
+// Bytes of the text in a field that has a terminator, the terminator included. Eight bytes a step.
+template <std::size_t N>
+std::size_t text_bytes(const char (&field)[N]) noexcept {
+  constexpr std::size_t kWord = sizeof(std::uint64_t), kLast = N - kWord;
+  for (std::size_t at = 0; at < kLast; at += kWord) {
+    const std::uint64_t zeros = zero_bytes(load_word(field + at));
+    if (zeros != 0) return at + static_cast<std::size_t>(std::countr_zero(zeros)) / 8 + 1;
+  }
+  const std::uint64_t zeros = zero_bytes(load_word(field + kLast));
+  return kLast + static_cast<std::size_t>(std::countr_zero(zeros)) / 8 + 1;
+}
+
+// Copies the text of such a field, of at most 24 bytes, with its terminator and nothing behind it.
+// strcpy, without the call. Two copies that may overlap take any size between one and two of them.
+template <std::size_t N>
+void copy_field_text(char* to, const char (&field)[N]) noexcept {
+  static_assert(N <= 24);
+  const std::size_t bytes = text_bytes(field);
+  const auto copy_ends = [&](auto size) {
+    std::memcpy(to, field, size);
+    std::memcpy(to + bytes - size, field + bytes - size, size);
+  };
+  if (bytes > 16) {
+    std::memcpy(to + 8, field + 8, 8);
+    copy_ends(std::integral_constant<std::size_t, 8>{});
+  } else if (bytes >= 8) {
+    copy_ends(std::integral_constant<std::size_t, 8>{});
+  } else if (bytes >= 4) {
+    copy_ends(std::integral_constant<std::size_t, 4>{});
+  } else {
+    for (std::size_t i = 0; i < bytes; ++i) to[i] = field[i];
+  }
 }
 
 // Whether a field holds exactly this text, which has fewer than 8 characters; false when it is

@@ -12,6 +12,7 @@
 #include "lists/name_index.h"
 #include "lists/param_check.h"
 #include "lists/param_record.h"
+#include "values/text_compare.h"
 
 namespace tevpf {
 namespace {
@@ -93,7 +94,10 @@ void redefine(const TEVPF_LIST& list, TEVPF_PARAM& param, TEVPF_PARAM_DEF defini
   char* const value = change.value.commit(old_value, list.texts);
   if (definition.type == PF_TYPE_STRING) definition.part.str.value = value;
   definition.description = change.description.commit(old.description, list.texts);
-  std::memcpy(definition.name, old.name, sizeof definition.name);  // the selection may be a pattern
+  // A pattern only selects: the parameter keeps its name.
+  if (make_pattern(definition.name).prefix) {
+    std::memcpy(definition.name, old.name, sizeof definition.name);
+  }
   old = definition;
   param.desc_loc = description_place(definition);
 }

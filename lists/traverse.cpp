@@ -4,6 +4,7 @@
 #include <limits>
 
 #include "core/fetch.h"
+#include "core/text_field.h"
 #include "lists/find.h"
 #include "lists/param_record.h"
 
@@ -34,7 +35,7 @@ inline TEVPF_STATUS step(TEVPF_LIST& list, char* name_out, void* value_out) noex
   if (list.cur_param >= list.num_params) return PF_NOMORE;
   const TEVPF_PARAM_DEF& definition = list.param_ptr[list.cur_param].def;
   fetch_along(&definition, sizeof definition);
-  std::memcpy(name_out, definition.name, sizeof definition.name);
+  copy_field_text(name_out, definition.name);
   copy_value(definition, value_out);
   return PF_NORMAL;
 }

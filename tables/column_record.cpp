@@ -62,6 +62,10 @@ TEVPF_STATUS copy_definition(const TEVPF_COL_DEF& source, TEVPF_COL_DEF& copy) n
   return copy.description == nullptr ? fail_empty(PF_NOMEM) : TEVPF_STATUS{PF_NORMAL};
 }
 
+TEVPF_STATUS row_too_wide(const TEVPF_COL_DEF& definition) noexcept {
+  return fail(PF_BADWIDTH, Text(definition.width), definition.name);
+}
+
 void release_column(TEVPF_COLUMN& column) noexcept {
   heap_free(std::exchange(column.def.description, nullptr));
   release_index(column);

@@ -6,7 +6,8 @@
 // Invariants: the columns' offsets, row_wid, mod and extra_bytes are what laying them out one
 // behind the other into an empty row gives; each index lists every row number once, in ascending
 // order of value, with room for num_rows + free_rows; header.btf = 24 + the stored sizes of all
-// columns; padding bytes of rows are zero.
+// columns. Rows keep the padding bytes that callers and files hand in; those that the library adds are
+// zero.
 #pragma once
 
 #include <cstddef>
