@@ -56,14 +56,33 @@ TEVPF_STATUS build_element(const TEVPF_ELEM_HEADER& header, Input& input,
                  : build_table(header, scratch.block.get(), input);
 }
 
-TEVPF_STATUS load_element(TEVPF_FILE& file, const TEVPF_ELEM_HEADER& header, Input& input,
+TEVPF_STATUS load_element(const TEVPF_ELEM_HEADER& header, Input& input,
                           Scratch& scratch) noexcept {
   if (header.elem_type != PF_ELEM_LIST && header.elem_type != PF_ELEM_TABLE) {
-    PF_TRY(TEV8R1_check_valid_file(&file));
     return fail(PF_BADTYPE, {"element", header.elem_name}, Text(header.elem_type));
   }
-  const TEVPF_STATUS status = build_element(header, input, scratch);
-  if (status == PF_BADFORMAT) PF_TRY(TEV8R1_check_valid_file(&file));
+  return build_element(header, input, scratch);
+}
+
+// Loads one element after the other until the stream ends between two of them.
+TEVPF_STATUS load_elements(Input& input) noexcept {
+  Scratch scratch{new_array<unsigned char>(kFirstScratch), kFirstScratch};
+  if (!scratch.block || !input.read_ahead()) return fail_empty(PF_NOMEM);
+  for (;;) {
+    TEVPF_ELEM_HEADER header = {};
+    const std::uint64_t got = input.read(&header, sizeof header);
+    terminate_texts(header);
+    if (got == 0) return PF_NORMAL;
+    if (got != sizeof header) return fail(PF_BADFORMAT, header.elem_name);
+    PF_TRY(load_element(header, input, scratch));
+  }
+}
+
+// Closes a file of which nothing, or not all that it holds, can be said.
+TEVPF_STATUS give_up(TEVPF_FILE& file, TEVPF_STATUS reason) noexcept {
+  const TEVPF_STATUS status = fail(reason, file.file_name);
+  file.new_file = 0;
+  TEV8R1_PF_close(0);
   return status;
 }
 
@@ -71,22 +90,15 @@ TEVPF_STATUS load_element(TEVPF_FILE& file, const TEVPF_ELEM_HEADER& header, Inp
 
 TEVPF_STATUS load_file(TEVPF_FILE& file) noexcept {
   Input input(file.fp);
-  Scratch scratch{new_array<unsigned char>(kFirstScratch), kFirstScratch};
-  if (!scratch.block || !input.read_ahead()) return fail_empty(PF_NOMEM);
-  for (;;) {
-    TEVPF_ELEM_HEADER header = {};
-    const std::uint64_t got = input.read(&header, sizeof header);
-    terminate_texts(header);
-    if (got == 0 && !input.has_failed()) {
-      file.new_file = 0;
-      return PF_NORMAL;
-    }
-    if (got != sizeof header) {
-      PF_TRY(TEV8R1_check_valid_file(&file));
-      return fail(PF_BADFORMAT, header.elem_name);
-    }
-    PF_TRY(load_element(file, header, input, scratch));
+  const TEVPF_STATUS status = load_elements(input);
+  // The disk failed: what was read may be a shorter file than there is, and must not be saved as such.
+  if (input.has_failed()) return give_up(file, PF_OPENFAIL);
+  if (status == PF_NORMAL) {
+    file.new_file = 0;
+  } else if (status == PF_BADFORMAT || status == PF_BADTYPE) {
+    PF_TRY(TEV8R1_check_valid_file(&file));
   }
+  return status;
 }
 
 }  // namespace tevpf
@@ -95,10 +107,7 @@ using namespace tevpf;
 
 TEVPF_STATUS TEV8R1_check_valid_file(TEVPF_FILE* file) noexcept {
   if (file->num_lists > 0 || file->num_tables > 0) return PF_NORMAL;
-  const TEVPF_STATUS status = fail(PF_BADFILE, file->file_name);
-  file->new_file = 0;
-  TEV8R1_PF_close(0);
-  return status;
+  return give_up(*file, PF_BADFILE);
 }
 
 TEVPF_STATUS TEV8R1_format_list(TEVPF_ELEM_HEADER header, const void* body,

@@ -66,7 +66,7 @@ bool take_over(int image, const struct stat& facts) noexcept {
 }
 
 // Some file systems cannot flush on demand; there is nothing to wait for then.
-bool reached_disk(int fd) noexcept {
+bool is_flushed(int fd) noexcept {
   return fsync(fd) == 0 || errno == EINVAL || errno == ENOTSUP || errno == EROFS;
 }
 
@@ -77,11 +77,12 @@ bool may_be_written_plainly(int error_number) noexcept {
          error_number == EBUSY || error_number == EXDEV || error_number == ENAMETOOLONG;
 }
 
-// So that the new name survives a power cut; the file is whole either way.
-void flush_folder(char* path) noexcept {
+// So that the new name survives a power cut; the file is whole either way. A folder that may not be
+// read cannot be flushed.
+bool flush_folder(char* path) noexcept {
   *std::strrchr(path, '/') = '\0';
   const Descriptor folder(open(path[0] == '\0' ? "/" : path, O_RDONLY | O_DIRECTORY | O_CLOEXEC));
-  if (folder.get() >= 0) fsync(folder.get());
+  return folder.get() < 0 ? errno == EACCES : is_flushed(folder.get());
 }
 
 }  // namespace
@@ -115,7 +116,7 @@ void Replacement::discard() noexcept {
 }
 
 Replacement::Outcome Replacement::put_in_place() noexcept {
-  if (!reached_disk(fileno(stream_))) return Outcome::kFailed;
+  if (!is_flushed(fileno(stream_))) return Outcome::kFailed;
   if (std::rename(image_, target_) != 0) {
     const Outcome outcome =
         may_be_written_plainly(errno) ? Outcome::kNotPossible : Outcome::kFailed;
@@ -123,8 +124,7 @@ Replacement::Outcome Replacement::put_in_place() noexcept {
     return outcome;
   }
   image_[0] = '\0';
-  flush_folder(target_);
-  return Outcome::kDone;
+  return flush_folder(target_) ? Outcome::kDone : Outcome::kNotFlushed;
 }
 
 std::FILE* Replacement::release_stream() noexcept {

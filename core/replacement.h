@@ -26,6 +26,7 @@ class Replacement {
 
   enum class Outcome {
     kDone,
+    kNotFlushed,   // in place, but the system failed to flush the folder: a power cut may undo it
     kNotPossible,  // the system does not allow it: write plainly
     kFailed,       // the image did not reach the disk; the file is as it was
   };

@@ -112,7 +112,6 @@ TEVPF_STATUS insert_row(TEVPF_TABLE& table, const void* row, std::int32_t row_nu
 
 // Takes a row out; positions as remove_row_from_indexes has them.
 void erase_row(TEVPF_TABLE& table, std::int32_t row_number, std::int32_t* positions) noexcept {
-  drop_search_keys(table);
   remove_row_from_indexes(table, row_number, positions);
   close_row_gap(table, row_number);
   --table.num_rows;
@@ -159,7 +158,6 @@ bool values_differ(const TEVPF_COLUMN& column, const unsigned char* stored_row,
 }
 
 void replace_row(TEVPF_TABLE& table, std::int32_t row_number, const unsigned char* row) noexcept {
-  drop_search_keys(table);
   const unsigned char* const stored = row_at(table, row_number);
   for (std::int32_t i = 0; i < table.num_cols; ++i) {
     TEVPF_COLUMN& column = table.col_array[i];

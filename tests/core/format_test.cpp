@@ -220,7 +220,7 @@ TEST_F(FormatTest, ADefaultRowThatCannotBeHadIsTheLastFailure) {
   ASSERT_EQ(TEV8R1_PF_open(path_.c_str()), PF_NEWFILE);
   ASSERT_EQ(TEV8R1_PF_create_elem("t", "", PF_ELEM_TABLE), PF_NORMAL);
   for (const TEVPF_COL_DEF& def :
-       {tevpf::col("huge", tevpf::kText, 1 << 30), tevpf::col("n", tevpf::kInt)})
+       {tevpf::col("huge", tevpf::kText, 1 << 26), tevpf::col("n", tevpf::kInt)})
     ASSERT_EQ(TEV8R1_PF_def_column("t", def), PF_NORMAL);
   const std::string bytes = saved_bytes();
   std::string unknown = bytes, cut = bytes;
@@ -231,6 +231,30 @@ TEST_F(FormatTest, ADefaultRowThatCannotBeHadIsTheLastFailure) {
   expect_answer(open_bytes(cut), PF_BADFORMAT, {"table data", ""});
   expect_answer(open_bytes(bytes), PF_NOMEM, kEmpty);
   tevpf::heap_fail_above(UINT64_MAX);
+}
+
+// A disk that fails to read on, at whatever byte, is no shorter file: it is not opened.
+TEST_F(FormatTest, AReadErrorIsNoEndOfTheFile) {
+  struct Disk {
+    const std::string& bytes;
+    std::size_t broken_from, place;
+  };
+  cookie_io_functions_t functions{};
+  functions.read = [](void* cookie, char* to, std::size_t count) -> ssize_t {
+    Disk& disk = *static_cast<Disk*>(cookie);
+    count = std::min({count, std::size_t{7}, disk.broken_from - disk.place});
+    std::copy_n(disk.bytes.data() + disk.place, count, to);
+    disk.place += count;
+    if (count != 0) return static_cast<ssize_t>(count);
+    errno = EIO;
+    return -1;
+  };
+  for (std::size_t from = 0; from <= example_.size(); ++from) {
+    Disk disk{example_, from, 0};
+    ASSERT_EQ(TEV8R1_add_file(fopencookie(&disk, "rb", functions), "name", 0), PF_NORMAL);
+    expect_answer(tevpf::load_file(*tevpf::library.current_file), PF_OPENFAIL, {"name", ""});
+    ASSERT_EQ(current(), nullptr) << from;
+  }
 }
 
 // What was loaded before memory ran out stays, and can be worked with.
