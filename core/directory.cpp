@@ -4,11 +4,11 @@
 
 #include <cstring>
 
+#include "core/base/heap.h"
+#include "core/base/status.h"
+#include "core/base/text_field.h"
 #include "core/file.h"
-#include "core/heap.h"
 #include "core/library.h"
-#include "core/status.h"
-#include "core/text_field.h"
 #include "lists/list.h"
 #include "tables/table.h"
 

@@ -5,8 +5,8 @@
 // built so far, which is a state like any other: sizes, counts and indexes agree.
 #pragma once
 
-#include "core/body.h"
 #include "core/element.h"
+#include "core/io/body.h"
 
 namespace tevpf {
 

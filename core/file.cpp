@@ -4,9 +4,9 @@
 #include <cerrno>
 #include <cstring>
 
+#include "core/base/status.h"
+#include "core/base/text_field.h"
 #include "core/library.h"
-#include "core/status.h"
-#include "core/text_field.h"
 #include "lists/list.h"
 #include "tables/table.h"
 

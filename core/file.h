@@ -4,8 +4,8 @@
 #include <cstdint>
 #include <cstdio>
 
+#include "core/base/heap.h"
 #include "core/element.h"
-#include "core/heap.h"
 #include "core/name_set.h"
 
 extern "C" {

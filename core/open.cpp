@@ -3,11 +3,11 @@
 #include <cstdio>
 #include <utility>
 
-#include "core/disk_file.h"
+#include "core/base/status.h"
 #include "core/file.h"
 #include "core/file_name.h"
+#include "core/io/disk_file.h"
 #include "core/reader.h"
-#include "core/status.h"
 
 namespace tevpf {
 

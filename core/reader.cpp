@@ -1,11 +1,11 @@
 // Loads a file, element after element, in one pass.
 #include "core/reader.h"
 
+#include "core/base/status.h"
+#include "core/base/text_field.h"
 #include "core/element_builder.h"
 #include "core/file.h"
-#include "core/input.h"
-#include "core/status.h"
-#include "core/text_field.h"
+#include "core/io/input.h"
 
 namespace tevpf {
 

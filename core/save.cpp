@@ -3,11 +3,11 @@
 #include <cstdio>
 #include <cstring>
 
-#include "core/disk_file.h"
+#include "core/base/status.h"
 #include "core/file.h"
+#include "core/io/disk_file.h"
+#include "core/io/replacement.h"
 #include "core/library.h"
-#include "core/replacement.h"
-#include "core/status.h"
 #include "core/writer.h"
 
 namespace tevpf {

@@ -2,9 +2,9 @@
 
 #include <cstring>
 
+#include "core/base/status.h"
 #include "core/file.h"
-#include "core/sink.h"
-#include "core/status.h"
+#include "core/io/sink.h"
 #include "core/stored_form.h"
 #include "tables/column_index.h"
 #include "tables/row_store.h"

@@ -1,6 +1,6 @@
 // The operations on a list's default definitions.
+#include "core/base/status.h"
 #include "core/directory.h"
-#include "core/status.h"
 #include "lists/list.h"
 #include "lists/param_check.h"
 #include "lists/param_record.h"

@@ -4,10 +4,10 @@
 #include <cstring>
 #include <limits>
 
+#include "core/base/heap.h"
+#include "core/base/status.h"
 #include "core/directory.h"
-#include "core/heap.h"
 #include "core/library.h"
-#include "core/status.h"
 #include "lists/list.h"
 #include "lists/name_index.h"
 #include "lists/param_check.h"

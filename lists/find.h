@@ -1,8 +1,8 @@
 // How operations on a list begin: they find it in the current file by its name, then its parameter.
 #pragma once
 
+#include "core/base/status.h"
 #include "core/directory.h"
-#include "core/status.h"
 #include "lists/list.h"
 #include "lists/name_index.h"
 

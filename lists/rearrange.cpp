@@ -3,9 +3,9 @@
 #include <algorithm>
 #include <cstring>
 
+#include "core/base/status.h"
+#include "core/base/text_field.h"
 #include "core/directory.h"
-#include "core/status.h"
-#include "core/text_field.h"
 #include "lists/list.h"
 #include "lists/name_index.h"
 #include "lists/param_record.h"

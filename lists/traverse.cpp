@@ -3,8 +3,8 @@
 #include <cstring>
 #include <limits>
 
-#include "core/fetch.h"
-#include "core/text_field.h"
+#include "core/base/fetch.h"
+#include "core/base/text_field.h"
 #include "lists/find.h"
 #include "lists/param_record.h"
 

@@ -3,9 +3,9 @@
 #include <algorithm>
 #include <cstring>
 
+#include "core/base/number_text.h"
+#include "core/base/status.h"
 #include "core/directory.h"
-#include "core/number_text.h"
-#include "core/status.h"
 #include "reports/display.h"
 #include "reports/escape.h"
 #include "reports/text_out.h"

@@ -1,7 +1,7 @@
 // The operations on a table's column templates.
+#include "core/base/heap.h"
+#include "core/base/status.h"
 #include "core/directory.h"
-#include "core/heap.h"
-#include "core/status.h"
 #include "tables/column_record.h"
 #include "tables/templates.h"
 #include "values/value_type.h"

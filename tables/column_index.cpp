@@ -5,7 +5,7 @@
 #include <limits>
 #include <utility>
 
-#include "core/status.h"
+#include "core/base/status.h"
 #include "tables/row_order.h"
 #include "tables/row_store.h"
 #include "tables/search_keys.h"

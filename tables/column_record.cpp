@@ -4,9 +4,9 @@
 #include <cstring>
 #include <utility>
 
-#include "core/heap.h"
-#include "core/status.h"
-#include "core/text_field.h"
+#include "core/base/heap.h"
+#include "core/base/status.h"
+#include "core/base/text_field.h"
 #include "tables/column_index.h"
 #include "tables/layout.h"
 #include "values/value_text.h"

@@ -6,14 +6,14 @@
 #include <cstring>
 #include <utility>
 
+#include "core/base/heap.h"
+#include "core/base/status.h"
 #include "core/directory.h"
-#include "core/heap.h"
 #include "core/library.h"
-#include "core/status.h"
-#include "reports/formats.h"
 #include "tables/column_index.h"
 #include "tables/column_record.h"
 #include "tables/default_row.h"
+#include "tables/formats.h"
 #include "tables/layout.h"
 #include "tables/row_store.h"
 #include "values/value_type.h"

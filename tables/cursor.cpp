@@ -1,7 +1,7 @@
 #include "tables/cursor.h"
 
+#include "core/base/status.h"
 #include "core/directory.h"
-#include "core/status.h"
 #include "tables/search_keys.h"
 
 namespace tevpf {

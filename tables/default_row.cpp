@@ -2,7 +2,7 @@
 
 #include <cstring>
 
-#include "core/status.h"
+#include "core/base/status.h"
 #include "tables/layout.h"
 #include "values/value_type.h"
 

@@ -2,7 +2,7 @@
 // text, until a caller sets other values. Bytes without a value are zero in rows that are made here.
 #pragma once
 
-#include "core/heap.h"
+#include "core/base/heap.h"
 #include "tables/table.h"
 
 extern "C" {

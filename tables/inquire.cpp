@@ -1,9 +1,9 @@
 // What callers need to know about columns to build rows: definitions, names, places. All that is
 // handed out is the caller's own.
+#include "core/base/heap.h"
+#include "core/base/status.h"
+#include "core/base/text_field.h"
 #include "core/directory.h"
-#include "core/heap.h"
-#include "core/status.h"
-#include "core/text_field.h"
 #include "tables/column_record.h"
 #include "tables/table.h"
 

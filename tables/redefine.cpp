@@ -2,16 +2,16 @@
 #include <cstring>
 #include <utility>
 
+#include "core/base/heap.h"
+#include "core/base/status.h"
+#include "core/base/text_field.h"
 #include "core/directory.h"
-#include "core/heap.h"
 #include "core/library.h"
-#include "core/status.h"
-#include "core/text_field.h"
-#include "reports/formats.h"
 #include "tables/column_index.h"
 #include "tables/column_record.h"
 #include "tables/columns.h"
 #include "tables/default_row.h"
+#include "tables/formats.h"
 #include "tables/layout.h"
 #include "tables/row_store.h"
 #include "values/compare.h"

@@ -1,7 +1,7 @@
 // Figures of a table, the check of a single value, and interactive mode.
+#include "core/base/status.h"
 #include "core/directory.h"
 #include "core/library.h"
-#include "core/status.h"
 #include "tables/column_record.h"
 #include "tables/validate.h"
 

@@ -4,10 +4,10 @@
 #include <cstring>
 #include <limits>
 
+#include "core/base/heap.h"
+#include "core/base/status.h"
 #include "core/directory.h"
-#include "core/heap.h"
 #include "core/library.h"
-#include "core/status.h"
 #include "tables/column_index.h"
 #include "tables/cursor.h"
 #include "tables/default_row.h"

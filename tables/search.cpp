@@ -1,9 +1,9 @@
 // Rows found by value, and one column's values of all rows.
 #include <cstring>
 
+#include "core/base/fetch.h"
+#include "core/base/status.h"
 #include "core/directory.h"
-#include "core/fetch.h"
-#include "core/status.h"
 #include "tables/column_index.h"
 #include "tables/column_record.h"
 #include "tables/cursor.h"

@@ -9,7 +9,7 @@
 #include <cstddef>
 #include <cstdint>
 
-#include "core/text_word.h"
+#include "core/base/text_word.h"
 #include "values/text_compare.h"
 #include "values/value_type.h"
 

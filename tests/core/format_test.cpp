@@ -4,7 +4,7 @@
 #include <optional>
 #include <random>
 
-#include "core/heap.h"
+#include "core/base/heap.h"
 #include "core/reader.h"
 #include "support/definitions.h"
 #include "support/drive.h"

@@ -2,9 +2,9 @@
 // and values that are no numbers, the probes of a search, stored patterns, and limits of counts.
 #include <limits>
 
-#include "reports/formats.h"
 #include "support/table_fixture.h"
 #include "tables/cursor.h"
+#include "tables/formats.h"
 #include "tables/layout.h"
 #include "tables/rows.h"
 

@@ -1,7 +1,7 @@
 // A number is m * 2^e with m below 2^53, and 10^q is 5^q * 2^q. For |q| up to 27, 5^q fits 64 bits,
 // so that m * 2^e * 10^q is a product or a quotient of 128 bits at most, and rounding it needs no
 // estimate of an error.
-#include "core/leading_digits.h"
+#include "core/base/leading_digits.h"
 
 #include <bit>
 

@@ -1,4 +1,4 @@
-#include "core/sink.h"
+#include "core/io/sink.h"
 
 #include <algorithm>
 

@@ -1,4 +1,4 @@
-#include "core/disk_file.h"
+#include "core/io/disk_file.h"
 
 #include <fcntl.h>
 #include <sys/stat.h>

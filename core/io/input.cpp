@@ -1,9 +1,9 @@
-#include "core/input.h"
+#include "core/io/input.h"
 
 #include <algorithm>
 #include <cstring>
 
-#include "core/stream_size.h"
+#include "core/io/stream_size.h"
 
 namespace tevpf {
 

@@ -6,8 +6,8 @@
 #include <cstdint>
 #include <cstring>
 
-#include "core/input.h"
-#include "core/text_word.h"
+#include "core/base/text_word.h"
+#include "core/io/input.h"
 
 namespace tevpf {
 

@@ -1,4 +1,4 @@
-#include "core/replacement.h"
+#include "core/io/replacement.h"
 
 #ifdef _WIN32
 

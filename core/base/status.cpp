@@ -1,10 +1,10 @@
 // The error context and the three ways to fail. Nothing else writes the two texts.
-#include "core/status.h"
+#include "core/base/status.h"
 
 #include <cstddef>
 
-#include "core/error_context.h"
-#include "core/number_text.h"
+#include "core/base/error_context.h"
+#include "core/base/number_text.h"
 
 namespace tevpf {
 

@@ -1,12 +1,12 @@
 // std::to_chars knows no locale and gives printf's bytes, except that it does so on every platform.
 // Usual floating-point numbers take a faster way to the same bytes.
-#include "core/number_text.h"
+#include "core/base/number_text.h"
 
 #include <algorithm>
 #include <charconv>
 #include <cstring>
 
-#include "core/leading_digits.h"
+#include "core/base/leading_digits.h"
 
 namespace tevpf {
 

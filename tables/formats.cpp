@@ -1,10 +1,10 @@
-#include "reports/formats.h"
+#include "tables/formats.h"
 
 #include <algorithm>
 #include <cstdio>
 #include <cstring>
 
-#include "core/status.h"
+#include "core/base/status.h"
 #include "values/value_type.h"
 
 namespace tevpf {

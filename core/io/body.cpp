@@ -1,4 +1,4 @@
-#include "core/body.h"
+#include "core/io/body.h"
 
 namespace tevpf {
 

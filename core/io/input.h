@@ -6,7 +6,7 @@
 #include <cstdint>
 #include <cstdio>
 
-#include "core/heap.h"
+#include "core/base/heap.h"
 
 namespace tevpf {
 

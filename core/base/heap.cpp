@@ -1,5 +1,5 @@
 // Blocks of the C runtime, and the exported helpers on raw memory.
-#include "core/heap.h"
+#include "core/base/heap.h"
 
 #include <cstdlib>
 #include <cstring>
@@ -9,7 +9,7 @@
 #include <unistd.h>
 #endif
 
-#include "core/status.h"
+#include "core/base/status.h"
 
 namespace tevpf {
 

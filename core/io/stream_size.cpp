@@ -1,4 +1,4 @@
-#include "core/stream_size.h"
+#include "core/io/stream_size.h"
 
 #include <sys/stat.h>
 #include <sys/types.h>

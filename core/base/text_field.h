@@ -7,7 +7,7 @@
 #include <cstring>
 #include <type_traits>
 
-#include "core/text_word.h"
+#include "core/base/text_word.h"
 #include "include/tevpf.h"
 
 namespace tevpf {

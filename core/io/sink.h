@@ -5,8 +5,8 @@
 #include <cstdint>
 #include <cstdio>
 
-#include "core/heap.h"
-#include "core/short_copy.h"
+#include "core/base/heap.h"
+#include "core/base/short_copy.h"
 
 namespace tevpf {
 

@@ -2,12 +2,12 @@
 #include <algorithm>
 #include <cstring>
 
+#include "core/base/permutation.h"
+#include "core/base/status.h"
+#include "core/base/text_field.h"
 #include "core/directory.h"
 #include "core/element_builder.h"
-#include "core/permutation.h"
-#include "core/status.h"
 #include "core/stored_form.h"
-#include "core/text_field.h"
 #include "lists/name_index.h"
 #include "lists/param_record.h"
 

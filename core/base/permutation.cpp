@@ -1,8 +1,8 @@
-#include "core/permutation.h"
+#include "core/base/permutation.h"
 
 #include <cstring>
 
-#include "core/heap.h"
+#include "core/base/heap.h"
 
 namespace tevpf {
 

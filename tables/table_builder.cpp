@@ -4,12 +4,12 @@
 #include <optional>
 #include <utility>
 
+#include "core/base/permutation.h"
+#include "core/base/status.h"
+#include "core/base/text_field.h"
 #include "core/directory.h"
 #include "core/element_builder.h"
-#include "core/permutation.h"
-#include "core/status.h"
 #include "core/stored_form.h"
-#include "core/text_field.h"
 #include "tables/column_index.h"
 #include "tables/column_record.h"
 #include "tables/default_row.h"
