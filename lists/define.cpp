@@ -6,8 +6,8 @@
 
 #include "core/base/heap.h"
 #include "core/base/status.h"
-#include "core/directory.h"
 #include "core/library.h"
+#include "lists/directory.h"
 #include "lists/list.h"
 #include "lists/name_index.h"
 #include "lists/param_check.h"
@@ -110,7 +110,7 @@ using namespace tevpf;
 TEVPF_STATUS TEV8R1_PF_add_param(const char* list_name, const TEVPF_PARAM_DEF* definition,
                                  std::int32_t position) noexcept {
   TEVPF_LIST* list;
-  PF_TRY(TEV8R1_get_list_ptr(list_name, &list));
+  PF_TRY(find_list(list_name, list));
   PF_TRY(ensure_free_slot(*list));
 
   TEVPF_PARAM param{};
@@ -136,7 +136,7 @@ TEVPF_STATUS TEV8R1_PF_modify_param_def(const char* list_name,
                                         TEVPF_PARAM_DEF definition) noexcept {
   TEVPF_LIST* list;
   std::int32_t position;
-  PF_TRY(TEV8R1_get_list_ptr(list_name, &list));
+  PF_TRY(find_list(list_name, list));
   PF_TRY(normalise(definition));
   PF_TRY(find_param(*list, definition.name, position));
   PF_TRY(TEV8R1_validate_param_def(list, definition));

@@ -1,13 +1,14 @@
-// Lists from their stored form.
+#include "lists/list_builder.h"
+
 #include <algorithm>
 #include <cstring>
 
 #include "core/base/permutation.h"
 #include "core/base/status.h"
 #include "core/base/text_field.h"
-#include "core/directory.h"
-#include "core/element_builder.h"
-#include "core/stored_form.h"
+#include "core/reader.h"
+#include "lists/directory.h"
+#include "lists/list_fields.h"
 #include "lists/name_index.h"
 #include "lists/param_record.h"
 
@@ -193,3 +194,12 @@ TEVPF_STATUS build_list(const TEVPF_ELEM_HEADER& header, Body body, Input& input
 }
 
 }  // namespace tevpf
+
+using namespace tevpf;
+
+TEVPF_STATUS TEV8R1_format_list(TEVPF_ELEM_HEADER header, const void* body,
+                                std::FILE* stream) noexcept {
+  Input input(stream);
+  terminate_texts(header);
+  return build_list(header, Body(body, header.btf), input);
+}

@@ -43,7 +43,7 @@ inline TEVPF_STATUS step(TEVPF_LIST& list, char* name_out, void* value_out) noex
 [[gnu::noinline]] TEVPF_STATUS find_and_step(const char* list_name, char* name_out,
                                              void* value_out) noexcept {
   TEVPF_LIST* list;
-  PF_TRY(TEV8R1_get_list_ptr(list_name, &list));
+  PF_TRY(find_list(list_name, list));
   return step(*list, name_out, value_out);
 }
 
@@ -63,7 +63,7 @@ TEVPF_STATUS TEV8R1_PF_get_next_param(const char* list_name, char* name_out,
 TEVPF_STATUS TEV8R1_PF_get_next_param_def(const char* list_name,
                                           TEVPF_PARAM_DEF* definition) noexcept {
   TEVPF_LIST* list;
-  PF_TRY(TEV8R1_get_list_ptr(list_name, &list));
+  PF_TRY(find_list(list_name, list));
   if (list->cur_param >= list->num_params - 1) return PF_NOMORE;
   deliver(*list, list->cur_param + 1, *definition);
   return PF_NORMAL;
@@ -72,7 +72,7 @@ TEVPF_STATUS TEV8R1_PF_get_next_param_def(const char* list_name,
 TEVPF_STATUS TEV8R1_PF_get_prev_param_def(const char* list_name,
                                           TEVPF_PARAM_DEF* definition) noexcept {
   TEVPF_LIST* list;
-  PF_TRY(TEV8R1_get_list_ptr(list_name, &list));
+  PF_TRY(find_list(list_name, list));
   if (list->cur_param <= 0 || list->num_params == 0) return PF_NOMORE;
   // A cursor that was left beyond the last parameter steps back to that one.
   deliver(*list, std::min(list->cur_param, list->num_params) - 1, *definition);
@@ -98,14 +98,14 @@ TEVPF_STATUS TEV8R1_PF_get_param_def_by_pos(const char* list_name, std::int32_t 
 
 TEVPF_STATUS TEV8R1_PF_reset_param(const char* list_name) noexcept {
   TEVPF_LIST* list;
-  PF_TRY(TEV8R1_get_list_ptr(list_name, &list));
+  PF_TRY(find_list(list_name, list));
   list->cur_param = -1;
   return PF_NORMAL;
 }
 
 TEVPF_STATUS TEV8R1_set_cur_param(const char* list_name, std::int32_t position) noexcept {
   TEVPF_LIST* list;
-  PF_TRY(TEV8R1_get_list_ptr(list_name, &list));
+  PF_TRY(find_list(list_name, list));
   if (position < 0 || position >= list->num_params) return PF_BADPOS;
   list->cur_param = position;
   return PF_NORMAL;

@@ -8,11 +8,11 @@
 
 #include "core/base/heap.h"
 #include "core/base/status.h"
-#include "core/directory.h"
 #include "core/library.h"
 #include "tables/column_index.h"
 #include "tables/column_record.h"
 #include "tables/default_row.h"
+#include "tables/directory.h"
 #include "tables/formats.h"
 #include "tables/layout.h"
 #include "tables/row_store.h"
@@ -263,7 +263,7 @@ TEVPF_STATUS TEV8R1_adjust_data(TEVPF_TABLE* table, std::int32_t size, std::int3
 
 TEVPF_STATUS TEV8R1_PF_def_column(const char* table_name, TEVPF_COL_DEF definition) noexcept {
   TEVPF_TABLE* table = nullptr;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_table(table_name, table));
   terminate_texts(definition);
   PF_TRY(TEV8R1_validate_col_def(table, definition));
 
@@ -277,7 +277,7 @@ TEVPF_STATUS TEV8R1_PF_def_column(const char* table_name, TEVPF_COL_DEF definiti
 TEVPF_STATUS TEV8R1_PF_delete_col(const char* table_name, const char* column_name) noexcept {
   TEVPF_TABLE* table = nullptr;
   TEVPF_COLUMN* column = nullptr;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_table(table_name, table));
   PF_TRY(TEV8R1_get_col_ptr(table, column_name, &column));
 
   const auto runs = new_array<Run>(static_cast<std::uint64_t>(table->num_cols));
@@ -305,7 +305,7 @@ TEVPF_STATUS TEV8R1_PF_move_col(const char* table_name, const char* column_name,
                                 const char* before_name) noexcept {
   TEVPF_TABLE* table = nullptr;
   TEVPF_COLUMN *column = nullptr, *before = nullptr;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_table(table_name, table));
   PF_TRY(TEV8R1_get_col_ptr(table, column_name, &column));
   if (before_name != nullptr) PF_TRY(TEV8R1_get_col_ptr(table, before_name, &before));
   if (table->num_cols < 2) return PF_NORMAL;

@@ -5,12 +5,12 @@
 #include "core/base/heap.h"
 #include "core/base/status.h"
 #include "core/base/text_field.h"
-#include "core/directory.h"
 #include "core/library.h"
 #include "tables/column_index.h"
 #include "tables/column_record.h"
 #include "tables/columns.h"
 #include "tables/default_row.h"
+#include "tables/directory.h"
 #include "tables/formats.h"
 #include "tables/layout.h"
 #include "tables/row_store.h"
@@ -174,7 +174,7 @@ TEVPF_STATUS TEV8R1_PF_modify_col_def(const char* table_name, const char* column
                                       TEVPF_COL_DEF definition) noexcept {
   TEVPF_TABLE* table = nullptr;
   TEVPF_COLUMN* column = nullptr;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_table(table_name, table));
   PF_TRY(TEV8R1_get_col_ptr(table, column_name, &column));
   terminate_texts(definition);
   std::int64_t row_wid = 0;

@@ -6,11 +6,11 @@
 
 #include "core/base/heap.h"
 #include "core/base/status.h"
-#include "core/directory.h"
 #include "core/library.h"
 #include "tables/column_index.h"
 #include "tables/cursor.h"
 #include "tables/default_row.h"
+#include "tables/directory.h"
 #include "tables/layout.h"
 #include "tables/row_store.h"
 #include "tables/search_keys.h"
@@ -144,7 +144,7 @@ TEVPF_STATUS move_row(TEVPF_TABLE& table, std::int32_t from, std::int32_t to) no
 }
 
 TEVPF_STATUS find_with_default_row(const char* table_name, TEVPF_TABLE*& table) noexcept {
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_table(table_name, table));
   if (table->num_cols > 0 && !ensure_default_row(*table)) return fail_empty(PF_NOMEM);
   return PF_NORMAL;
 }
@@ -196,7 +196,7 @@ TEVPF_STATUS TEV8R1_PF_add_row(const char* table_name, const void* row) noexcept
 TEVPF_STATUS TEV8R1_PF_add_row_by_pos(const char* table_name, const void* row,
                                       int32_t row_number) noexcept {
   TEVPF_TABLE* table;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_table(table_name, table));
   return insert_row(*table, row, row_number);
 }
 
@@ -217,7 +217,7 @@ TEVPF_STATUS TEV8R1_PF_replace_row(const char* table_name, const void* row) noex
   TEVPF_TABLE* table;
   void* stored;
   int32_t row_number;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_table(table_name, table));
   PF_TRY(TEV8R1_get_cur_row_ptr(table, &stored, &row_number));
   const GivenRow given(*table, row);
   if (given.get() == nullptr) return fail_empty(PF_NOMEM);
@@ -231,7 +231,7 @@ TEVPF_STATUS TEV8R1_PF_delete_row(const char* table_name) noexcept {
   TEVPF_TABLE* table;
   void* stored;
   int32_t row_number;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_table(table_name, table));
   PF_TRY(TEV8R1_get_cur_row_ptr(table, &stored, &row_number));
   erase_row(*table, row_number, nullptr);
   table->cur_row = -1;
@@ -241,7 +241,7 @@ TEVPF_STATUS TEV8R1_PF_delete_row(const char* table_name) noexcept {
 
 TEVPF_STATUS TEV8R1_PF_move_row(const char* table_name, int32_t from, int32_t to) noexcept {
   TEVPF_TABLE* table;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_table(table_name, table));
   if (table->cur_col != nullptr) return PF_SEARCHSET;
   if (from < 0 || from >= table->num_rows || table->num_rows < 2) {
     return fail(PF_BADPOS, Text(from), Text(table->num_rows));

@@ -3,10 +3,10 @@
 
 #include "core/base/fetch.h"
 #include "core/base/status.h"
-#include "core/directory.h"
 #include "tables/column_index.h"
 #include "tables/column_record.h"
 #include "tables/cursor.h"
+#include "tables/directory.h"
 #include "tables/layout.h"
 #include "tables/row_store.h"
 #include "tables/search_keys.h"
@@ -93,7 +93,7 @@ TEVPF_STATUS find_position(const TEVPF_TABLE& table, TEVPF_COLUMN& column, std::
 TEVPF_STATUS TEV8R1_PF_define_table_search(const char* table_name,
                                            const char* column_name) noexcept {
   TEVPF_TABLE* table;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_table(table_name, table));
   TEVPF_COLUMN* column = nullptr;
   if (column_name != nullptr) {
     PF_TRY(TEV8R1_get_col_ptr(table, column_name, &column));
@@ -109,7 +109,7 @@ TEVPF_STATUS TEV8R1_PF_get_row_by_value(const char* table_name, int8_t mode,
   TEVPF_TABLE* table;
   TEVPF_COLUMN* column;
   int32_t position = 0;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_table(table_name, table));
   if (table->num_rows == 0) return fail_empty(PF_NOTFOUND);
   PF_TRY(TEV8R1_get_col_ptr(table, column_name, &column));
   PF_TRY(find_position(*table, *column, mode, key, table->next_row, position));
@@ -123,7 +123,7 @@ TEVPF_STATUS TEV8R1_PF_get_value(const char* table_name, const char* column_name
   TEVPF_TABLE* table;
   TEVPF_COLUMN* column;
   int32_t position = 0;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_table(table_name, table));
   if (table->num_cols == 0) return PF_NORMAL;
   if (table->num_rows == 0) return fail_empty(PF_NOTFOUND);
   PF_TRY(find_position(*table, table->col_array[0], kExact, key, 0, position));
@@ -137,7 +137,7 @@ TEVPF_STATUS TEV8R1_PF_get_col_values(const char* table_name, const char* column
                                       void* values_out) noexcept {
   TEVPF_TABLE* table;
   TEVPF_COLUMN* column;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_table(table_name, table));
   if (table->num_rows == 0) return PF_NOMORE;
   PF_TRY(TEV8R1_get_col_ptr(table, column_name, &column));
   copy_values(*table, *column, static_cast<unsigned char*>(values_out));

@@ -17,6 +17,8 @@
 
 namespace tevpf {
 
+inline constexpr std::int32_t kTableHead = 24;  // stored body of a table without columns
+
 // The state of tables/search_keys.
 struct SearchKeys {
   unsigned char* values;  // a number column's values side by side; null while there are none

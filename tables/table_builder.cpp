@@ -1,4 +1,5 @@
-// Tables from their stored form.
+#include "tables/table_builder.h"
+
 #include <algorithm>
 #include <cstring>
 #include <optional>
@@ -7,14 +8,14 @@
 #include "core/base/permutation.h"
 #include "core/base/status.h"
 #include "core/base/text_field.h"
-#include "core/directory.h"
-#include "core/element_builder.h"
-#include "core/stored_form.h"
+#include "core/reader.h"
 #include "tables/column_index.h"
 #include "tables/column_record.h"
 #include "tables/default_row.h"
+#include "tables/directory.h"
 #include "tables/layout.h"
 #include "tables/row_store.h"
+#include "tables/table_fields.h"
 
 namespace tevpf {
 
@@ -174,17 +175,17 @@ TEVPF_STATUS read_contents(TEVPF_TABLE& table, std::int32_t num_rows, Input& inp
 
 }  // namespace
 
-TEVPF_STATUS build_table(TEVPF_ELEM_HEADER header, const void* body_bytes, Input& input) noexcept {
+TEVPF_STATUS build_table(const TEVPF_ELEM_HEADER& header, Body in_memory, Input& input) noexcept {
   if (header.btf < kTableHead) return fail(PF_BADFORMAT, header.elem_name);
-  ByteReader body(body_bytes, header.btf);
+  ByteReader body = in_memory.at_hand();
   TEVPF_TABLE head;
   unpack<kTableFields>(body.take(kTableHead), &head);
   const std::int32_t num_cols = std::max(head.num_cols, 0);
   if (!is_well_formed(body, num_cols, head.row_wid)) return fail(PF_BADFORMAT, header.elem_name);
 
-  header.btf = kTableHead;
   TEVPF_TABLE* table = nullptr;
   PF_TRY(TEV8R1_create_table(header, &table));
+  table->header.btf = kTableHead;
   table->dsp_wid = head.dsp_wid;
   std::memcpy(table->RESERVED, head.RESERVED, sizeof table->RESERVED);
   if (num_cols == 0) return PF_NORMAL;
@@ -196,3 +197,12 @@ TEVPF_STATUS build_table(TEVPF_ELEM_HEADER header, const void* body_bytes, Input
 }
 
 }  // namespace tevpf
+
+using namespace tevpf;
+
+TEVPF_STATUS TEV8R1_format_table(TEVPF_ELEM_HEADER header, const void* body,
+                                 std::FILE* stream) noexcept {
+  Input input(stream);
+  terminate_texts(header);
+  return build_table(header, Body(body, header.btf), input);
+}

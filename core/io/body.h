@@ -53,6 +53,15 @@ class ByteReader {
   const unsigned char* end_;
 };
 
+// What taking one stored parameter or column off a body came to.
+enum class Parsed {
+  kWhole,
+  kCutOff,       // it goes on behind the bytes at hand
+  kBroken,       // it contradicts itself, or the body ends inside it
+  kUnknownType,  // so that nobody knows its size
+  kNoMemory,
+};
+
 // A whole body: in memory, or still in the stream and at hand only as far as it is read ahead, so
 // that a body of any length goes by without a block of its length, unless one text fills it.
 class Body {

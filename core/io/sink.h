@@ -4,6 +4,7 @@
 
 #include <cstdint>
 #include <cstdio>
+#include <cstring>
 
 #include "core/base/heap.h"
 #include "core/base/short_copy.h"
@@ -34,6 +35,12 @@ class Sink {
     if (count > room()) return put_large(bytes, count);
     copy_short(buffer_ + used_, bytes, static_cast<std::int64_t>(count));
     used_ += static_cast<std::size_t>(count);
+  }
+
+  void put_text(const char* text) noexcept { put(text, std::strlen(text) + 1); }
+
+  void put_numbers(const std::int32_t* numbers, std::int32_t count) noexcept {
+    put(numbers, static_cast<std::uint64_t>(count) * sizeof *numbers);
   }
 
   // Passes on what is left to the stream; false when any write has failed.

@@ -6,6 +6,7 @@
 
 #include "core/base/heap.h"
 #include "core/reader.h"
+#include "lists/list_builder.h"
 #include "support/definitions.h"
 #include "support/drive.h"
 #include "support/param_def.h"
