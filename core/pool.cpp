@@ -8,7 +8,7 @@
 namespace tevpf {
 namespace {
 
-// Chunks grow up to this many pieces; what a pool holds in vain is bounded by it.
+// Chunks double up to this size, which bounds what stays unused.
 constexpr std::int32_t kMostPieces = 64;
 constexpr std::int64_t kChunkHead = 16;  // keeps the pieces aligned
 

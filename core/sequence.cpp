@@ -49,7 +49,8 @@ bool Sequence::become_blocks(std::int32_t count) noexcept {
   return true;
 }
 
-// An array can take any change; where there is no memory for blocks, it is only slower.
+// An array can take any change, if more slowly, so one with room stays where there is no memory for
+// blocks.
 
 bool Sequence::make_ready_to_insert(std::int32_t count, std::int32_t position,
                                     std::int32_t item) noexcept {
@@ -81,7 +82,7 @@ bool Sequence::make_ready_to_move(std::int32_t count, std::int32_t from, std::in
 void Sequence::insert(std::int32_t count, SequencePlace place, std::int32_t item,
                       const void* key) noexcept {
   if (blocks != nullptr) return blocks->insert(place, item, key);
-  if (items == nullptr) return;  // its next item, at its end
+  if (items == nullptr) return;  // an identity takes its next item
   std::int32_t* const at = items + place.position;
   std::memmove(at + 1, at, static_cast<std::size_t>(count - place.position) * sizeof *at);
   *at = item;
@@ -89,7 +90,7 @@ void Sequence::insert(std::int32_t count, SequencePlace place, std::int32_t item
 
 void Sequence::erase(std::int32_t count, SequencePlace place) noexcept {
   if (blocks != nullptr) return blocks->erase(place);
-  if (items == nullptr) return;  // its last item
+  if (items == nullptr) return;  // an identity loses its last item
   std::int32_t* const at = items + place.position;
   std::memmove(at, at + 1, static_cast<std::size_t>(count - 1 - place.position) * sizeof *at);
 }

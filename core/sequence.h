@@ -1,13 +1,13 @@
-// An order of items: the rows of a table as they are stored, a column's index, the parameters of a
-// list, their name index. Items are distinct numbers 0 .. 2^31 - 2 of slots that stay where they
-// are, so that an insertion or removal renumbers nothing.
+// An ordered sequence of items: the rows of a table as stored, a column's index, the parameters of
+// a list, their name index. Items are distinct numbers of slots, 0 .. 2^31 - 2. A slot stays where
+// it is, so inserting or erasing an item renumbers nothing.
 //
-// A sequence is in one of three states.
-//   identity  item = position; needs no memory. Most are never changed in the middle.
-//   flat      one array with room for more: what a file brings.
-//   blocks    a large one that was changed in the middle: small blocks (core/sequence_blocks), in
-//             which a change costs the same at any size. Leaving the other states for this one
-//             costs a copy of nothing: a block gets memory of its own when it is first changed.
+// A sequence is in one of three states:
+//   identity  item = position; no memory. Most sequences are never changed in the middle.
+//   flat      one array with room for more, as a file brings it.
+//   blocks    small blocks of items (core/sequence_blocks), for a large sequence that was changed
+//             in the middle: a change costs about the same at any size. Entering this state copies
+//             nothing; a block is copied when it is first changed.
 #pragma once
 
 #include <cstdint>
@@ -17,19 +17,20 @@
 
 namespace tevpf {
 
+// A change that moves no more items than this within an array does so.
 #ifdef TEVPF_TEST_HOOKS
 inline constexpr std::int32_t kFlatReach = 5;
 #else
-// A change in an array that moves no more items than this is left to memmove.
 inline constexpr std::int32_t kFlatReach = 512;
 #endif
 
-// A plain record, all zero: the identity. Copying it copies no contents; whoever holds it calls
-// clear at the end.
+// A plain record; all zero it is an identity. Copying the record does not copy the contents; its
+// owner calls clear at the end.
 //
-// Invariants: items and blocks are never both set. items: the array, a block of the C runtime, of
-// which the first `count` entries count and `room` exist. blocks: all there is. `count` is the
-// caller's number in the first two states, and passed by it; in blocks it is theirs, and the same.
+// Invariants: at most one of items and blocks is set. `items` is a block of the C runtime with
+// `room` entries, the first `count` of which are the sequence; they may be changed from outside. In
+// these two states `count` is the caller's number, which every function is given. In blocks it is
+// theirs, and the caller's must equal it.
 struct Sequence {
   std::int32_t* items;
   SequenceBlocks* blocks;
@@ -45,11 +46,10 @@ struct Sequence {
     return blocks == nullptr ? position : blocks->read(position);
   }
 
-  // The items from a position on that lie one behind the other, at least one: for walks, and for
-  // copies of the whole. Valid until the next change.
+  // The longest chunk that starts at a position, 0 .. count - 1. Valid until the next change.
   SequenceChunk chunk_at(std::int32_t count, std::int32_t position) const noexcept;
 
-  // Calls visit(chunk) for all of them in order.
+  // Calls visit(chunk) for chunks that make up the whole, in order.
   template <class Visit>
   void for_each_chunk(std::int32_t count, Visit visit) const {
     for (std::int32_t position = 0; position < count;) {
@@ -59,7 +59,7 @@ struct Sequence {
     }
   }
 
-  // Writes all items, one behind the other.
+  // Writes all items to an array of `count` entries.
   void copy_items(std::int32_t count, std::int32_t* out) const noexcept;
 
   // The place of a position, 0 .. count.
@@ -67,25 +67,27 @@ struct Sequence {
     return blocks == nullptr ? SequencePlace{position} : blocks->locate(position);
   }
 
-  // The place of an item; position -1 when it is not there. In blocks O(1), once calls have paid
-  // for the map that it takes.
+  // The place of an item, at position -1 if it is not in the sequence. In blocks the first calls
+  // scan; once they have cost as much as a map from items to blocks, there is one, and calls are
+  // O(1).
   SequencePlace place_of(std::int32_t count, std::int32_t item) const noexcept;
   std::int32_t position_of(std::int32_t count, std::int32_t item) const noexcept {
     return place_of(count, item).position;
   }
 
   // ---- Changes ----------------------------------------------------------------------------------
-  // Each make_ready gets everything that the one change it names can need, and chooses the state for
-  // it; the sequence says the same before and after, and places stay valid. False: no memory.
+  // Each make_ready allocates whatever the change that it names can need and picks the state for
+  // it. The items are the same afterwards and places stay valid. False: out of memory.
 
   [[nodiscard]] bool make_ready_to_insert(std::int32_t count, std::int32_t position,
                                           std::int32_t item) noexcept;
   [[nodiscard]] bool make_ready_to_erase(std::int32_t count, std::int32_t position) noexcept;
-  // An erasure at `from`, then an insertion of the same item at `to` in what is left.
+  // Erasing the item at `from`, then inserting it at `to`, a position among the others.
   [[nodiscard]] bool make_ready_to_move(std::int32_t count, std::int32_t from,
                                         std::int32_t to) noexcept;
 
-  // Cannot fail. `count` is the one before the change. `key`: see core/sequence_search.
+  // Cannot fail after make_ready. `count` is that before the change. `key`: see
+  // core/sequence_search.
   void insert(std::int32_t count, SequencePlace place, std::int32_t item,
               const void* key = nullptr) noexcept;
   void erase(std::int32_t count, SequencePlace place) noexcept;
@@ -93,14 +95,16 @@ struct Sequence {
 
   // ---- The whole --------------------------------------------------------------------------------
 
-  // Makes it one array with room for `new_room` items, at least count; O(count) unless it is one.
+  // Makes it flat, with room for at least `new_room` items (count or more). False: out of memory,
+  // and nothing has changed.
   [[nodiscard]] bool flatten(std::int32_t count, std::int32_t new_room) noexcept;
-  // Takes over an array in place of what there is; hands out the array of a flat one.
+  // adopt takes over an array in place of the contents; hand_over gives up the array of a flat
+  // sequence.
   void adopt(Owned<std::int32_t> array, std::int32_t array_room) noexcept;
   [[nodiscard]] Owned<std::int32_t> hand_over() noexcept;
-  // A copy, for `out` without contents: an identity, or an array with room for just these items.
+  // Makes `out`, which has no contents, an identity or a flat copy without spare room.
   [[nodiscard]] bool copy_to(std::int32_t count, Sequence& out) const noexcept;
-  // Releases everything: the identity again.
+  // Releases the contents; what remains is an identity.
   void clear() noexcept;
 
  private:

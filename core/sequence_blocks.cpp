@@ -10,15 +10,15 @@
 namespace tevpf {
 namespace {
 
-// Blocks and groups are made three quarters full, so that the first insertions split none; small
-// ones are merged with a neighbour when both together fill no more than that.
+// Blocks and groups start three quarters full, so that the first insertions do not split them.
+// Small ones are joined with a neighbour when both together are no fuller than that.
 constexpr std::int32_t filled(std::int32_t room) noexcept { return room - room / 4; }
 constexpr bool is_small(std::int32_t count, std::int32_t room) noexcept {
   return count <= room / 4;
 }
 
-// An erasure gives a block memory of its own; an insertion does so too, or else splits a block, and
-// the group with it.
+// An erasure takes at most one piece, for a block that has none of its own; so does an insertion,
+// for that or for a split.
 constexpr std::int64_t kPiecesPerChange = 2;
 constexpr std::int32_t kGroupsPerChange = 1;
 constexpr std::int32_t kIdsPerChange = 1;
@@ -40,7 +40,7 @@ void move_entries(T* to, const T* from, std::int32_t count) noexcept {
   std::memmove(to, from, static_cast<std::size_t>(count) * sizeof(T));
 }
 
-// Moves `count` blocks, but for their starts, to another place or group.
+// Moves the entries of `count` blocks, except for their starts.
 void move_blocks(SequenceGroup& to, std::int32_t at, const SequenceGroup& from, std::int32_t first,
                  std::int32_t count) noexcept {
   move_entries(to.last + at, from.last + first, count);
@@ -60,7 +60,7 @@ void end_starts(SequenceGroup& group) noexcept {
   std::fill(group.start + group.count + 1, group.start + kGroupRoom + 1, SequenceGroup::kNoStart);
 }
 
-// Takes the entry of an empty block out of a group.
+// Removes the entries of a block; its range goes to the previous one.
 void close_block(SequenceGroup& group, std::int32_t b) noexcept {
   move_blocks(group, b, group, b + 1, group.count - b - 1);
   move_entries(group.start + b, group.start + b + 1, group.count - b);
@@ -68,14 +68,14 @@ void close_block(SequenceGroup& group, std::int32_t b) noexcept {
   end_starts(group);
 }
 
-// The block of the group in which that offset lies: counts starts, many at a time.
+// The block of the group that holds that offset: counts starts without a branch.
 std::int32_t block_at(const SequenceGroup& group, std::int32_t offset) noexcept {
   const auto wanted = static_cast<std::int16_t>(offset);
   std::int16_t in_front = 0;
   for (std::int32_t i = 1; i <= kGroupRoom; ++i) {
     in_front = static_cast<std::int16_t>(in_front + (group.start[i] <= wanted ? 1 : 0));
   }
-  return std::min<std::int32_t>(in_front, group.count - 1);  // the end is in the last one
+  return std::min<std::int32_t>(in_front, group.count - 1);  // the end belongs to the last one
 }
 
 }  // namespace
@@ -107,7 +107,7 @@ SequenceBlocks* SequenceBlocks::make(std::int32_t* flat, std::int32_t count) noe
   return blocks;
 }
 
-// One more group of blocks over the flat array, or runs.
+// Adds a group over the next items, up to item number `all`.
 void SequenceBlocks::append_group(std::int32_t all) noexcept {
   SequenceGroup& group = add_group(num_groups);
   do {
@@ -213,7 +213,8 @@ void SequenceBlocks::insert(SequencePlace place, std::int32_t item, const void* 
   count_items(place, 1);
 }
 
-// In front of a block is behind the one before it: items that come in order fill blocks up.
+// The front of a block is also the end of the previous one. Preferring that while it has room keeps
+// blocks full where items arrive in order.
 SequencePlace SequenceBlocks::at_end_of_previous(const SequencePlace& place) const noexcept {
   if (place.offset != 0 || place.block == 0) return place;
   const std::int32_t size = groups[place.group]->items_of(place.block - 1);
@@ -227,7 +228,7 @@ void SequenceBlocks::count_items(const SequencePlace& place, std::int32_t change
   count += change;
 }
 
-// A block that is first changed gets a piece of its own.
+// Copies the items of a block that is changed for the first time.
 void SequenceBlocks::give_own_piece(SequenceBlock& block, const SequenceChunk& chunk) noexcept {
   if (block.own != 0) return;
   auto* const items = static_cast<std::int32_t*>(item_pieces.take());
@@ -246,8 +247,8 @@ void SequenceBlocks::release_items(const SequenceBlock& block) noexcept {
   }
 }
 
-// Splits a full block in halves, or leaves it full where an item comes behind its last one; gives
-// the place that the given one has become.
+// Splits a full block in half; an item that goes to its end gets a new block instead, so that
+// appending fills blocks up. Returns what the place has become.
 SequencePlace SequenceBlocks::split(SequencePlace place) noexcept {
   if (groups[place.group]->count == kGroupRoom) place = split_group(place);
   SequenceGroup& group = *groups[place.group];
@@ -284,7 +285,7 @@ SequencePlace SequenceBlocks::split_group(const SequencePlace& place) noexcept {
   return {place.position, right.number, place.block - kept, place.offset};
 }
 
-// Moves the blocks of a group from `first` on behind those of another.
+// Appends the blocks of a group, from `first` on, to another.
 void SequenceBlocks::append_blocks(SequenceGroup& to, const SequenceGroup& from,
                                    std::int32_t first) noexcept {
   const std::int32_t moved = from.count - first;
@@ -298,7 +299,7 @@ void SequenceBlocks::append_blocks(SequenceGroup& to, const SequenceGroup& from,
   end_starts(to);
 }
 
-// A group without blocks yet, in front of that of number g.
+// Inserts a group without blocks at number g.
 SequenceGroup& SequenceBlocks::add_group(std::int32_t g) noexcept {
   auto* const group = static_cast<SequenceGroup*>(group_pieces.take());
   group->count = 0;
@@ -336,7 +337,7 @@ void SequenceBlocks::erase(SequencePlace place) noexcept {
   shrink(group, b);
 }
 
-// Drops a block that has become empty, joins one that has become small with a neighbour.
+// Drops a block that has become empty; joins one that has become small with a neighbour.
 void SequenceBlocks::shrink(SequenceGroup& group, std::int32_t b) noexcept {
   const std::int32_t size = group.items_of(b);
   if (size == 0) {
@@ -354,28 +355,19 @@ void SequenceBlocks::shrink(SequenceGroup& group, std::int32_t b) noexcept {
   }
 }
 
-// Joins a block and the next one, one of which has a piece of its own, in that.
+// Appends the items of the next block to a block. That one has a piece of its own: it has just been
+// changed, or it holds fewer items than blocks are made with.
 void SequenceBlocks::join(SequenceGroup& group, std::int32_t b) noexcept {
-  const SequenceChunk left = group.chunk(b);
   const SequenceChunk right = group.chunk(b + 1);
-  const bool in_left = group.block[b].own != 0;
-  std::int32_t* const items = group.block[in_left ? b : b + 1].items;
-  join_keys(group, b, in_left);
-  remember(in_left ? right : left, group.id[in_left ? b : b + 1]);
-  if (!in_left) {
-    move_entries(items + left.count, items, right.count);
-    copy_chunk(left, items);
-    std::swap(group.block[b], group.block[b + 1]);
-    std::swap(group.id[b], group.id[b + 1]);
-  } else {
-    copy_chunk(right, items + left.count);
-  }
+  join_keys(group, b);
+  copy_chunk(right, group.block[b].items + group.items_of(b));
+  remember(right, group.id[b]);
   group.last[b] = group.last[b + 1];
   group.last_key[b] = group.last_key[b + 1];
   drop_block(group, b + 1);
 }
 
-// Drops a block whose items are gone, or are those of the one before it too.
+// Drops a block that is empty, or whose items the previous block has taken over.
 void SequenceBlocks::drop_block(SequenceGroup& group, std::int32_t b) noexcept {
   drop_keys(group, b);
   release_items(group.block[b]);
@@ -404,7 +396,7 @@ void SequenceBlocks::shrink_group(std::int32_t g) noexcept {
   drop_group(g + 1);
 }
 
-// Drops a group whose blocks are gone.
+// Drops a group whose blocks are gone or have moved.
 void SequenceBlocks::drop_group(std::int32_t g) noexcept {
   group_pieces.give_back(groups[g]);
   --num_groups;

@@ -1,6 +1,7 @@
-// The blocks of a large sequence that is changed in the middle (see core/sequence). Small ordered
-// blocks of items, up to kGroupRoom of them in a group, the groups in one array: an insertion moves
-// part of a block, adds one to the starts behind it in its group, and one to those of later groups.
+// The third state of a sequence (see core/sequence): its items in small blocks, the blocks in
+// groups. An insertion moves part of one block, adds one to the starts of the later blocks of its
+// group and one to the starts of the later groups; a position is found by two short searches of
+// these starts.
 #pragma once
 
 #include <cstdint>
@@ -18,9 +19,9 @@ inline constexpr std::int32_t kBlockRoom = 256;
 inline constexpr std::int32_t kGroupRoom = 64;
 #endif
 
-// Some items one behind the other.
+// Some consecutive entries of a sequence.
 struct SequenceChunk {
-  const std::int32_t* items;  // null: the items are first, first + 1, first + 2 ...
+  const std::int32_t* items;  // null: a run, the items first, first + 1, first + 2 ...
   std::int32_t first;
   std::int32_t count;
 
@@ -29,12 +30,11 @@ struct SequenceChunk {
   }
 };
 
-// Writes its items, one behind the other.
 void copy_chunk(const SequenceChunk& chunk, std::int32_t* out) noexcept;
-// Where an item is among them; -1 when it is not.
+// The offset of an item in a chunk, or -1.
 std::int32_t offset_in(const SequenceChunk& chunk, std::int32_t item) noexcept;
 
-// Where an item stands, or where one can be inserted. Valid until the next change.
+// Where an item stands or where one can be inserted; valid until the next change.
 struct SequencePlace {
   std::int32_t position;
   std::int32_t group = -1;  // its number; -1: only the position is known
@@ -42,9 +42,9 @@ struct SequencePlace {
   std::int32_t offset = 0;  // within the block
 };
 
-// The number of leading places 0 .. length - 1 for which is_less holds; it holds for none behind the
-// first for which it does not. Three probes a step, which wait for memory together, quarter what is
-// left; no branch depends on an answer.
+// The number of leading places 0 .. length - 1 for which is_less holds; behind the first for which
+// it does not, it must hold for none. Each step makes three probes whose cache misses overlap and
+// quarters what is left; no branch depends on an answer.
 template <class IsLess>
 std::int32_t count_less(std::int32_t length, IsLess is_less) noexcept {
   std::int32_t first = 0;  // the answer is one of `length` places from there on, or behind them
@@ -61,32 +61,32 @@ std::int32_t count_less(std::int32_t length, IsLess is_less) noexcept {
   return first + behind;
 }
 
-// The items of a block lie in a piece of its own (`own`), or still where they were when the blocks
-// were made: in the flat array, or nowhere (items null) because they are consecutive and follow from
-// the last one. Only an own piece is changed.
+// A block's items lie in a piece of its own (`own`), or where they were when the blocks were made:
+// in the flat array, or, as a run, nowhere (items null; they follow from the last one). Only own
+// pieces are written to.
 struct SequenceBlock {
   std::int32_t* items;
-  void* keys;         // one for each item, in a piece of its own; null: not gathered
+  void* keys;         // one for each item, in a piece of their own; null: not gathered
   std::int32_t own;   // 1 or 0
-  std::int32_t heat;  // searches since the keys were last missing
+  std::int32_t heat;  // searches that missed keys
 };
 
-// Invariants: 1 to kGroupRoom blocks. start[b] counts the items of the group in front of block b,
-// start[count] all of them, and the entries behind are kNoStart. Every block holds 1 to kBlockRoom
-// items; only the one block of a sequence without items holds none.
+// Invariants: a group has 1 to kGroupRoom blocks. start[b] is the number of the group's items in
+// front of block b, start[count] that of all of them; entries beyond are kNoStart. A block holds 1
+// to kBlockRoom items, except that a sequence without items keeps one empty block.
 struct SequenceGroup {
   static constexpr std::int16_t kNoStart = std::numeric_limits<std::int16_t>::max();
   static_assert(kBlockRoom * kGroupRoom < kNoStart);
 
-  std::int32_t number;  // where the group stands among the groups
+  std::int32_t number;  // its index in SequenceBlocks::groups
   std::int32_t count;   // of its blocks
   std::int16_t start[kGroupRoom + 1];
   bool has_last_keys;             // whether last_key holds the key of each block's last item
-  std::int32_t heat;              // searches since they were last missing
+  std::int32_t heat;              // searches that missed them
   std::int32_t last[kGroupRoom];  // each block's last item
-  std::int32_t id[kGroupRoom];    // each block's number for life
+  std::int32_t id[kGroupRoom];    // each block's, which never changes
   SequenceBlock block[kGroupRoom];
-  std::uint64_t last_key[kGroupRoom];  // in the first bytes of each
+  std::uint64_t last_key[kGroupRoom];  // in the first key_size bytes of each
 
   std::int32_t items() const noexcept { return start[count]; }
   std::int32_t items_of(std::int32_t b) const noexcept { return start[b + 1] - start[b]; }
@@ -96,13 +96,13 @@ struct SequenceGroup {
   }
 };
 
-// Invariants: groups[g]->number == g; starts[g] counts the items in front of group g, `count` all;
-// the items of all blocks, one behind the other, are the sequence. homes[id].group is the group of
-// the block of that id; free ids are chained from free_id on and end with -1. `borrowed` counts the
-// blocks that lie in `flat`, which is released with the last of them. While there is a map, map[item]
-// is the id of the item's block for every item that the sequence holds and -1 for all others below
-// map_room, and every item held is below map_room. Keys, when gathered, are those of the items;
-// they, the map and the hint only save time: all may be missing, and get lost where memory is short.
+// Invariants: groups[g]->number == g; starts[g] is the number of items in front of group g, and
+// `count` that of all. homes[id].group is the group of the block with that id; unused ids are
+// chained from free_id on, -1 at the end. `borrowed` counts the blocks that lie in `flat`, which is
+// released with the last of them. If there is a map, it covers every item held: map[item] is the id
+// of the item's block, or -1 for items that are not held. Gathered keys equal those of the items.
+// The keys, the map and the hint only save time: each may be missing, and is dropped where memory
+// is short.
 struct SequenceBlocks {
   union Home {
     SequenceGroup* group;
@@ -118,8 +118,8 @@ struct SequenceBlocks {
 
   std::int32_t count;
   std::int32_t num_groups;
-  std::int32_t group_room;  // entries that groups and starts really have
-  std::int32_t num_ids;     // given so far, those that are free again included
+  std::int32_t group_room;  // entries allocated for groups and starts
+  std::int32_t num_ids;     // ids given out so far, including unused ones
   std::int32_t id_room;
   std::int32_t free_id;
   SequenceGroup** groups;
@@ -131,24 +131,24 @@ struct SequenceBlocks {
   std::int32_t borrowed;
   std::int32_t map_room;
   std::int32_t* map;
-  std::int64_t effort;  // of looking for items without a map, in items looked at
+  std::int64_t effort;  // items scanned for want of a map
   Pool item_pieces, group_pieces, key_pieces;
   std::int32_t key_size;  // bytes; 0: no block has keys
 
-  // Blocks over a flat array, which then belongs to them, or over 0 .. count - 1 where it is null;
-  // O(count / kBlockRoom). Null when memory runs out.
+  // Blocks over a flat array, which they take over, or over the items 0 .. count - 1 where it is
+  // null. O(count / kBlockRoom). Null when memory runs out.
   static SequenceBlocks* make(std::int32_t* flat, std::int32_t count) noexcept;
   static void release(SequenceBlocks* blocks) noexcept;
 
-  // Gets all that an erasure followed by an insertion of `item` can need; false when memory runs out.
+  // Allocates what one erasure and one insertion, of `item`, can need; false when memory runs out.
   [[nodiscard]] bool reserve(std::int32_t item) noexcept;
 
-  // The place of the item at that position, or behind the last one.
+  // The place of a position, 0 .. count.
   SequencePlace locate(std::int32_t position) const noexcept;
   // The place of an item; position -1 when it is not there.
   SequencePlace find(std::int32_t item) noexcept;
 
-  // Need what reserve got. `key`: the item's, of key_size bytes, or null.
+  // To be called after reserve. `key`: the item's key, of key_size bytes, or null.
   void insert(SequencePlace place, std::int32_t item, const void* key) noexcept;
   void erase(SequencePlace place) noexcept;
 
@@ -161,18 +161,18 @@ struct SequenceBlocks {
   std::int32_t read_elsewhere(std::int32_t position) noexcept;
   void forget_hint() noexcept { hint.chunk.count = 0; }
 
-  // ---- Keys ---------------------------------------------------------------------------------------
+  // ---- Keys -------------------------------------------------------------------------------------
 
-  // To be called ahead of the others: keys of another size are dropped.
+  // Sets key_size; drops all keys if it changes.
   void expect_keys(std::int32_t size) noexcept {
     if (key_size != size) change_key_size(size);
   }
   void change_key_size(std::int32_t size) noexcept;
-  // A piece for the keys of that block, to be filled; null when there is no memory.
+  // Gives a block a piece for its keys, to be filled by the caller; null when memory runs out.
   void* make_keys(SequenceGroup& group, std::int32_t b) noexcept;
   void drop_keys(SequenceGroup& group, std::int32_t b) noexcept;
   void drop_all_keys() noexcept;
-  // The key of the item at a place has become another one.
+  // Replaces the key of the item at a place, where it has been gathered.
   void set_key(SequencePlace place, const void* key) noexcept;
 
  private:
@@ -205,14 +205,14 @@ struct SequenceBlocks {
                          std::int32_t offset) const noexcept;
   SequencePlace look_everywhere(std::int32_t item) noexcept;
 
-  // In sequence_keys.cpp; the last four are called ahead of the change that they are about.
+  // In sequence_keys.cpp; the last four are called before the change to the items.
   void* take_keys() noexcept;
   unsigned char* key_bytes(const SequenceBlock& block, std::int32_t offset) const noexcept;
   void set_last_key(SequenceGroup& group, std::int32_t b, const void* key) noexcept;
   void insert_key(SequenceGroup& group, const SequencePlace& place, const void* key) noexcept;
   void erase_key(SequenceGroup& group, const SequencePlace& place) noexcept;
   void split_keys(SequenceGroup& group, std::int32_t b, std::int32_t kept) noexcept;
-  void join_keys(SequenceGroup& group, std::int32_t b, bool in_left) noexcept;
+  void join_keys(SequenceGroup& group, std::int32_t b) noexcept;
 };
 
 }  // namespace tevpf

@@ -1,5 +1,5 @@
-// The keys beside the items of a sequence in blocks, as these come and go. Keys only save time: what
-// cannot be kept is dropped.
+// The keys of a sequence in blocks as items come and go. Keys only save time: those that cannot be
+// kept are dropped.
 #include <cstring>
 
 #include "core/sequence_blocks.h"
@@ -101,22 +101,13 @@ void SequenceBlocks::split_keys(SequenceGroup& group, std::int32_t b, std::int32
   move_bytes(key_bytes(right, 0), key_bytes(left, kept), (kBlockRoom - kept) * key_size);
 }
 
-void SequenceBlocks::join_keys(SequenceGroup& group, std::int32_t b, bool in_left) noexcept {
+void SequenceBlocks::join_keys(SequenceGroup& group, std::int32_t b) noexcept {
   const SequenceBlock& left = group.block[b];
   const SequenceBlock& right = group.block[b + 1];
-  if (left.keys == nullptr || right.keys == nullptr) {
-    drop_keys(group, b);
-    drop_keys(group, b + 1);
-    return;
-  }
-  const std::int32_t in_front = group.items_of(b);
-  const std::int32_t behind = group.items_of(b + 1);
-  if (in_left) {
-    move_bytes(key_bytes(left, in_front), key_bytes(right, 0), behind * key_size);
-  } else {
-    move_bytes(key_bytes(right, in_front), key_bytes(right, 0), behind * key_size);
-    move_bytes(key_bytes(right, 0), key_bytes(left, 0), in_front * key_size);
-  }
+  if (right.keys == nullptr) drop_keys(group, b);
+  if (left.keys == nullptr) return;
+  move_bytes(key_bytes(left, group.items_of(b)), key_bytes(right, 0),
+             group.items_of(b + 1) * key_size);
 }
 
 }  // namespace tevpf

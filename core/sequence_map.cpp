@@ -1,4 +1,4 @@
-// Where in the blocks of a sequence an item is: a map from items to blocks, and scans.
+// Finding an item in the blocks of a sequence: a map from items to blocks, and linear scans.
 #include <algorithm>
 
 #include "core/heap.h"
@@ -7,7 +7,7 @@
 namespace tevpf {
 namespace {
 
-// Looking at so many items, one after the other, costs as much as one entry of a new map.
+// Making an entry of the map costs about as much as scanning this many items.
 #ifdef TEVPF_TEST_HOOKS
 constexpr std::int64_t kItemsPerEntry = 1;
 #else
@@ -36,7 +36,7 @@ std::int32_t offset_in(const SequenceChunk& chunk, std::int32_t item) noexcept {
     const std::int64_t offset = std::int64_t{item} - chunk.first;
     return offset >= 0 && offset < chunk.count ? static_cast<std::int32_t>(offset) : -1;
   }
-  constexpr std::int32_t kStep = 32;  // compilers make vectors of the inner loop
+  constexpr std::int32_t kStep = 32;  // the compiler vectorises the inner loop
   std::int32_t at = 0;
   for (; chunk.count - at >= kStep; at += kStep) {
     std::uint32_t found = 0;
@@ -97,7 +97,7 @@ void SequenceBlocks::make_map() noexcept {
   });
 }
 
-// Without memory for the item there is no map any more.
+// Drops the map when there is no memory to grow it.
 void SequenceBlocks::reserve_map(std::int32_t item) noexcept {
   if (map == nullptr || item < map_room) return;
   const std::int64_t needed = std::int64_t{item} + 1;
@@ -107,6 +107,7 @@ void SequenceBlocks::reserve_map(std::int32_t item) noexcept {
   if (grown == nullptr) {
     heap_free(map);
     map = nullptr;
+    map_room = 0;
     return;
   }
   map = static_cast<std::int32_t*>(grown);

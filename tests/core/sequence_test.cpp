@@ -6,7 +6,6 @@
 #include <algorithm>
 #include <numeric>
 #include <random>
-#include <set>
 #include <vector>
 
 #include "core/sequence_search.h"
@@ -21,7 +20,7 @@ template <class KeyOf>
 const char* broken_rule(const SequenceBlocks& blocks, KeyOf key_of) {
   using Key = decltype(key_of(0));
   std::int32_t position = 0, borrowed = 0;
-  std::set<std::int32_t> ids, held;
+  std::vector<std::int32_t> ids;
   for (std::int32_t g = 0; g < blocks.num_groups; ++g) {
     const SequenceGroup& group = *blocks.groups[g];
     if (group.number != g || blocks.starts[g] != position) return "group's number or start";
@@ -33,11 +32,10 @@ const char* broken_rule(const SequenceBlocks& blocks, KeyOf key_of) {
       if (chunk.count < (blocks.count > 0) || chunk.count > kBlockRoom) return "size of a block";
       if (chunk.count > 0 && chunk[chunk.count - 1] != group.last[b]) return "last item";
       if (blocks.homes[group.id[b]].group != &group) return "home";
-      if (!ids.insert(group.id[b]).second) return "id";
+      ids.push_back(group.id[b]);
       if (block.items == nullptr && block.own != 0) return "run with a piece";
       borrowed += block.items != nullptr && block.own == 0;
       for (std::int32_t i = 0; i < chunk.count; ++i) {
-        if (!held.insert(chunk[i]).second) return "item twice";
         if (blocks.map != nullptr && blocks.map[chunk[i]] != group.id[b]) return "map";
         if (block.keys != nullptr && static_cast<Key*>(block.keys)[i] != key_of(chunk[i]))
           return "key";
@@ -51,11 +49,15 @@ const char* broken_rule(const SequenceBlocks& blocks, KeyOf key_of) {
     for (std::int32_t b = group.count + 1; b <= kGroupRoom; ++b)
       if (group.start[b] != SequenceGroup::kNoStart) return "start of no block";
   }
-  for (std::int32_t item = 0; item < blocks.map_room && blocks.map != nullptr; ++item)
-    if (blocks.map[item] >= 0 && held.count(item) == 0) return "map of no item";
   for (std::int32_t id = blocks.free_id; id >= 0; id = blocks.homes[id].next_free)
-    if (!ids.insert(id).second) return "free id";
+    ids.push_back(id);
+  std::sort(ids.begin(), ids.end());
+  for (std::size_t i = 0; i < ids.size(); ++i)
+    if (ids[i] != static_cast<std::int32_t>(i)) return "id";
   if (static_cast<std::int32_t>(ids.size()) != blocks.num_ids) return "lost id";
+  const auto mapped = std::count_if(blocks.map, blocks.map + blocks.map_room,
+                                    [](std::int32_t id) { return id >= 0; });
+  if (blocks.map != nullptr && mapped != blocks.count) return "map of no item";
   if (borrowed != blocks.borrowed || (borrowed > 0) != (blocks.flat != nullptr)) return "borrowed";
   return position == blocks.count ? nullptr : "count";
 }
@@ -239,11 +241,11 @@ TYPED_TEST(SequenceTest, HoldsWhatAVectorHolds) {
   for (const bool by_value : {false, true}) {
     SCOPED_TRACE(by_value);
     Model<TypeParam> model(1, by_value);
-    for (int i = 0; i < 20'000 && !this->HasFailure(); ++i) {
+    for (int i = 0; i < 8'000 && !this->HasFailure(); ++i) {
       SCOPED_TRACE(i);
       model.step();
     }
-    EXPECT_GT(model.in_blocks, 10'000);
+    EXPECT_GT(model.in_blocks, 4'000);
   }
 }
 
@@ -255,7 +257,7 @@ TYPED_TEST(SequenceTest, StaysTheSameWhereMemoryRunsOut) {
       SCOPED_TRACE(n);
       Model<TypeParam> model(2, by_value);
       heap_fail_at(n);
-      for (int i = 0; i < 400 && !this->HasFailure(); ++i) model.step();
+      for (int i = 0; i < 250 && !this->HasFailure(); ++i) model.step();
       failed = heap_fail_off();
     }
   }
