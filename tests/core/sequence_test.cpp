@@ -62,6 +62,17 @@ const char* broken_rule(const SequenceBlocks& blocks, KeyOf key_of) {
   return position == blocks.count ? nullptr : "count";
 }
 
+// Pieces of the pools, taken and spare: never fewer than before.
+std::int64_t pieces(const SequenceBlocks& blocks) {
+  std::int64_t all = blocks.num_groups;
+  for (const Pool* pool : {&blocks.item_pieces, &blocks.group_pieces, &blocks.key_pieces})
+    all += pool->spare;
+  for (std::int32_t g = 0; g < blocks.num_groups; ++g)
+    for (std::int32_t b = 0; b < blocks.groups[g]->count; ++b)
+      all += blocks.groups[g]->block[b].own + (blocks.groups[g]->block[b].keys != nullptr);
+  return all;
+}
+
 // A sequence, what it must hold, and a source of items. In order of value, items are inserted where a
 // search leads, else anywhere.
 template <class Key>
@@ -75,6 +86,7 @@ class Model {
     switch (const int choice = pick(100); choice) {
       case 0:
         while (!sequence_.flatten(count(), count() + pick(3))) compare();
+        pieces_ = 0;
         break;
       case 1:
       case 2:
@@ -100,6 +112,8 @@ class Model {
     if (sequence_.blocks != nullptr) {
       ASSERT_STREQ(broken_rule(*sequence_.blocks, key_of()), nullptr);
       ASSERT_EQ(sequence_.blocks->count, count());
+      ASSERT_GE(pieces(*sequence_.blocks), pieces_);
+      pieces_ = pieces(*sequence_.blocks);
       ++in_blocks;
     }
     ASSERT_TRUE(sequence_.items == nullptr || sequence_.room >= count());
@@ -109,7 +123,8 @@ class Model {
     std::fill(read.begin(), read.end(), -1);
     sequence_.copy_items(count(), read.data());
     ASSERT_EQ(read, items_);
-    ASSERT_EQ(sequence_.position_of(count(), 1 << 20), -1);
+    for (const std::int32_t unknown : {-1, static_cast<std::int32_t>(values_.size()), 1 << 20})
+      ASSERT_EQ(sequence_.position_of(count(), unknown), -1);
     if (items_.empty()) return;
     const std::int32_t some = pick(count());
     const std::int32_t item = items_[static_cast<std::size_t>(some)];
@@ -146,6 +161,12 @@ class Model {
     return by_key;
   }
 
+  // For changes at the end.
+  void expect_same_state(const Sequence& before) const {
+    EXPECT_EQ(sequence_.is_identity(), before.is_identity());
+    EXPECT_EQ(sequence_.blocks, before.blocks);
+  }
+
   SequencePlace some_place() {
     const int kind = pick(8);
     const std::int32_t position = kind == 0 ? 0 : kind < 3 ? count() : pick(count() + 1);
@@ -157,7 +178,10 @@ class Model {
     const std::int32_t item = fresh ? static_cast<std::int32_t>(values_.size()) : free_.back();
     const Key value = static_cast<Key>(pick(50) - 25);
     SequencePlace place = by_value_ ? search(value) : some_place();
+    const Sequence before = sequence_;
     while (!sequence_.make_ready_to_insert(count(), place.position, item)) compare();
+    if (place.position == count() && (!before.is_identity() || item == count()))
+      expect_same_state(before);
     if (fresh) {
       values_.push_back(value);
     } else {
@@ -174,7 +198,9 @@ class Model {
     const std::int32_t item = items_[static_cast<std::size_t>(position)];
     const SequencePlace place =
         pick(2) != 0 ? sequence_.place_of(count(), item) : SequencePlace{position};
+    const Sequence before = sequence_;
     while (!sequence_.make_ready_to_erase(count(), position)) compare();
+    if (position == count() - 1) expect_same_state(before);
     sequence_.erase(count(), place);
     items_.erase(items_.begin() + position);
     free_.push_back(item);
@@ -198,15 +224,18 @@ class Model {
     const std::int32_t position = pick(count());
     const Key value = static_cast<Key>(pick(1000));
     values_[static_cast<std::size_t>(items_[static_cast<std::size_t>(position)])] = value;
-    sequence_.blocks->set_key({position}, &value);
+    if (pick(4) != 0) return sequence_.blocks->set_key({position}, &value);
+    sequence_.blocks->drop_all_keys();
+    pieces_ = 0;
   }
 
   // From an identity, or an array that comes from elsewhere, made of a copy.
   void restart(bool identity) {
     if (pick(8) != 0) return;
+    pieces_ = 0;
     if (identity) {
       sequence_.clear();
-      items_.resize(static_cast<std::size_t>(pick(80)));
+      items_.resize(static_cast<std::size_t>(pick(2) != 0 ? pick(80) : pick(8)));
       std::iota(items_.begin(), items_.end(), 0);
       values_.resize(items_.size());
       std::iota(values_.begin(), values_.end(), Key{-30});
@@ -227,6 +256,7 @@ class Model {
   bool by_value_;
   bool growing_ = true;
   Sequence sequence_{};
+  std::int64_t pieces_ = 0;
   Items items_;
   std::vector<Key> values_;
   Items free_;
