@@ -42,7 +42,7 @@ void Pool::give_back(void* piece) noexcept {
 }
 
 bool Pool::add_chunk(std::int64_t pieces) noexcept {
-  const std::int32_t grown = std::clamp(2 * chunk_pieces, 4, kMostPieces);
+  const std::int32_t grown = std::clamp(2 * chunk_pieces, 2, kMostPieces);
   const std::int64_t wanted = std::max<std::int64_t>(pieces, grown);
   const std::int64_t bytes = wanted * piece_size;
   auto* const chunk =

@@ -219,12 +219,15 @@ class Model {
     items_.insert(items_.begin() + to, item);
   }
 
+  // In order of value, to that of the item in front.
   void change_value() {
-    if (by_value_ || items_.empty() || sequence_.blocks == nullptr) return;
-    const std::int32_t position = pick(count());
-    const Key value = static_cast<Key>(pick(1000));
-    values_[static_cast<std::size_t>(items_[static_cast<std::size_t>(position)])] = value;
-    if (pick(4) != 0) return sequence_.blocks->set_key({position}, &value);
+    if (items_.empty() || sequence_.blocks == nullptr) return;
+    const auto position = static_cast<std::size_t>(pick(count()));
+    const Key value =
+        by_value_ ? key_of()(items_[position - (position > 0)]) : static_cast<Key>(pick(1000));
+    values_[static_cast<std::size_t>(items_[position])] = value;
+    if (pick(4) != 0)
+      return sequence_.blocks->set_key({static_cast<std::int32_t>(position)}, &value);
     sequence_.blocks->drop_all_keys();
     pieces_ = 0;
   }
