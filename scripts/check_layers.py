@@ -11,7 +11,7 @@ import re
 import sys
 
 # From the bottom up; folders of one line do not know each other.
-LAYERS = [["include"], ["core/base"], ["core/io"], ["core"], ["values"], ["lists", "tables"], ["reports"],
+LAYERS = [["include"], ["core/base"], ["core/sequence"], ["core/io"], ["core"], ["values"], ["lists", "tables"], ["reports"],
           ["tools"]]
 # The tool is a customer of the interface, and asks for the two texts of a failure.
 TOOL_MAY_INCLUDE = {"include/tevpf", "core/base/error_context"}
