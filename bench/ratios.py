@@ -74,7 +74,7 @@ PEER = {
     "table read in index order": {0: 30},
     "table find indexed": {1_000: 8, 0: 4},
     "table find unindexed": {1_000: None, 0: 30},
-    "table find unindexed, last row": {1_000: None, 0: 30},
+    "table find unindexed, absent": {1_000: None, 0: 30},
     "table save": {100_000: 1.5, 1_000_000: 1.5},
     "table open": {0: 15},
     "table dump": {0: 3},
@@ -92,7 +92,7 @@ LIMIT = {
     "table read in index order": {0: 3},
     "table find indexed": {10_000: 2.5, 100_000: 2.5, 1_000_000: 2.5},
     "table find unindexed": {0: 1.5},
-    "table find unindexed, last row": {0: 1.5},
+    "table find unindexed, absent": {0: 1.5},
     "table save": {0: 1.4},
     "table save in place": {0: 1.4},
     "table open": {0: 1.5},
@@ -102,7 +102,7 @@ LIMIT = {
 # At most so many nanoseconds, or bytes, per operation.
 MOST = {
     "table find unindexed": {1_000: None, 0: 0.8},
-    "table find unindexed, last row": {1_000: None, 0: 0.8},
+    "table find unindexed, absent": {1_000: None, 0: 0.8},
     "table memory": {0: 100},
 }
 # At most so many times the time at the smallest size; for workloads that no peer does.
