@@ -201,8 +201,10 @@ const int registered = [] {
   add("table find unindexed, absent", "tevpf", scan_ours<Sought::kAbsent>);
   add("table find unindexed, absent", "sqlite", scan_sqlite<Sought::kAbsent>);
   add("table find unindexed, absent", "limit: read 8 of 48 bytes", scan_limit, kManyPasses);
-  add("table find unindexed after a change", "tevpf", scan_changing_ours);
-  add("table find unindexed after a change", "sqlite", scan_sqlite<Sought::kPresent>);
+  add("table find unindexed after a change", "tevpf", scan_changing_ours, 1,
+      {10'000, 100'000, 1'000'000});
+  add("table find unindexed after a change", "sqlite", scan_sqlite<Sought::kPresent>, 1,
+      {10'000, 100'000, 1'000'000});
   return 0;
 }();
 
