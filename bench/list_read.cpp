@@ -112,18 +112,37 @@ void change_map(benchmark::State& state) {
 }
 
 // Walking a list: one pass of each contestant.
+void walk_list() {
+  MUST(TEV8R1_PF_reset_param("list"));
+  char name[TEVPF_NAME_SIZE], value[64];
+  while (TEV8R1_PF_get_next_param("list", name, value) == PF_NORMAL) benchmark::DoNotOptimize(name);
+}
+
 class ListOfOurs {
  public:
   explicit ListOfOurs(std::int64_t n) { fill_list("list", names(n)); }
-  void walk() {
-    MUST(TEV8R1_PF_reset_param("list"));
-    char name[TEVPF_NAME_SIZE], value[64];
-    while (TEV8R1_PF_get_next_param("list", name, value) == PF_NORMAL)
-      benchmark::DoNotOptimize(name);
-  }
+  void walk() { walk_list(); }
 
  private:
   OpenFile file_;
+};
+
+// The same list, as a file brings it: its texts and its parameters lie closer together.
+class OpenedList {
+ public:
+  explicit OpenedList(std::int64_t n) {
+    const std::string path = folder().file("list.pf");
+    {
+      const ListOfOurs list(n);
+      MUST(TEV8R1_PF_save(path.c_str()));
+    }
+    MUST(TEV8R1_PF_open(path.c_str()));
+  }
+  ~OpenedList() { TEV8R1_PF_close(0); }
+  OpenedList(const OpenedList&) = delete;
+  OpenedList& operator=(const OpenedList&) = delete;
+
+  void walk() { walk_list(); }
 };
 
 class ListInSqlite {
@@ -204,6 +223,9 @@ const int registered = [] {
   add("list walk", "tevpf", walk<ListOfOurs>, kFewPasses);
   add("list walk", "sqlite", walk<ListInSqlite>, kFewPasses);
   add("list walk", "limit: vector", walk<ListAsVector>, kFewPasses);
+  add("list walk after opening", "tevpf", walk<OpenedList>, kFewPasses);
+  add("list walk after opening", "sqlite", walk<ListInSqlite>, kFewPasses);
+  add("list walk after opening", "limit: vector", walk<ListAsVector>, kFewPasses);
   add_fresh("list walk in a fresh process", "tevpf", walk_fresh<ListOfOurs>);
   add_fresh("list walk in a fresh process", "sqlite", walk_fresh<ListInSqlite>);
   add_fresh("list walk in a fresh process", "limit: vector", walk_fresh<ListAsVector>);
