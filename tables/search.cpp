@@ -1,4 +1,5 @@
 // Rows found by value, and one column's values of all rows.
+#include <algorithm>
 #include <cstring>
 
 #include "core/base/fetch.h"
@@ -22,22 +23,21 @@ constexpr std::int8_t kExact = 0;
 constexpr std::int8_t kNearest = 1;
 
 // The first position from `first` on whose row has a value equal to the key, walking in storage
-// order (order null) or through an index; `count` when there is none. At the speed of memory: one
-// typed comparison a row.
+// order (order null) or through an index; `count` when there is none. At the speed of memory.
 template <class Key>
 std::int32_t walk(const Values& values, std::int32_t count, const std::int32_t* order,
                   std::int32_t first, const Key& key) noexcept {
-  std::int32_t at = first;
   if (order == nullptr) {
-    const unsigned char* value = values.of(at);
-    for (; at < count && !key.equals(value); ++at, value += values.stride) fetch_along(value);
-    return at;
+    return find_first(first, count, key, [&](std::int32_t at) {
+      const unsigned char* const value = values.of(at);
+      fetch_along(value);
+      return value;
+    });
   }
-  for (; at < count; ++at) {
-    if (count - at > kRowsAhead) __builtin_prefetch(values.of(order[at + kRowsAhead]));
-    if (key.equals(values.of(order[at]))) break;
-  }
-  return at;
+  return find_first(first, count, key, [&](std::int32_t at) {
+    __builtin_prefetch(values.of(order[std::min(at, count - 1 - kRowsAhead) + kRowsAhead]));
+    return values.of(order[at]);
+  });
 }
 
 std::int32_t walk_along_keys(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
