@@ -1,4 +1,5 @@
 // Open files: which one is current, names, access, and saving when the disk does not play along.
+#include <dlfcn.h>
 #include <gtest/gtest.h>
 #include <sched.h>
 #include <sys/mount.h>
@@ -14,14 +15,19 @@
 #include "support/temp_file.h"
 
 namespace {
-int syncs_before_failure = -1;
+int syncs_before_failure = -1, closes_before_failure = -1;
 }
 
-// In the place of the system's, for the whole program: reports a disk that fails.
+// In the place of the system's, for the whole program: these report a disk that fails.
 extern "C" int fsync(int) {
   if (syncs_before_failure-- != 0) return 0;
   errno = EIO;
   return -1;
+}
+extern "C" int fclose(std::FILE* stream) {
+  static const auto real = reinterpret_cast<decltype(&fclose)>(dlsym(RTLD_NEXT, "fclose"));
+  const int status = real(stream);
+  return closes_before_failure-- == 0 ? EOF : status;
 }
 
 namespace {
@@ -150,6 +156,18 @@ TEST_F(FilesTest, AFailedFlushIsAFailedSave) {
   EXPECT_EQ(dir_.entries(), std::set<std::string>{"a"});
 }
 
+// Some disks say only then that they are full.
+TEST_F(FilesTest, AFailedCloseIsAFailedSave) {
+  ASSERT_EQ(open(at("a")), PF_NEWFILE);
+  for (int i = 0; i < 2; ++i) {  // a new copy, then one in its place
+    closes_before_failure = 0;
+    expect_answer(save(at("copy")), PF_OPENFAIL, {at("copy"), ""});
+  }
+  closes_before_failure = 1;  // the old stream's does not matter
+  expect_answer(TEV8R1_PF_close(1), PF_OPENFAIL, {at("a"), ""});
+  EXPECT_EQ(current(), "");
+}
+
 TEST_F(FilesTest, NamesAreLookedUpAndHaveUpTo257Characters) {
   const std::string folder = at(std::string(100, 'd'));
   const std::string longest = folder + "/" + std::string(256 - folder.size(), 'f');
@@ -173,6 +191,8 @@ TEST_F(FilesTest, NamesAreLookedUpAndHaveUpTo257Characters) {
     EXPECT_EQ(c.status == PF_OPENFAIL ? error_texts().item : current(), c.found);
     EXPECT_EQ(TEV8R1_PF_change_file("$PFDIR/a"), PF_NOFILE);
   }
+  expect_answer(TEV8R1_add_file(stdin, (longest + "f").c_str(), 0), PF_OPENFAIL,
+                {longest.substr(0, 256), ""});
   unsetenv("$PFDIR");
   unsetenv("PFDIR");
   EXPECT_EQ(TEV8R1_PF_save(nullptr), PF_NORMAL);

@@ -214,6 +214,11 @@ TEST_F(FormatTest, LiesAreRefusedOrMended) {
   mended[0xe2] = 1;
   mended[104] = 127 - 3;
   expect_opened(bytes, PF_NORMAL, kUntouched, mended);
+  bytes = example_;
+  bytes[kFirstType] = 16;
+  expect_opened(bytes, PF_BADTYPE, {"parameter", "16"}, {});
+  ASSERT_EQ(open_bytes(bytes), PF_BADTYPE);
+  EXPECT_EQ(tevpf::list_at(*current(), 0).texts.begin, nullptr) << "room for texts it has not got";
 }
 
 // The default row may be larger than any memory: every other failure of the table comes first.

@@ -98,6 +98,7 @@ TEST_F(ListRules, TableOfNamesIsNotNeeded) {
   EXPECT_EQ(many.names.slots, nullptr);
   look_up_twice();
   EXPECT_NE(many.names.slots, nullptr);
+  EXPECT_EQ(TEV8R1_inq_param_exists("list", std::string(4000, 'p').c_str()), PF_NOPARAM);
   // A full table that cannot grow is given up; the parameter is added all the same.
   ASSERT_GT(many.free_params, 0);
   tevpf::heap_fail_at(0);

@@ -24,6 +24,7 @@ TEST(Display, LinesBreakBehindWhiteSpaceOrWithinWords) {
       {"behind several blanks", 1, 10, "01   56789a", "01   \\\n>>56789a"},
       {"form feed, vertical tab", 1, 10, "01\v\f4567\xFF\xA0z", "01\v\f\\\n>>4567\xFF\xA0z"},
       {"blanks at the front only", 0, 10, "  23456789a", ">>  \\\n>>23456789a"},
+      {"one blank at the front", 1, 10, " 123456789a", " \\\n>>123456789a"},
       {"nothing but blanks", 1, 5, "      ", "   \\\n>>   "},
       {"three lines", 1, 6, "%d %s %x", "%d \\\n>>%s %x"},
       {"width below 3", 1, -7, "abcd", "a\\\n>>bcd"},

@@ -86,6 +86,28 @@ TEST_F(TableRules, RefusedDefinitionsChangeNothing) {
   EXPECT_EQ(index_entries(column(3)), nullptr);
 }
 
+TEST_F(TableRules, SizesBeyond31BitsAreRefusedBeforeAnythingChanges) {
+  define({col("n", kInt), col("name", kText, 4)});
+  TEVPF_TABLE& record = table();
+  const TEVPF_COL_DEF wide = col("name", kText, INT32_MAX), another = col("another", kText);
+  const ErrorTexts width_and_name{"2147483647", "name"};
+  record.header.btf = INT32_MAX - 5;
+  const std::string before = snapshot(true);
+  heap_fail_above(1 << 20);
+  expect_answer(redefine("name", wide), PF_BADWIDTH, width_and_name);
+  expect_answer(TEV8R1_PF_def_column("t", another), PF_NOMEM, kEmpty);
+  expect_answer(redefine("name", described(col("name", kText, 4), "about")), PF_NOMEM, kEmpty);
+  EXPECT_TRUE(snapshot(true) == before);
+  ASSERT_OK(redefine("name", described(col("name", kText, 4), "text")));
+  EXPECT_EQ(record.header.btf, INT32_MAX);
+  record.header.btf = 24;
+  record.row_wid = INT32_MAX - 6;  // where another column just does not fit
+  expect_answer(TEV8R1_PF_def_column("t", another), PF_BADWIDTH, {"6", "another"});
+  record.col_array[1].def.width = INT32_MAX;
+  expect_answer(TEV8R1_PF_move_col("t", "name", "n"), PF_BADWIDTH, width_and_name);
+  heap_fail_above(UINT64_MAX);
+}
+
 TEST_F(TableRules, FormatsAreRemadeWhereTheirWidthChangesInInteractiveMode) {
   fill();
   ASSERT_OK(TEV8R1_make_table_format(&table()));
@@ -169,11 +191,29 @@ TEST_F(TableRules, RealsWithinTheToleranceAreEqual) {
   EXPECT_EQ(TEV8R1_compare(kInt, &five, &seven, 100), kLess);
   EXPECT_EQ(TEV8R1_compare(PF_TYPE_SHORT, &plus, &minus, 100), kGreater);
   EXPECT_EQ(TEV8R1_compare(kReal, &half, &one, 0.5), PF_NORMAL);
+  EXPECT_EQ(TEV8R1_compare(kReal, &one, &half, 0.5), PF_NORMAL);
   EXPECT_EQ(TEV8R1_compare(kReal, &half, &one, -5), kLess);
   EXPECT_EQ(TEV8R1_compare(kDouble, &kNan, &kInfinity, 0), PF_NORMAL);
   EXPECT_EQ(TEV8R1_compare(kDouble, &kInfinity, &kInfinity, 0.5), PF_NORMAL);
   expect_answer(TEV8R1_compare(16, &five, &seven, 0), PF_BADTYPE, {"value", "16"});
   expect_answer(TEV8R1_compare(10, &five, &seven, 0), PF_BADTYPE, {"value", "10"});
+
+  // In every search too: with an index, without one, and through search keys.
+  define({indexed(col("with", kDouble, 8, {0, 20, 1})), col("without", kDouble, 8, {0, 20, 1})});
+  for (double n = 0; n < 13; ++n) {
+    const double row[] = {n, n};
+    ASSERT_OK(TEV8R1_PF_add_row("t", row));
+  }
+  for (const char* name : {"with", "without"}) {
+    TEV8R1_PF_define_table_search("t", std::strcmp(name, "with") == 0 ? name : nullptr);
+    for (int i = 0; i < 13 * 4; ++i) {
+      const double steps[] = {1, -1, 1.1, -1.1}, key = i / 4 + steps[i % 4] * column(0).tolerance;
+      double row[2] = {-1, -1};
+      TEV8R1_PF_reset_table("t");
+      TEV8R1_PF_get_row_by_value("t", 0, name, &key, row);
+      EXPECT_EQ(row[0], i % 4 < 2 ? i / 4 : -1) << name << key;
+    }
+  }
 }
 
 // What is not a number equals everything: the first equal one is that of the run which the probes hit.
@@ -238,6 +278,14 @@ TEST_F(TableRules, AnIndexBuiltIsOrderedExactly) {
   EXPECT_LT(TEV8R1_sort_comp(&low, &high), 0);
   EXPECT_GT(TEV8R1_sort_comp(&high, &near), 0);
   EXPECT_EQ(TEV8R1_sort_comp(&near, &one), 0);
+
+  new_table();  // texts alike in what is compared first, eight characters
+  define({col("text", kText, 20)});
+  for (const char* text :
+       {"12345678c", "12345678", "12345678b", "12345678c", "1234567", "12345678a"})
+    ASSERT_OK(add({text}));
+  ASSERT_OK(redefine("text", indexed(col("text", kText, 20))));
+  EXPECT_EQ(order(0), (std::vector{4, 1, 5, 2, 0, 3}));
 }
 
 TEST_F(TableRules, WithoutRowsAndColumns) {
