@@ -15,13 +15,13 @@
 #include "support/temp_file.h"
 
 namespace {
-int syncs_before_failure = -1, closes_before_failure = -1;
+int syncs_before_failure = -1, sync_error = EIO, closes_before_failure = -1;
 }
 
 // In the place of the system's, for the whole program: these report a disk that fails.
 extern "C" int fsync(int) {
   if (syncs_before_failure-- != 0) return 0;
-  errno = EIO;
+  errno = sync_error;
   return -1;
 }
 extern "C" int fclose(std::FILE* stream) {
@@ -152,6 +152,8 @@ TEST_F(FilesTest, AFailedFlushIsAFailedSave) {
     EXPECT_EQ(read_file(at("a")).size(), syncs == 0 ? 120u : 240u);
   }
   ASSERT_EQ(add_list("L3"), PF_NORMAL);
+  syncs_before_failure = 0;
+  sync_error = EINVAL;  // a file system that has nothing to flush
   expect_saved(at("a"), 3);
   EXPECT_EQ(dir_.entries(), std::set<std::string>{"a"});
 }
