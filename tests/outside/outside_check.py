@@ -14,6 +14,10 @@ import tempfile
 
 NORMAL, NOMORE = 0x09608009, 0x0960801B
 INT, REAL, STRING, DOUBLE, SHORT = 11, 12, 13, 14, 15
+ALIGN = {INT: 4, REAL: 4, STRING: 1, DOUBLE: 8, SHORT: 2}
+PACK = {INT: "i", REAL: "f", DOUBLE: "d", SHORT: "h"}
+PARAM_NUMBERS = ("prec", "value", "max", "min")
+COLUMN_NUMBERS = ("max", "min", "prec")
 
 
 def text(value, size):
@@ -25,19 +29,20 @@ def text(value, size):
 # ---- the bytes, from the layout alone ------------------------------------------------------------
 
 
+def numbers(fields, entry):
+    """The numbers of a parameter or column, in this order both in the file and in the interface's records."""
+    fields = [field for field in fields if field in entry]
+    codes = ("i" if field == "prec" else PACK[entry["type"]] for field in fields)
+    return struct.pack("<" + "".join(codes), *(entry[field] for field in fields))
+
+
 def stored_param(p):
     kind, desc = p["type"], p.get("desc")
-    if kind == INT:
-        part = struct.pack("<iii", p["value"], p["max"], p["min"])
-    elif kind == SHORT:
-        part = struct.pack("<hhh", p["value"], p["max"], p["min"])
-    elif kind == REAL:
-        part = struct.pack("<ifff", p["prec"], p["value"], p["max"], p["min"])
-    elif kind == DOUBLE:
-        part = struct.pack("<iddd", p["prec"], p["value"], p["max"], p["min"])
-    else:
+    if kind == STRING:
         raw = p["value"].encode("latin-1")
         part = struct.pack("<i", len(raw)) + raw + b"\0"
+    else:
+        part = numbers(PARAM_NUMBERS, p)
     size = 44 + len(part)
     loc = 0 if desc is None else 1 if kind == STRING else size - 8
     head = bytes(7) + struct.pack("<bi", loc, kind) + text(p["name"], 20) + text(p["units"], 8) + bytes(4)
@@ -52,10 +57,6 @@ def stored_list(name, desc, reserved, params):
     body = struct.pack("<i", len(params)) + reserved + b"".join(map(stored_param, params))
     order = sorted(range(len(params)), key=lambda i: params[i]["name"].encode("latin-1"))
     return element(1, name, desc, body, struct.pack(f"<{len(order)}i", *order))
-
-
-ALIGN = {INT: 4, REAL: 4, STRING: 1, DOUBLE: 8, SHORT: 2}
-PACK = {INT: "<i", REAL: "<f", DOUBLE: "<d", SHORT: "<h"}
 
 
 def value_size(col):
@@ -76,12 +77,7 @@ def lay_out(cols):
 
 def stored_column(col, offset):
     kind, desc = col["type"], col.get("desc")
-    if kind == STRING:
-        part = b""
-    elif kind in (REAL, DOUBLE):
-        part = struct.pack("<ffi" if kind == REAL else "<ddi", col["max"], col["min"], col["prec"])
-    else:
-        part = struct.pack(PACK[kind], col["max"]) + struct.pack(PACK[kind], col["min"])
+    part = b"" if kind == STRING else numbers(COLUMN_NUMBERS, col)
     flag = 0 if desc is None else 48 + len(part) - 41
     head = struct.pack("<i", offset) + col.get("reserved", bytes(4)) + struct.pack("<i", kind) + text(col["name"], 20) + text(col["units"], 8)
     head += struct.pack("<bbbbi", flag, col.get("spare", 0), col["idx"], col["unq"], col["width"])
@@ -89,7 +85,7 @@ def stored_column(col, offset):
 
 
 def cell(col, value):
-    return text(value, col["width"] + 1) if col["type"] == STRING else struct.pack(PACK[col["type"]], value)
+    return text(value, col["width"] + 1) if col["type"] == STRING else struct.pack("<" + PACK[col["type"]], value)
 
 
 def stored_table(name, desc, reserved, dsp_wid, cols, rows):
@@ -113,59 +109,9 @@ def stored_table(name, desc, reserved, dsp_wid, cols, rows):
 # ---- the same through the C interface ------------------------------------------------------------
 
 
-class Num(c.Union):
-    class I32(c.Structure):
-        _fields_ = [("value", c.c_int32), ("max", c.c_int32), ("min", c.c_int32)]
-
-    class I16(c.Structure):
-        _fields_ = [("value", c.c_int16), ("max", c.c_int16), ("min", c.c_int16)]
-
-    class F32(c.Structure):
-        _fields_ = [("prec", c.c_int32), ("value", c.c_float), ("max", c.c_float), ("min", c.c_float)]
-
-    class F64(c.Structure):
-        _pack_ = 4
-        _fields_ = [("prec", c.c_int32), ("value", c.c_double), ("max", c.c_double), ("min", c.c_double)]
-
-    class Str(c.Structure):
-        _pack_ = 4
-        _fields_ = [("length", c.c_int32), ("value", c.c_void_p)]
-
-    _pack_ = 4
-    _fields_ = [("i32", I32), ("i16", I16), ("f32", F32), ("f64", F64), ("str", Str)]
-
-
-class ParamDef(c.Structure):
-    _pack_ = 4
-    _fields_ = [("type", c.c_int32), ("name", c.c_char * 20), ("units", c.c_char * 8), ("description", c.c_void_p), ("part", Num)]
-
-
-class Limits(c.Union):
-    class I32(c.Structure):
-        _fields_ = [("max", c.c_int32), ("min", c.c_int32)]
-
-    class I16(c.Structure):
-        _fields_ = [("max", c.c_int16), ("min", c.c_int16)]
-
-    class F32(c.Structure):
-        _fields_ = [("max", c.c_float), ("min", c.c_float), ("prec", c.c_int32)]
-
-    class F64(c.Structure):
-        _pack_ = 4
-        _fields_ = [("max", c.c_double), ("min", c.c_double), ("prec", c.c_int32)]
-
-    _pack_ = 4
-    _fields_ = [("i32", I32), ("i16", I16), ("f32", F32), ("f64", F64)]
-
-
-class ColDef(c.Structure):
-    _pack_ = 4
-    _fields_ = [("description", c.c_void_p), ("spare", c.c_uint32), ("type", c.c_int32), ("name", c.c_char * 20), ("units", c.c_char * 8)]
-    _fields_ += [(f, c.c_int8) for f in ("desc_byte", "spare_byte", "idx_flag", "unq_flag")]
-    _fields_ += [("width", c.c_int32), ("limits", Limits)]
-
-
-MEMBER = {INT: "i32", REAL: "f32", DOUBLE: "f64", SHORT: "i16"}
+# Records as they lie in the caller's memory, packed to four bytes: what stands in front of the numbers.
+PARAM_RECORD, PARAM_RECORD_SIZE = "<i20s8sQ", 68
+COLUMN_RECORD, COLUMN_RECORD_SIZE = "<QIi20s8s4bi", 72
 lib = None
 
 
@@ -185,23 +131,22 @@ def check_list(name, params):
     for want in params:
         kind, vsize, dsize = c.c_int32(), c.c_int32(), c.c_int32()
         call("PF_inq_next_param_size", name, c.byref(kind), c.byref(vsize), c.byref(dsize))
-        value, desc, got = c.create_string_buffer(vsize.value), c.create_string_buffer(dsize.value), ParamDef()
-        got.description = c.addressof(desc)
+        value, desc = c.create_string_buffer(vsize.value), c.create_string_buffer(dsize.value)
+        record, part = c.create_string_buffer(PARAM_RECORD_SIZE), struct.calcsize(PARAM_RECORD)
+        struct.pack_into("<Q", record, part - 8, c.addressof(desc))
         if kind.value == STRING:
-            got.part.str.value = c.addressof(value)
-        call("PF_get_next_param_def", name, c.byref(got))
-        same((got.type, got.name, got.units), (want["type"], want["name"].encode("latin-1"), want["units"].encode()), name)
+            struct.pack_into("<Q", record, part + 4, c.addressof(value))
+        call("PF_get_next_param_def", name, record)
+        got = struct.unpack_from(PARAM_RECORD, record)
+        same(got, (want["type"], text(want["name"], 20), text(want["units"], 8), c.addressof(desc)), name)
         same(desc.value, (want.get("desc") or "").encode("latin-1"), want["name"])
+        expected = struct.pack("<i", len(want["value"])) if want["type"] == STRING else numbers(PARAM_NUMBERS, want)
+        same(record.raw[part : part + len(expected)], expected, want["name"])
         if want["type"] == STRING:
-            same((value.value, got.part.str.length), (want["value"].encode("latin-1"), len(want["value"])), want["name"])
-        else:
-            part = getattr(got.part, MEMBER[want["type"]])
-            fields = ("value", "max", "min") + (("prec",) if "prec" in want else ())
-            same([getattr(part, f) for f in fields], [want[f] for f in fields], want["name"])
-        position = c.c_int32()
-        call("inq_param_pos", name, want["name"], c.byref(position))
-        same(position.value, params.index(want), want["name"])
-    call("PF_get_next_param_def", name, c.byref(ParamDef()), expect=NOMORE)
+            same(value.value, want["value"].encode("latin-1"), want["name"])
+        call("inq_param_pos", name, want["name"], c.byref(kind))
+        same(kind.value, params.index(want), want["name"])
+    call("PF_get_next_param_def", name, c.create_string_buffer(PARAM_RECORD_SIZE), expect=NOMORE)
 
 
 def check_table(name, cols, rows):
@@ -210,15 +155,14 @@ def check_table(name, cols, rows):
     offsets, width = lay_out(cols)
     same([i.value for i in info[:3]], [len(cols), len(rows), width], name)
     for i, want in enumerate(cols):
-        got = ColDef()
-        call("PF_inq_col_def_by_pos", name, i, c.byref(got))
-        flags = (got.type, got.name, got.units, got.idx_flag, got.unq_flag, got.width, got.desc_byte)
-        same(flags, (want["type"], want["name"].encode(), want["units"].encode(), want["idx"], want["unq"], want["width"], 0), name)
-        same(c.string_at(got.description) if got.description else None, want["desc"].encode() if "desc" in want else None, name)
-        if want["type"] != STRING:
-            part = getattr(got.limits, MEMBER[want["type"]])
-            fields = ("max", "min") + (("prec",) if "prec" in want else ())
-            same([getattr(part, f) for f in fields], [want[f] for f in fields], want["name"])
+        record, part = c.create_string_buffer(COLUMN_RECORD_SIZE), struct.calcsize(COLUMN_RECORD)
+        call("PF_inq_col_def_by_pos", name, i, record)
+        desc, _, *got = struct.unpack_from(COLUMN_RECORD, record)
+        fields = [want["type"], text(want["name"], 20), text(want["units"], 8)]
+        same(got, fields + [0, want.get("spare", 0), want["idx"], want["unq"], want["width"]], name)
+        same(c.string_at(desc) if desc else None, want["desc"].encode() if "desc" in want else None, name)
+        expected = b"" if want["type"] == STRING else numbers(COLUMN_NUMBERS, want)
+        same(record.raw[part : part + len(expected)], expected, want["name"])
     buffer = c.create_string_buffer(width)
     for order in [None] + [col["name"] for col in cols if col["idx"]]:
         call("PF_define_table_search", name, order)
