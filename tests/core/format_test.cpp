@@ -281,20 +281,16 @@ TEST_F(FormatTest, HalfAFileIsWholeElements) {
 }
 
 TEST(ArrayTest, GrowsBehindWhatItHolds) {
-  const std::int32_t zeroes[3] = {}, counted[3] = {5, 7, 9}, shifted[3] = {5, 5, 7};
-  void* array = nullptr;
-  void* first_new = nullptr;
-  ASSERT_EQ(TEV8R1_allocate_elem(0, 3, 4, &array, &first_new), PF_NORMAL);
-  EXPECT_EQ(first_new, array);
-  EXPECT_EQ(std::memcmp(array, zeroes, sizeof zeroes), 0);
-  std::memcpy(array, counted, sizeof counted);
-  EXPECT_EQ(TEV8R1_allocate_elem(3, -4, 4, &array, &first_new), PF_NOMEM);
-  ASSERT_EQ(TEV8R1_allocate_elem(3, 1000, 4, &array, &first_new), PF_NORMAL);
-  auto* const numbers = static_cast<std::int32_t*>(array);
-  EXPECT_EQ(first_new, numbers + 3);
-  EXPECT_EQ(std::memcmp(array, counted, sizeof counted), 0);
-  EXPECT_EQ(TEV8R1_memcpy(8, numbers, numbers + 1), PF_NORMAL);
-  EXPECT_EQ(std::memcmp(array, shifted, sizeof shifted), 0);
+  void *array = nullptr, *first_new = nullptr;
+  ASSERT_EQ(TEV8R1_allocate_elem(0, 8, 1, &array, &first_new), PF_NORMAL);
+  char* const before = static_cast<char*>(array);
+  EXPECT_EQ(std::string(before, 8), std::string(8, '\0'));
+  std::strcpy(before, "abcdefg");
+  EXPECT_EQ(TEV8R1_memcpy(5, before, before + 2), PF_NORMAL);
+  EXPECT_EQ(TEV8R1_allocate_elem(8, -9, 1, &array, &first_new), PF_NOMEM);
+  ASSERT_EQ(TEV8R1_allocate_elem(8, 100'000, 1, &array, &first_new), PF_NORMAL);
+  EXPECT_EQ(first_new, static_cast<char*>(array) + 8);
+  EXPECT_STREQ(static_cast<char*>(array), "ababcde");
   std::free(array);
 }
 
