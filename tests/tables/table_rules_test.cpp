@@ -61,7 +61,7 @@ TEST_F(TableRules, RefusedDefinitionsChangeNothing) {
       {nullptr, col("x", kReal, 0, {1, 1, -2}), PF_BADPREC, {"-2", "x"}},
       {nullptr, col("x", kInt, 0), PF_BADWIDTH, {"0", "x"}},
       {nullptr, col("x", kText, INT32_MAX), PF_BADWIDTH, {"2147483647", "x"}},
-      {nullptr, col("x", kText, INT32_MAX - 19), PF_BADWIDTH, {"2147483628", "x"}},  // by one byte
+      {nullptr, col("x", kText, INT32_MAX - 23), PF_BADWIDTH, {"2147483624", "x"}},  // by a byte
       {"x", col("n", kInt), PF_NOCOLUMN, {"x", ""}},
       {"n", col(" m", kText), PF_BADNAME, kEmpty},
       {"n", col("r", kText), PF_DUPLICATE, {"column r", "table t"}},
