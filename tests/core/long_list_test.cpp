@@ -24,13 +24,6 @@ std::vector<Def> long_list() {
 
 class LongListTest : public TempFileTest {
  protected:
-  static void make_list(const std::vector<Def>& all) {
-    ASSERT_EQ(TEV8R1_PF_create_elem("long", "", PF_ELEM_LIST), PF_NORMAL);
-    for (const Def& def : all) {
-      const TEVPF_PARAM_DEF c = to_c(def);
-      ASSERT_EQ(TEV8R1_PF_add_param("long", &c, PF_END_POS), PF_NORMAL);
-    }
-  }
   void expect_list(const std::vector<Def>& expected) {
     const TEVPF_LIST& found = list("long");
     ASSERT_EQ(broken_rule(found), nullptr) << broken_rule(found);
@@ -43,7 +36,7 @@ class LongListTest : public TempFileTest {
 
 TEST_F(LongListTest, OpensAndChangesLikeAnyOther) {
   std::vector<Def> all = long_list();
-  make_list(all);
+  make_list("long", "", all);
   save_and_reopen();
   expect_list(all);
   const std::string image = read_file(path_);
@@ -83,7 +76,7 @@ TEST_F(LongListTest, OpensAndChangesLikeAnyOther) {
 // With a table as long behind it, from a stream that does not say how long it is.
 TEST_F(LongListTest, ComesThroughAPipe) {
   const std::vector<Def> all = long_list();
-  make_list(all);
+  make_list("long", "", all);
   ASSERT_EQ(TEV8R1_PF_create_elem("rows", "", PF_ELEM_TABLE), PF_NORMAL);
   const TEVPF_COL_DEF column = tevpf::indexed(tevpf::col("i", PF_TYPE_INT, 6, {0, 1e6}));
   ASSERT_EQ(TEV8R1_PF_def_column("rows", column), PF_NORMAL);

@@ -1,5 +1,6 @@
 // Reports of whole files, lists and tables; larger ones are held against files of golden/.
 #include <filesystem>
+#include <functional>
 
 #include "reports/list_dump.h"
 #include "reports/row_text.h"
@@ -25,14 +26,6 @@ class Reports : public TableTest {
     unsetenv("TEV8R1_debug");
     TEV8R1_PF_init();
     std::filesystem::current_path(std::filesystem::temp_directory_path());
-  }
-
-  static void new_list(const char* name, const char* description, const std::vector<Def>& params) {
-    ASSERT_OK(TEV8R1_PF_create_elem(name, description, PF_ELEM_LIST));
-    for (const Def& def : params) {
-      const TEVPF_PARAM_DEF c = to_c(def);
-      ASSERT_OK(TEV8R1_PF_add_param(name, &c, PF_END_POS)) << def.name;
-    }
   }
 
   static void add_rows(const std::vector<std::vector<const char*>>& rows) {
@@ -82,27 +75,27 @@ Def text(const char* name, const std::string& value, std::optional<std::string> 
 }
 
 TEST_F(Reports, AFileWithAllKindsOfLists) {
-  new_list("TEVPF_FILE_HEADER", "about the file",
-           {text("Author", "100% engineered"),
-            text("Notes", std::string(91, 'a')),
-            {PF_TYPE_INT, "Revision", "", {}, 7, 9, 0},
-            {PF_TYPE_REAL, "Scale", "", {}, 0.25, 1, 0, 1}});
-  new_list("Empty", "nothing in it", {});
-  new_list("Plain", "100%s",
-           {{PF_TYPE_INT, "count", "pcs", {}, 42},
-            {PF_TYPE_SHORT, "level", "", {}, -5, 32767, -32768},
-            {PF_TYPE_REAL, "pi", "rad", {}, 3.14159, 12345.6, 0, 3},
-            {PF_TYPE_DOUBLE, "far", "", {}, 1e-7, 1e300, -1e300},
-            text("tabbed", "a\tb\n"),
-            text("blank", "ends "),
-            text("empty", "")});
-  new_list("Described", "",
-           {text("eleven", "1234567890\t", "fits"),
-            text("twelve", "123456789012", "moves"),
-            text("silent", "x"),
-            text("long", std::string(66, 'v'), std::string(60, 'd'), "m"),
-            {PF_TYPE_INT, "n%d", "%s", "50% of\t%s", INT32_MIN, INT32_MAX, INT32_MIN},
-            {PF_TYPE_DOUBLE, "half", "", {}, 0.5, 1, 0, 1200}});
+  make_list("TEVPF_FILE_HEADER", "about the file",
+            {text("Author", "100% engineered"),
+             text("Notes", std::string(91, 'a')),
+             {PF_TYPE_INT, "Revision", "", {}, 7, 9, 0},
+             {PF_TYPE_REAL, "Scale", "", {}, 0.25, 1, 0, 1}});
+  make_list("Empty", "nothing in it", {});
+  make_list("Plain", "100%s",
+            {{PF_TYPE_INT, "count", "pcs", {}, 42},
+             {PF_TYPE_SHORT, "level", "", {}, -5, 32767, -32768},
+             {PF_TYPE_REAL, "pi", "rad", {}, 3.14159, 12345.6, 0, 3},
+             {PF_TYPE_DOUBLE, "far", "", {}, 1e-7, 1e300, -1e300},
+             text("tabbed", "a\tb\n"),
+             text("blank", "ends "),
+             text("empty", "")});
+  make_list("Described", "",
+            {text("eleven", "1234567890\t", "fits"),
+             text("twelve", "123456789012", "moves"),
+             text("silent", "x"),
+             text("long", std::string(66, 'v'), std::string(60, 'd'), "m"),
+             {PF_TYPE_INT, "n%d", "%s", "50% of\t%s", INT32_MIN, INT32_MAX, INT32_MIN},
+             {PF_TYPE_DOUBLE, "half", "", {}, 0.5, 1, 0, 1200}});
   ASSERT_OK(TEV8R1_PF_create_elem("TEVPF_FILE_HEADER", "only a name", PF_ELEM_TABLE));
   ASSERT_OK(TEV8R1_PF_delete_table("t"));
   ASSERT_OK(TEV8R1_PF_dump_file("out.txt"));
@@ -130,21 +123,24 @@ TEST_F(Reports, RefusalsAndWhatTheyLeave) {
       return TEV8R1_PF_print_table(table, path, 1, count, names, 0, 1);
     };
   };
-  const auto expect_refused = [](auto report, TEVPF_STATUS status, const ErrorTexts& texts) {
+  const struct {
+    std::function<TEVPF_STATUS(const char*)> report;
+    TEVPF_STATUS status;
+    ErrorTexts texts;
+  } cases[] = {
+      {[](auto* path) { return TEV8R1_PF_dump_list("No", path); }, PF_NOELEM, {"list", "No"}},
+      {[](auto* path) { return TEV8R1_PF_dump_table("No", path); }, PF_NOELEM, {"table", "No"}},
+      {listing_of("No", 2), PF_NOELEM, {"table", "No"}},
+      {listing_of("t", 2), PF_NOCOLUMN, {"nowhere", ""}},
+      {listing_of("t", 0), PF_BADARG, {"0", ""}},
+      {listing_of("t", -3), PF_BADARG, {"-3", ""}}};
+  set_error_texts();
+  for (const auto& [report, status, texts] : cases) {
     expect_answer(report("no/folder"), PF_OPENFAIL, {"no/folder", ""});
     write_file("out.txt", "old");
     expect_answer(report("out.txt"), status, texts);
     EXPECT_EQ(read_file("out.txt"), "");
-  };
-  set_error_texts();
-  expect_refused([](auto* path) { return TEV8R1_PF_dump_list("No", path); }, PF_NOELEM,
-                 {"list", "No"});
-  expect_refused([](auto* path) { return TEV8R1_PF_dump_table("No", path); }, PF_NOELEM,
-                 {"table", "No"});
-  expect_refused(listing_of("No", 2), PF_NOELEM, {"table", "No"});
-  expect_refused(listing_of("t", 2), PF_NOCOLUMN, {"nowhere", ""});
-  expect_refused(listing_of("t", 0), PF_BADARG, {"0", ""});
-  expect_refused(listing_of("t", -3), PF_BADARG, {"-3", ""});
+  }
 }
 
 TEST_F(Reports, ATableOfMixedColumnsInStorageOrder) {
@@ -174,10 +170,10 @@ TEST_F(Reports, AColumnAddedBetweenDumpsIsFormatted) {
 TEST_F(Reports, DebugOutputShowsInnerFields) {
   setenv("TEV8R1_debug", "", 1);
   EXPECT_EQ(TEV8R1_PF_init(), PF_INITDONE);
-  new_list("Tiny", "three",
-           {{PF_TYPE_INT, "c", "", "text", 5, 9, 1},
-            {PF_TYPE_INT, "a", "", {}, 2, 9, 1},
-            text("b", "v", "d")});
+  make_list("Tiny", "three",
+            {{PF_TYPE_INT, "c", "", "text", 5, 9, 1},
+             {PF_TYPE_INT, "a", "", {}, 2, 9, 1},
+             text("b", "v", "d")});
   define({col("a", kDouble, 5, {1, 9, 2}), indexed(described(col("b", kInt, 5, {1, 9}), "key"))});
   add_rows({{"2", "9"}, {"3", "4"}, {"4", "5"}});
   const auto address = [](const void* of) {

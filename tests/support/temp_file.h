@@ -9,9 +9,11 @@
 #include <iterator>
 #include <set>
 #include <string>
+#include <vector>
 
 #include "lists/directory.h"
 #include "support/error_texts.h"
+#include "support/param_def.h"
 #include "support/state.h"
 #include "tables/directory.h"
 
@@ -84,6 +86,13 @@ class TempFileTest : public LibraryTest {
     ASSERT_EQ(TEV8R1_PF_open(path_.c_str()), PF_NORMAL);
   }
 
+  static void make_list(const char* name, const char* description, const std::vector<Def>& params) {
+    ASSERT_EQ(TEV8R1_PF_create_elem(name, description, PF_ELEM_LIST), PF_NORMAL);
+    for (const Def& def : params) {
+      const TEVPF_PARAM_DEF c = to_c(def);
+      ASSERT_EQ(TEV8R1_PF_add_param(name, &c, PF_END_POS), PF_NORMAL) << def.name;
+    }
+  }
   static TEVPF_LIST& list(const std::string& name) {
     TEVPF_LIST* found = nullptr;
     EXPECT_EQ(TEV8R1_get_list_ptr(name.c_str(), &found), PF_NORMAL);
