@@ -13,7 +13,7 @@
 #include "lists/directory.h"
 #include "support/error_texts.h"
 #include "support/state.h"
-#include "tables/directory.h"
+#include "tables/settle.h"
 
 // A folder that goes away with the test.
 class TempDir {
