@@ -10,6 +10,7 @@
 #include "reports/segments.h"
 #include "tables/column_index.h"
 #include "tables/directory.h"
+#include "tables/settle.h"
 #include "tables/row_store.h"
 
 namespace tevpf {
@@ -95,6 +96,7 @@ void write_table_head(TextOut& out, const TEVPF_TABLE& table, std::int32_t colum
 void write_data_heading(TextOut& out) noexcept { out.print("!\n\n.    \t\t\t\tTABLE DATA\n\n"); }
 
 TEVPF_STATUS write_table(TextOut& out, TEVPF_TABLE& table) noexcept {
+  if (!settle(table)) return fail_empty(PF_NOMEM);
   ensure_formats(table);
   write_table_head(out, table, table.num_cols, table.num_rows);
   if (library.debug_value != nullptr) write_debug_fields(out, table);

@@ -11,6 +11,7 @@
 #include "tables/column_record.h"
 #include "tables/cursor.h"
 #include "tables/directory.h"
+#include "tables/settle.h"
 #include "tables/row_store.h"
 
 namespace tevpf {
@@ -32,7 +33,7 @@ struct Request {
     char name[TEVPF_NAME_SIZE] = {};
     std::memcpy(name, request.names[n], strnlen(request.names[n], sizeof name - 1));
     TEVPF_COLUMN* column = nullptr;
-    PF_TRY(TEV8R1_get_col_ptr(&table, name, &column));
+    PF_TRY(find_column(table, name, column));
     rows.take(*column);
   }
   return PF_NORMAL;
@@ -69,7 +70,7 @@ TEVPF_STATUS write_rows(TextOut& out, const TEVPF_TABLE& table, const Request& r
   out.print('\n');
   for (std::int32_t pos = request.first; pos <= request.last; ++pos) {
     fetch_ahead(table, pos);
-    rows.write_row(row_at(table, row_at_position(table, pos)));
+    rows.write_row(row_at(table, traversal_of(table).at(pos)));
     segments.write_row(out, rows.line());
   }
   return rows.count() > 0 ? conversion_status(rows.column(rows.count() - 1)) : PF_NORMAL;
@@ -78,6 +79,7 @@ TEVPF_STATUS write_rows(TextOut& out, const TEVPF_TABLE& table, const Request& r
 TEVPF_STATUS write_listing(TextOut& out, TEVPF_TABLE& table, Request request) noexcept {
   request.first = std::max(request.first, 0);
   if (request.last >= table.num_rows) request.last = table.num_rows - 1;
+  if (!settle(table)) return fail_empty(PF_NOMEM);
   RowText rows;
   PF_TRY(take_columns(table, request, rows));
   ensure_formats(table);

@@ -6,6 +6,7 @@
 #include <utility>
 
 #include "core/base/status.h"
+#include "core/sequence/sequence_search.h"
 #include "tables/row_order.h"
 #include "tables/row_store.h"
 #include "tables/search_keys.h"
@@ -14,9 +15,11 @@
 namespace tevpf {
 namespace {
 
-// The values of a column in the order of its index, from some position on: through the index to the
-// rows, or side by side.
-struct ValuesByRow {
+// ---- Places -------------------------------------------------------------------------------------
+
+// The values that a search probes, by position: of a bare array of entries, side by side, or of a column's
+// index.
+struct ValuesOfEntries {
   Values values;
   const std::int32_t* entries;
 
@@ -35,71 +38,66 @@ struct ValuesInLine {
   ValuesInLine from(std::int32_t position) const noexcept { return {at(position)}; }
 };
 
+struct ValuesOfIndex {
+  Values values;
+  const Sequence& index;
+
+  const unsigned char* at(std::int32_t position) const noexcept {
+    return values.of(index.at(position));
+  }
+};
+
+ValuesOfIndex entries_of(const TEVPF_TABLE& table, const TEVPF_COLUMN& column) noexcept {
+  return {values_of(table, column), column.index};
+}
+
+template <class At>
+struct ValuesFrom {
+  At at;
+};
+
+// The same as if the entry at a position were not there.
+template <class Some>
+struct WithoutOne {
+  const Some& values;
+  std::int32_t without;
+
+  const unsigned char* at(std::int32_t position) const noexcept {
+    return values.at(position < without ? position : position + 1);
+  }
+};
+
+struct Found {
+  std::int32_t position;
+  bool equal;
+};
+
 // ---- Searching ----------------------------------------------------------------------------------
 
-// Integers: the first entry that is not less. Their order is total, so the answer is that of the
-// probes below. Three probes a step, which wait for memory together, quarter what is left; no
-// branch depends on a value.
-template <class Values, class T>
-TEVPF_STATUS search_entries(const Values& values, std::int32_t count, const NumberKey<T>& key,
-                            std::int32_t& pos) noexcept requires(!kIsFloating<T>) {
+// Integers and texts are totally ordered: the first entry that is not less than the key.
+template <class Some, class Key>
+Found search_entries(const Some& values, std::int32_t count, const Key& key) noexcept
+    requires(Key::kTotalOrder) {
+  std::int32_t position = count;
   // Behind all of them: rows that come in the order of their values.
-  if (key.is_above(values.at(count - 1))) {
-    pos = count;
-    return PF_NOTFOUND;
+  if (!key.is_above(values.at(count - 1))) {
+    position = count_less(count, [&](std::int32_t at) { return key.is_above(values.at(at)); });
   }
-  std::int32_t first = 0;  // the answer is one of `length` entries from there on, or behind them
-  std::int32_t length = count;
-  const auto less = [&](std::int32_t place) {
-    return static_cast<std::int32_t>(key.is_above(values.at(first + place - 1)));
-  };
-  while (length >= 4) {
-    const std::int32_t quarter = length / 4;
-    first += quarter * (less(quarter) + less(2 * quarter) + less(3 * quarter));
-    length -= 3 * quarter;
-  }
-  std::int32_t behind = 0;
-  for (std::int32_t place = 1; place <= length; ++place) behind += less(place);
-  first += behind;
-  pos = first;
-  return pos < count && key.equals(values.at(pos)) ? PF_NORMAL : PF_NOTFOUND;
+  return {position, position < count && key.equals(values.at(position))};
 }
 
-// Steps back over equal entries to the first of them; the entry in front of `low` is less.
-template <class Values, class Key>
-std::int32_t first_equal(const Values& values, std::int32_t low, std::int32_t found,
-                         const Key& key) noexcept {
-  while (found > low && key.equals(values.at(found - 1))) --found;
-  return found;
-}
-
-// Equal texts stand together, however many match a pattern: the first of them is found by halving.
-template <class Values, bool kWide>
-std::int32_t first_equal(const Values& values, std::int32_t low, std::int32_t found,
-                         const TextKey<kWide>& key) noexcept {
-  while (low < found) {
-    const std::int32_t middle = low + (found - low) / 2;
-    if (key.equals(values.at(middle))) {
-      found = middle;
-    } else {
-      low = middle + 1;
-    }
-  }
-  return found;
-}
-
-// Reals, doubles and texts: these probes and no others, because equality within a tolerance chains
-// and what is not a number equals everything.
-template <class Values, class Key>
-TEVPF_STATUS search_entries(const Values& values, std::int32_t count, const Key& key,
-                            std::int32_t& pos) noexcept {
+// Reals and doubles: these probes and no others, because equality within a tolerance chains and what is
+// not a number equals everything.
+template <class Some, class Key>
+Found search_entries(const Some& values, std::int32_t count, const Key& key) noexcept {
   std::int32_t low = 0, high = count - 1;
   while (low <= high) {
-    const std::int32_t middle = low + (high - low) / 2;
+    std::int32_t middle = low + (high - low) / 2;
     const int answer = key.compare(values.at(middle));
     if (answer == 0) {
-      pos = first_equal(values, low, middle, key);
-      return PF_NORMAL;
+      // Back to the first equal one; the entry in front of `low` is less.
+      while (middle > low && key.equals(values.at(middle - 1))) --middle;
+      return {middle, true};
     }
     if (answer < 0) {
       low = middle + 1;
@@ -107,8 +105,44 @@ TEVPF_STATUS search_entries(const Values& values, std::int32_t count, const Key&
       high = middle - 1;
     }
   }
-  pos = low;
-  return PF_NOTFOUND;
+  return {low, false};
+}
+
+// A totally ordered column whose index is in blocks: along the keys that the blocks keep of integers.
+template <class Key>
+IndexPlace search_blocks(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
+                         const Key& key) noexcept {
+  const Values values = values_of(table, column);
+  SequencePlace place;
+  if constexpr (Key::kIsNumber) {
+    using T = typename Key::Number;
+    place = search_keys(
+        column.index, table.num_rows, [&](std::int32_t slot) { return load<T>(values.of(slot)); },
+        [&](T value, std::int32_t) { return key.is_above(value); });
+  } else {
+    place = search_items(column.index, table.num_rows,
+                         [&](std::int32_t slot) { return key.is_above(values.of(slot)); });
+  }
+  const bool found =
+      place.position < table.num_rows && key.equals(values.of(column.index.at(place.position)));
+  return {place, found};
+}
+
+// Among all entries. Positions of reals in blocks are looked up probe by probe.
+template <class Key>
+IndexPlace search_all(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
+                      const Key& key) noexcept {
+  if constexpr (Key::kTotalOrder) {
+    if (column.index.blocks != nullptr) return search_blocks(table, column, key);
+  }
+  Found found;
+  if (column.index.items != nullptr) {  // the usual case, without a look at the state at each probe
+    const ValuesOfEntries values{values_of(table, column), column.index.items};
+    found = search_entries(values, table.num_rows, key);
+  } else {
+    found = search_entries(entries_of(table, column), table.num_rows, key);
+  }
+  return {{found.position}, found.equal};
 }
 
 // ---- Searching along search keys ----------------------------------------------------------------
@@ -117,24 +151,36 @@ TEVPF_STATUS search_entries(const Values& values, std::int32_t count, const Key&
 constexpr std::int64_t kRowsPerSearch = 256;
 
 // Integers from position `first` on: along the fences of all, then among the few values that they lead
-// to. Whoever searches wants the row, so the index entries that belong to these are asked for at once.
+// to. Whoever searches wants the row, so the entries of these are prefetched.
 template <class T>
-TEVPF_STATUS search_along_fences(const ValuesInLine<T>& values, std::int32_t first,
-                                 std::int32_t count, const std::int32_t* entries,
-                                 const NumberKey<T>& key, std::int32_t& pos) noexcept {
-  std::int32_t fence = 0, place = 0;
-  (void)search_entries(values.from(count), fence_count(count), key, fence);
+Found search_along_fences(const ValuesInLine<T>& values, std::int32_t first, std::int32_t count,
+                          const std::int32_t* entries, const NumberKey<T>& key) noexcept {
+  const std::int32_t fences = fence_count(count);
+  const std::int32_t fence =
+      fences == 0 ? 0 : search_entries(values.from(count), fences, key).position;
   const std::int32_t start = fence * kFenceStep;
+  std::int32_t found = start;
   if (start < count) {
     __builtin_prefetch(entries + start);
-    (void)search_entries(values.from(start), std::min(kFenceStep, count - start), key, place);
+    found += search_entries(values.from(start), std::min(kFenceStep, count - start), key).position;
   }
-  const std::int32_t found = std::max(first, start + place);
-  pos = found - first;
-  return found < count && key.equals(values.at(found)) ? PF_NORMAL : PF_NOTFOUND;
+  found = std::max(first, found);
+  return {found, found < count && key.equals(values.at(found))};
 }
 
-// What TEV8R1_sort_comp compares: the column whose index was built last.
+template <class T>
+Found search_along_keys(const unsigned char* keys, std::int32_t first, std::int32_t count,
+                        const std::int32_t* entries, const NumberKey<T>& key) noexcept {
+  const ValuesInLine<T> values{keys};
+  if constexpr (kIsFloating<T>) {
+    const Found found = search_entries(values.from(first), count - first, key);
+    return {first + found.position, found.equal};
+  } else {
+    return search_along_fences(values, first, count, entries, key);
+  }
+}
+
+// What TEV8R1_sort_comp compares: the column whose index was made last.
 struct SortContext {
   Values values;
   std::int32_t type;
@@ -159,18 +205,6 @@ bool make_block(std::int64_t used, std::int64_t room, NewIndex& out) noexcept {
 
 void fill_identity(std::int32_t* entries, std::int32_t count) noexcept {
   for (std::int32_t i = 0; i < count; ++i) entries[i] = i;
-}
-
-bool reserve_entries(TEVPF_COLUMN& column, std::int64_t needed) noexcept {
-  if (column.index_room >= needed && column.idx_ptr != nullptr) return true;
-  constexpr std::int64_t most = std::numeric_limits<std::int32_t>::max();
-  if (needed > most) return false;
-  const std::int64_t room = std::min(grown_room(column.index_room, needed), most);
-  void* const block = heap_resize(column.idx_ptr, static_cast<std::uint64_t>(room), 4);
-  if (block == nullptr) return false;
-  column.idx_ptr = static_cast<std::int32_t*>(block);
-  column.index_room = static_cast<std::int32_t>(room);
-  return true;
 }
 
 // ---- Passes over entries, written so that the compiler makes vectors of them --------------------
@@ -226,8 +260,9 @@ bool some_neighbours(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
   });
 }
 
-void move_entries(std::int32_t* to, const std::int32_t* from, std::int32_t count) noexcept {
-  std::memmove(to, from, static_cast<std::size_t>(count) * sizeof *to);
+// The value as the key that blocks keep of it; null for texts, of which they keep none.
+const void* key_of_value(const TEVPF_COLUMN& column, const void* value) noexcept {
+  return column.def.type == PF_TYPE_STRING ? nullptr : value;
 }
 
 }  // namespace
@@ -240,6 +275,10 @@ bool build_index(const TEVPF_TABLE& table, const TEVPF_COLUMN& column, std::int6
   return !out.entries || sort_rows(table, column, out.entries.get());
 }
 
+void sort_from_now_on(const TEVPF_TABLE& table, const TEVPF_COLUMN& column) noexcept {
+  sort_context = {values_of(table, column), column.def.type, column.tolerance};
+}
+
 bool make_identity_index(std::int32_t count, std::int64_t room, NewIndex& out) noexcept {
   if (!make_block(count, room, out)) return false;
   if (out.entries) fill_identity(out.entries.get(), count);
@@ -248,18 +287,19 @@ bool make_identity_index(std::int32_t count, std::int64_t room, NewIndex& out) n
 
 bool copy_index(const TEVPF_COLUMN& column, std::int32_t count, NewIndex& out) noexcept {
   if (!make_block(count, count, out)) return false;
-  if (out.entries) move_entries(out.entries.get(), column.idx_ptr, count);
+  if (out.entries) column.index.copy_items(count, out.entries.get());
   return true;
 }
 
 void adopt_index(TEVPF_COLUMN& column, NewIndex index) noexcept {
   drop_search_keys(column);
-  heap_free(column.idx_ptr);
-  column.idx_ptr = index.entries.release();
-  column.index_room = index.room;
+  column.index.adopt(std::move(index.entries), index.room);
 }
 
-void release_index(TEVPF_COLUMN& column) noexcept { adopt_index(column, NewIndex{}); }
+void release_index(TEVPF_COLUMN& column) noexcept {
+  drop_search_keys(column);
+  column.index.clear();
+}
 
 bool is_index_in_order(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
                        double tolerance) noexcept {
@@ -273,104 +313,117 @@ bool has_equal_neighbours(const TEVPF_TABLE& table, const std::int32_t* entries,
                          [](int order) { return order == 0; });
 }
 
-bool reserve_index_entries(TEVPF_TABLE& table, std::int32_t rows) noexcept {
-  const std::int64_t needed = std::int64_t{table.num_rows} + rows;
-  for (std::int32_t i = 0; i < table.num_cols; ++i) {
-    TEVPF_COLUMN& column = table.col_array[i];
-    if (is_indexed(column) && !reserve_entries(column, needed)) return false;
+// ---- Searching ----------------------------------------------------------------------------------
+
+IndexPlace search_index(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
+                        const void* key) noexcept {
+  if (table.num_rows < 1) return {{0}, false};
+  return with_key(column.def.type, column.tolerance, key, readable_bytes(table, column),
+                  [&](const auto& prepared) { return search_all(table, column, prepared); });
+}
+
+IndexPlace search_others(const TEVPF_TABLE& table, const TEVPF_COLUMN& column, std::int32_t without,
+                         const void* key) noexcept {
+  const std::int32_t others = table.num_rows - 1;
+  if (others < 1) return {{0}, false};
+  return with_key(column.def.type, column.tolerance, key, readable_bytes(table, column),
+                  [&](const auto& prepared) -> IndexPlace {
+                    const ValuesOfIndex all = entries_of(table, column);
+                    const WithoutOne<ValuesOfIndex> values{all, without};
+                    if constexpr (prepared.kTotalOrder) {
+                      const IndexPlace whole = search_all(table, column, prepared);
+                      const std::int32_t at =
+                          whole.place.position - (without < whole.place.position ? 1 : 0);
+                      return {{at}, at < others && prepared.equals(values.at(at))};
+                    } else {
+                      const Found found = search_entries(values, others, prepared);
+                      return {{found.position}, found.equal};
+                    }
+                  });
+}
+
+IndexPlace find_in_index(const TEVPF_TABLE& table, TEVPF_COLUMN& column, std::int32_t first,
+                         const void* key) noexcept {
+  const std::int32_t count = table.num_rows;
+  const std::int32_t* const entries = column.index.items;
+  if (entries != nullptr && column.def.type != PF_TYPE_STRING) {
+    count_search(column, kRowsPerSearch);
+    if (const unsigned char* const keys = search_keys(table, column, entries)) {
+      return with_number(column.def.type, [&](auto tag) -> IndexPlace {
+        const NumberKey<decltype(tag)> prepared(key, column.tolerance);
+        const Found found = search_along_keys(keys, first, count, entries, prepared);
+        return {{found.position}, found.equal};
+      });
+    }
   }
-  return true;
+  return with_key(column.def.type, column.tolerance, key, readable_bytes(table, column),
+                  [&](const auto& prepared) -> IndexPlace {
+                    const ValuesOfIndex values = entries_of(table, column);
+                    if constexpr (prepared.kTotalOrder) {
+                      const IndexPlace whole = search_all(table, column, prepared);
+                      if (whole.place.position >= first) return whole;
+                      return {{first}, prepared.equals(values.at(first))};
+                    } else {
+                      const auto from = [&](std::int32_t at) { return values.at(first + at); };
+                      const Found found = search_entries(ValuesFrom{from}, count - first, prepared);
+                      return {{first + found.position}, found.equal};
+                    }
+                  });
+}
+
+// An entry stands among those of equal value, mostly near the first of them. Where many are equal, or
+// values have drifted within the tolerance, the sequence finds it.
+SequencePlace entry_of(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
+                       std::int32_t slot) noexcept {
+  constexpr std::int32_t kNear = 16;
+  const void* const value = values_of(table, column).of(slot);
+  const IndexPlace first = search_index(table, column, value);
+  if (first.found) {
+    const std::int32_t at = first.place.position;
+    if (column.index.at(at) == slot) return first.place;
+    const std::int32_t end = std::min(table.num_rows, at + kNear);
+    for (std::int32_t next = at + 1; next < end; ++next) {
+      if (column.index.at(next) == slot) return column.index.place_at(next);
+    }
+  }
+  return column.index.place_of(table.num_rows, slot);
 }
 
 // ---- Entries ------------------------------------------------------------------------------------
 
-TEVPF_STATUS search_index(const TEVPF_TABLE& table, const TEVPF_COLUMN& column, std::int32_t first,
-                          std::int32_t count, const void* key, std::int32_t& pos) noexcept {
-  pos = 0;
-  if (count < 1) return PF_NOTFOUND;
-  const ValuesByRow values{values_of(table, column), column.idx_ptr + first};
-  return with_key(
-      column.def.type, column.tolerance, key, readable_bytes(table, column),
-      [&](const auto& prepared) { return search_entries(values, count, prepared, pos); });
+void insert_entry(const TEVPF_TABLE& table, TEVPF_COLUMN& column, SequencePlace place,
+                  std::int32_t slot, const void* value) noexcept {
+  column.index.insert(table.num_rows, place, slot, key_of_value(column, value));
 }
 
-TEVPF_STATUS find_in_index(const TEVPF_TABLE& table, TEVPF_COLUMN& column, std::int32_t first,
-                           std::int32_t count, const void* key, std::int32_t& pos) noexcept {
-  if (column.def.type == PF_TYPE_STRING) return search_index(table, column, first, count, key, pos);
-  pos = 0;
-  if (count < 1) return PF_NOTFOUND;
-  count_search(column, kRowsPerSearch);
-  const unsigned char* const keys = search_keys(table, column, column.idx_ptr);
-  if (keys == nullptr) return search_index(table, column, first, count, key, pos);
-  return with_number(column.def.type, [&](auto tag) {
-    using T = decltype(tag);
-    const ValuesInLine<T> values{keys};
-    const NumberKey<T> prepared(key, column.tolerance);
-    if constexpr (kIsFloating<T>) {
-      return search_entries(values.from(first), count, prepared, pos);
-    } else {
-      return search_along_fences(values, first, first + count, column.idx_ptr, prepared, pos);
-    }
-  });
+void erase_entry(const TEVPF_TABLE& table, TEVPF_COLUMN& column, SequencePlace place) noexcept {
+  column.index.erase(table.num_rows, place);
+  if (table.num_rows == 1) column.index.clear();
 }
 
-void renumber_for_insertion(TEVPF_TABLE& table, std::int32_t row_number) noexcept {
-  for (std::int32_t i = 0; i < table.num_cols; ++i) {
-    if (!is_indexed(table.col_array[i])) continue;
-    std::int32_t* const entries = table.col_array[i].idx_ptr;
-    for (std::int32_t k = 0; k < table.num_rows; ++k)
-      entries[k] += entries[k] >= row_number ? 1 : 0;
-  }
-}
-
-void insert_entry(TEVPF_COLUMN& column, std::int32_t count, std::int32_t position,
-                  std::int32_t row_number) noexcept {
-  std::int32_t* const place = column.idx_ptr + position;
-  move_entries(place + 1, place, count - position);
-  *place = row_number;
-}
-
-void remove_row_from_indexes(TEVPF_TABLE& table, std::int32_t row_number,
-                             std::int32_t* positions) noexcept {
-  for (std::int32_t i = 0; i < table.num_cols; ++i) {
-    if (!is_indexed(table.col_array[i])) continue;
-    const std::int32_t position =
-        remove_row(table.col_array[i].idx_ptr, table.num_rows, row_number);
-    if (positions != nullptr) positions[i] = position;
-  }
-}
-
-void move_entry(const TEVPF_TABLE& table, TEVPF_COLUMN& column, std::int32_t row_number,
+void move_entry(TEVPF_COLUMN& column, std::int32_t from, std::int32_t to,
                 const void* value) noexcept {
-  const std::int32_t count = table.num_rows;
-  const unsigned char* const stored = values_of(table, column).of(row_number);
-  std::int32_t first = 0;
-  if (search_index(table, column, 0, count, stored, first) != PF_NORMAL) first = 0;
-  const NumberKey<std::int32_t> entry(&row_number, 0);
-  std::int32_t position = find_in_line(column.idx_ptr, count, first, entry);
-  // Values that drifted within the tolerance can stand where their search does not lead.
-  if (position == count) position = find_in_line(column.idx_ptr, first, 0, entry);
+  column.index.move(from, to, key_of_value(column, value));
+}
 
-  std::int32_t* const place = column.idx_ptr + position;
-  move_entries(place, place + 1, count - 1 - position);
-  std::int32_t target = 0;
-  (void)search_index(table, column, 0, count - 1, value, target);
-  insert_entry(column, count - 1, target, row_number);
+void note_value(const TEVPF_TABLE& table, TEVPF_COLUMN& column, std::int32_t slot,
+                const void* value) noexcept {
+  SequenceBlocks* const blocks = column.index.blocks;
+  if (blocks == nullptr || blocks->key_size == 0) return;
+  blocks->set_key(entry_of(table, column, slot), value);
+}
+
+void forget_values(TEVPF_TABLE& table) noexcept {
+  for (std::int32_t i = 0; i < table.num_cols; ++i) {
+    TEVPF_COLUMN& column = table.col_array[i];
+    drop_search_keys(column);
+    if (column.index.blocks != nullptr) column.index.blocks->drop_all_keys();
+  }
 }
 
 }  // namespace tevpf
 
 using namespace tevpf;
-
-TEVPF_STATUS TEV8R1_create_index(TEVPF_TABLE* table, TEVPF_COLUMN* column) noexcept {
-  const std::int64_t room = std::int64_t{table->num_rows} + table->free_rows;
-  if (room < 1) return PF_NORMAL;
-  sort_context = {values_of(*table, *column), column->def.type, column->tolerance};
-  NewIndex index;
-  if (!build_index(*table, *column, room, index)) return fail_empty(PF_NOMEM);
-  adopt_index(*column, std::move(index));
-  return PF_NORMAL;
-}
 
 int32_t TEV8R1_sort_comp(const void* a, const void* b) noexcept {
   const Values& values = sort_context.values;
@@ -387,9 +440,11 @@ TEVPF_STATUS TEV8R1_binary_search(int32_t type, double tolerance, int32_t count,
     return PF_NOTFOUND;
   }
   if (!is_value_type(type)) return PF_CMPFAIL;
-  const ValuesByRow values{{static_cast<const unsigned char*>(column_base), row_wid}, index};
-  return with_key(type, tolerance, key, 0, [&](const auto& prepared) {
-    return search_entries(values, count, prepared, *pos_out);
+  const ValuesOfEntries values{{static_cast<const unsigned char*>(column_base), row_wid}, index};
+  return with_key(type, tolerance, key, 0, [&](const auto& prepared) -> TEVPF_STATUS {
+    const Found found = search_entries(values, count, prepared);
+    *pos_out = found.position;
+    return found.equal ? PF_NORMAL : PF_NOTFOUND;
   });
 }
 

@@ -37,6 +37,17 @@ void terminate_texts(TEVPF_COL_DEF& definition) noexcept {
   terminate_field(definition.units);
 }
 
+TEVPF_STATUS find_column(const TEVPF_TABLE& table, const char* name,
+                         TEVPF_COLUMN*& column) noexcept {
+  for (std::int32_t i = 0; i < table.num_cols; ++i) {
+    if (std::strcmp(table.col_array[i].def.name, name) == 0) {
+      column = &table.col_array[i];
+      return PF_NORMAL;
+    }
+  }
+  return fail(PF_NOCOLUMN, name);
+}
+
 double tolerance_of(const TEVPF_COL_DEF& definition) noexcept {
   if (!is_floating_type(definition.type)) return 0.0;
   const std::int32_t precision = definition.type == PF_TYPE_REAL ? definition.limits.f32.precision
@@ -143,15 +154,4 @@ TEVPF_STATUS TEV8R1_check_unique_column(const TEVPF_TABLE* table, const char* na
     }
   }
   return PF_NORMAL;
-}
-
-TEVPF_STATUS TEV8R1_get_col_ptr(const TEVPF_TABLE* table, const char* name,
-                                TEVPF_COLUMN** column_out) noexcept {
-  for (std::int32_t i = 0; i < table->num_cols; ++i) {
-    if (std::strcmp(table->col_array[i].def.name, name) == 0) {
-      *column_out = &table->col_array[i];
-      return PF_NORMAL;
-    }
-  }
-  return fail(PF_NOCOLUMN, name);
 }

@@ -22,17 +22,17 @@ TEVPF_API TEVPF_STATUS TEV8R1_validate_col_def(const TEVPF_TABLE* table,
 // PF_DUPLICATE when a column of the table has this name.
 TEVPF_API TEVPF_STATUS TEV8R1_check_unique_column(const TEVPF_TABLE* table,
                                                   const char* name) noexcept;
-
-// Finds a column by its exact name.
-//   PF_NOCOLUMN  texts: the name, empty
-TEVPF_API TEVPF_STATUS TEV8R1_get_col_ptr(const TEVPF_TABLE* table, const char* name,
-                                          TEVPF_COLUMN** column_out) noexcept;
 }
 
 namespace tevpf {
 
 // What every column takes in the file before its limits.
 inline constexpr std::int32_t kColumnHead = 48;
+
+// Finds a column by its exact name.
+//   PF_NOCOLUMN  texts: the name, empty
+[[nodiscard]] TEVPF_STATUS find_column(const TEVPF_TABLE& table, const char* name,
+                                       TEVPF_COLUMN*& column) noexcept;
 
 // Names and units from a caller or a file end within their fields.
 void terminate_texts(TEVPF_COL_DEF& definition) noexcept;

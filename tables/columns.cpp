@@ -16,6 +16,7 @@
 #include "tables/formats.h"
 #include "tables/layout.h"
 #include "tables/row_store.h"
+#include "tables/settle.h"
 #include "values/value_type.h"
 
 namespace tevpf {
@@ -253,6 +254,7 @@ using namespace tevpf;
 TEVPF_STATUS TEV8R1_adjust_data(TEVPF_TABLE* table, std::int32_t size, std::int32_t offset,
                                 std::int32_t pad, const TEVPF_COL_DEF* definition) noexcept {
   if (table->num_rows == 0) return PF_NORMAL;
+  if (!settle(*table)) return fail_empty(PF_NOMEM);
   const std::int64_t new_wid = std::int64_t{table->row_wid} + pad + size;
   if (!reserve_rows(*table, 0, new_wid)) return fail_empty(PF_NOMEM);
   unsigned char value[8];
@@ -263,7 +265,7 @@ TEVPF_STATUS TEV8R1_adjust_data(TEVPF_TABLE* table, std::int32_t size, std::int3
 
 TEVPF_STATUS TEV8R1_PF_def_column(const char* table_name, TEVPF_COL_DEF definition) noexcept {
   TEVPF_TABLE* table = nullptr;
-  PF_TRY(find_table(table_name, table));
+  PF_TRY(find_settled_table(table_name, table));
   terminate_texts(definition);
   PF_TRY(TEV8R1_validate_col_def(table, definition));
 
@@ -277,8 +279,8 @@ TEVPF_STATUS TEV8R1_PF_def_column(const char* table_name, TEVPF_COL_DEF definiti
 TEVPF_STATUS TEV8R1_PF_delete_col(const char* table_name, const char* column_name) noexcept {
   TEVPF_TABLE* table = nullptr;
   TEVPF_COLUMN* column = nullptr;
-  PF_TRY(find_table(table_name, table));
-  PF_TRY(TEV8R1_get_col_ptr(table, column_name, &column));
+  PF_TRY(find_settled_table(table_name, table));
+  PF_TRY(find_column(*table, column_name, column));
 
   const auto runs = new_array<Run>(static_cast<std::uint64_t>(table->num_cols));
   if (!runs || !ensure_default_row(*table)) return fail_empty(PF_NOMEM);
@@ -305,9 +307,9 @@ TEVPF_STATUS TEV8R1_PF_move_col(const char* table_name, const char* column_name,
                                 const char* before_name) noexcept {
   TEVPF_TABLE* table = nullptr;
   TEVPF_COLUMN *column = nullptr, *before = nullptr;
-  PF_TRY(find_table(table_name, table));
-  PF_TRY(TEV8R1_get_col_ptr(table, column_name, &column));
-  if (before_name != nullptr) PF_TRY(TEV8R1_get_col_ptr(table, before_name, &before));
+  PF_TRY(find_settled_table(table_name, table));
+  PF_TRY(find_column(*table, column_name, column));
+  if (before_name != nullptr) PF_TRY(find_column(*table, before_name, before));
   if (table->num_cols < 2) return PF_NORMAL;
 
   // In front of a later column the moved one's own place closes up.

@@ -19,9 +19,12 @@ TEVPF_API TEVPF_STATUS TEV8R1_check_column_values(const TEVPF_TABLE* table, std:
                                                   TEVPF_COL_DEF definition,
                                                   double tolerance) noexcept;
 
-// PF_NOTUNIQUE when two neighbours of the column's index hold equal values.
-TEVPF_API TEVPF_STATUS TEV8R1_check_unique_values(const TEVPF_TABLE* table,
-                                                  const TEVPF_COLUMN* column) noexcept;
+// PF_NOTUNIQUE when two neighbours of the column's index hold equal values; PF_NOMEM.
+TEVPF_API TEVPF_STATUS TEV8R1_check_unique_values(TEVPF_TABLE* table,
+                                                  TEVPF_COLUMN* column) noexcept;
+
+// Builds the column's index from the rows; without row slots there is none. PF_NOMEM.
+TEVPF_API TEVPF_STATUS TEV8R1_create_index(TEVPF_TABLE* table, TEVPF_COLUMN* column) noexcept;
 }
 
 namespace tevpf {

@@ -2,14 +2,10 @@
 
 #include "core/base/status.h"
 #include "tables/directory.h"
-#include "tables/search_keys.h"
+#include "tables/settle.h"
 
 namespace tevpf {
 namespace {
-
-bool has_position(const TEVPF_TABLE& table, std::int32_t position) noexcept {
-  return position >= 0 && position < table.num_rows;
-}
 
 inline TEVPF_STATUS step(TEVPF_TABLE& table, void* row_out) noexcept {
   if (!has_position(table, table.next_row)) return PF_NOMORE;
@@ -25,25 +21,33 @@ inline TEVPF_STATUS step(TEVPF_TABLE& table, void* row_out) noexcept {
 }
 
 }  // namespace
+
+std::int32_t slot_in_blocks(TEVPF_TABLE& table, std::int32_t position) noexcept {
+  count_reads(table, 1);  // may settle the table
+  return traversal_of(table).at(position);
+}
+
 }  // namespace tevpf
 
 using namespace tevpf;
 
+// The row can be written through the pointers that these two hand out.
+
 TEVPF_STATUS TEV8R1_get_next_row_ptr(TEVPF_TABLE* table, void** row_ptr_out,
                                      int32_t* row_number_out) noexcept {
-  drop_search_keys(*table);  // the row can be written through the pointer
+  forget_values(*table);
   const bool exists = has_position(*table, table->next_row);
-  *row_number_out = exists ? row_at_position(*table, table->next_row) : table->next_row;
-  *row_ptr_out = exists ? row_at(*table, *row_number_out) : nullptr;
+  *row_number_out = exists ? row_number_at(*table, table->next_row) : table->next_row;
+  *row_ptr_out = exists ? row_at(*table, traversal_of(*table).at(table->next_row)) : nullptr;
   return PF_NORMAL;
 }
 
 TEVPF_STATUS TEV8R1_get_cur_row_ptr(TEVPF_TABLE* table, void** row_ptr_out,
                                     int32_t* row_number_out) noexcept {
   if (!has_position(*table, table->cur_row)) return fail_empty(PF_NOCURROW);
-  drop_search_keys(*table);
-  *row_number_out = row_at_position(*table, table->cur_row);
-  *row_ptr_out = row_at(*table, *row_number_out);
+  forget_values(*table);
+  *row_number_out = row_number_at(*table, table->cur_row);
+  *row_ptr_out = row_at(*table, traversal_of(*table).at(table->cur_row));
   return PF_NORMAL;
 }
 
@@ -73,5 +77,5 @@ TEVPF_STATUS TEV8R1_PF_reset_table(const char* table_name) noexcept {
 int32_t TEV8R1_convert_row(const char* table_name, int32_t pos) noexcept {
   TEVPF_TABLE* table;
   if (find_table(table_name, table) != PF_NORMAL) return -1;
-  return has_position(*table, pos) ? row_at_position(*table, pos) : pos;
+  return has_position(*table, pos) ? row_number_at(*table, pos) : pos;
 }

@@ -24,22 +24,44 @@ TEVPF_API TEVPF_STATUS TEV8R1_get_cur_row_ptr(TEVPF_TABLE* table, void** row_ptr
 
 namespace tevpf {
 
-// How many positions ahead rows are fetched into the cache while they are read in search order.
+inline bool has_position(const TEVPF_TABLE& table, std::int32_t position) noexcept {
+  return position >= 0 && position < table.num_rows;
+}
+
+// The row number at a position of the traversal.
+inline std::int32_t row_number_at(const TEVPF_TABLE& table, std::int32_t position) noexcept {
+  const Sequence& traversal = traversal_of(table);
+  if (&traversal == &table.slots.order) return position;
+  return row_number_of(table, traversal.at(position));
+}
+
+// How many positions ahead rows are prefetched while they are read in another order than they lie in.
 inline constexpr std::int32_t kRowsAhead = 12;
 
-// In search order rows lie anywhere: ask for one some positions ahead, so that it is there in time.
-// As a function of its own it would have no effect that the compiler knows of, and be left out.
+// Prefetches a row some positions ahead. As a function of its own it would have no effect that the compiler
+// knows of, and be left out.
 [[gnu::always_inline]] inline void fetch_ahead(const TEVPF_TABLE& table,
                                                std::int32_t position) noexcept {
-  if (table.cur_col == nullptr || table.num_rows - position <= kRowsAhead) return;
-  const unsigned char* const row = row_at(table, row_at_position(table, position + kRowsAhead));
+  const Sequence& traversal = traversal_of(table);
+  if (traversal.items == nullptr || table.num_rows - position <= kRowsAhead) return;
+  const unsigned char* const row = row_at(table, traversal.items[position + kRowsAhead]);
   __builtin_prefetch(row);
   __builtin_prefetch(row + table.row_wid - 1);
 }
 
+// The slot at a position in blocks; counts the read. Out of line, so that the usual case stays short.
+std::int32_t slot_in_blocks(TEVPF_TABLE& table, std::int32_t position) noexcept;
+
+// The slot at a position, for reading the row there.
+inline std::int32_t read_slot(TEVPF_TABLE& table, std::int32_t position) noexcept {
+  const Sequence& traversal = traversal_of(table);
+  if (traversal.items != nullptr) return traversal.items[position];
+  return traversal.blocks == nullptr ? position : slot_in_blocks(table, position);
+}
+
 // Copies the row at a position to row_out and makes it the current one.
 inline void deliver_row(TEVPF_TABLE& table, std::int32_t position, void* row_out) noexcept {
-  const unsigned char* const row = row_at(table, row_at_position(table, position));
+  const unsigned char* const row = row_at(table, read_slot(table, position));
   table.cur_row = position;
   table.next_row = position + 1;
   copy_short(row_out, row, table.row_wid);

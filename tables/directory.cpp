@@ -15,10 +15,6 @@ TEVPF_STATUS find_table(const char* name, TEVPF_TABLE*& table) noexcept {
 
 using namespace tevpf;
 
-TEVPF_STATUS TEV8R1_get_table_ptr(const char* name, TEVPF_TABLE** table_out) noexcept {
-  return find_table(name, *table_out);
-}
-
 TEVPF_STATUS TEV8R1_get_table_array_pos(const TEVPF_TABLE* table, std::int32_t* pos_out) noexcept {
   return element_position(PF_ELEM_TABLE, reinterpret_cast<const TEVPF_ELEM_HEADER*>(table),
                           *pos_out);

@@ -6,11 +6,6 @@
 
 extern "C" {
 
-// Find a table by its exact name.
-//   PF_NOFILE  no file is current; texts empty
-//   PF_NOELEM  no such table; texts: "table", the name
-TEVPF_API TEVPF_STATUS TEV8R1_get_table_ptr(const char* name, TEVPF_TABLE** table_out) noexcept;
-
 TEVPF_API TEVPF_STATUS TEV8R1_get_table_array_pos(const TEVPF_TABLE* table,
                                                   std::int32_t* pos_out) noexcept;
 TEVPF_API TEVPF_STATUS TEV8R1_create_table(TEVPF_ELEM_HEADER header,
@@ -33,7 +28,9 @@ inline TEVPF_TABLE* last_table(const char* name) noexcept {
   return as_table(last_element(PF_ELEM_TABLE, name));
 }
 
-// Finds a table as TEV8R1_get_table_ptr does.
+// Finds a table of the current file by its exact name, in whatever state it is.
+//   PF_NOFILE  no file is current; texts empty
+//   PF_NOELEM  no such table; texts: "table", the name
 [[nodiscard]] TEVPF_STATUS find_table(const char* name, TEVPF_TABLE*& table) noexcept;
 
 // The table at a position of the directory.

@@ -36,7 +36,7 @@ TEVPF_STATUS TEV8R1_PF_inq_col_def(const char* table_name, const char* column_na
   TEVPF_TABLE* table = nullptr;
   TEVPF_COLUMN* column = nullptr;
   PF_TRY(find_table(table_name, table));
-  PF_TRY(TEV8R1_get_col_ptr(table, column_name, &column));
+  PF_TRY(find_column(*table, column_name, column));
   return copy_definition(column->def, *def_out);
 }
 
@@ -53,7 +53,7 @@ TEVPF_STATUS TEV8R1_get_col_type(const char* table_name, const char* column_name
   TEVPF_TABLE* table = nullptr;
   TEVPF_COLUMN* column = nullptr;
   PF_TRY(find_table(table_name, table));
-  PF_TRY(TEV8R1_get_col_ptr(table, column_name, &column));
+  PF_TRY(find_column(*table, column_name, column));
   *type_out = column->def.type;
   return PF_NORMAL;
 }

@@ -14,6 +14,7 @@
 #include "tables/formats.h"
 #include "tables/layout.h"
 #include "tables/row_store.h"
+#include "tables/settle.h"
 #include "values/compare.h"
 #include "values/value_text.h"
 #include "values/value_type.h"
@@ -152,7 +153,7 @@ TEVPF_STATUS TEV8R1_check_column_values(const TEVPF_TABLE* table, std::int32_t o
     using T = decltype(tag);
     const T min = limits_of<T>(definition).min, max = limits_of<T>(definition).max;
     for (std::int32_t i = 0; i < table->num_rows; ++i) {
-      const T value = load<T>(row_at(*table, i) + offset);
+      const T value = load<T>(row_at(*table, slot_of(*table, i)) + offset);
       if (compare_numbers(value, max, tolerance) > 0 ||
           compare_numbers(value, min, tolerance) < 0) {
         return fail(PF_RANGE, number_text(value));
@@ -162,20 +163,12 @@ TEVPF_STATUS TEV8R1_check_column_values(const TEVPF_TABLE* table, std::int32_t o
   });
 }
 
-TEVPF_STATUS TEV8R1_check_unique_values(const TEVPF_TABLE* table,
-                                        const TEVPF_COLUMN* column) noexcept {
-  const std::int32_t* entries = index_entries(*column);
-  if (table->num_rows < 2 || entries == nullptr) return PF_NORMAL;
-  if (has_equal_neighbours(*table, entries, *column)) return fail_empty(PF_NOTUNIQUE);
-  return PF_NORMAL;
-}
-
 TEVPF_STATUS TEV8R1_PF_modify_col_def(const char* table_name, const char* column_name,
                                       TEVPF_COL_DEF definition) noexcept {
   TEVPF_TABLE* table = nullptr;
   TEVPF_COLUMN* column = nullptr;
-  PF_TRY(find_table(table_name, table));
-  PF_TRY(TEV8R1_get_col_ptr(table, column_name, &column));
+  PF_TRY(find_settled_table(table_name, table));
+  PF_TRY(find_column(*table, column_name, column));
   terminate_texts(definition);
   std::int64_t row_wid = 0;
   PF_TRY(check_redefinition(*table, *column, definition, row_wid));

@@ -32,7 +32,7 @@ TEVPF_STATUS TEV8R1_validate_row_value(const char* table_name, const char* colum
   TEVPF_TABLE* table;
   TEVPF_COLUMN* column;
   PF_TRY(find_table(table_name, table));
-  PF_TRY(TEV8R1_get_col_ptr(table, column_name, &column));
+  PF_TRY(find_column(*table, column_name, column));
   return TEV8R1_validate_value(table, column, value);
 }
 

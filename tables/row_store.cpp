@@ -4,6 +4,7 @@
 #include <cstring>
 #include <type_traits>
 
+#include "core/base/short_copy.h"
 #include "tables/layout.h"
 #include "values/value_type.h"
 
@@ -36,25 +37,51 @@ bool reserve_rows(TEVPF_TABLE& table, std::int64_t spare) noexcept {
 
 bool reserve_rows(TEVPF_TABLE& table, std::int64_t spare, std::int64_t row_wid) noexcept {
   const std::int64_t needed = (table.num_rows + spare) * row_wid;
-  if (table.row_data != nullptr && needed <= table.row_room) return true;
-  const std::int64_t room = grown_room(table.row_room, needed);
+  std::int64_t& bytes = table.slots.bytes;
+  if (table.row_data != nullptr && needed <= bytes) return true;
+  const std::int64_t room = grown_room(bytes, needed);
   void* block = heap_resize(table.row_data, static_cast<std::uint64_t>(room), 1);
   if (block == nullptr) return false;
   table.row_data = static_cast<unsigned char*>(block);
-  table.row_room = room;
+  bytes = room;
   return true;
 }
 
-void open_row_gap(TEVPF_TABLE& table, std::int32_t row) noexcept {
-  std::memmove(
-      row_at(table, row + std::int64_t{1}), row_at(table, row),
-      static_cast<std::size_t>(table.num_rows - row) * static_cast<std::size_t>(table.row_wid));
+bool ready_to_insert_row(TEVPF_TABLE& table, std::int32_t row_number) noexcept {
+  return table.slots.order.make_ready_to_insert(table.num_rows, row_number, next_slot(table));
 }
 
-void close_row_gap(TEVPF_TABLE& table, std::int32_t row) noexcept {
-  std::memmove(
-      row_at(table, row), row_at(table, row + std::int64_t{1}),
-      static_cast<std::size_t>(table.num_rows - row - 1) * static_cast<std::size_t>(table.row_wid));
+bool ready_to_erase_row(TEVPF_TABLE& table, std::int32_t row_number) noexcept {
+  RowSlots& slots = table.slots;
+  if (!slots.order.make_ready_to_erase(table.num_rows, row_number)) return false;
+  if (slots.order.is_identity() || slots.num_free < slots.free_room) return true;
+  const std::int64_t room = grown_room(slots.free_room, std::int64_t{slots.num_free} + 16);
+  void* const block = heap_resize(slots.free, static_cast<std::uint64_t>(room), sizeof *slots.free);
+  if (block == nullptr) return false;
+  slots.free = static_cast<std::int32_t*>(block);
+  slots.free_room = static_cast<std::int32_t>(std::min<std::int64_t>(room, INT32_MAX));
+  return true;
+}
+
+void insert_row(TEVPF_TABLE& table, std::int32_t row_number, const void* row) noexcept {
+  RowSlots& slots = table.slots;
+  const std::int32_t slot = next_slot(table);
+  if (slots.num_free > 0) --slots.num_free;
+  slots.order.insert(table.num_rows, slots.order.place_at(row_number), slot);
+  if (table.row_wid > 0) {
+    std::memmove(row_at(table, slot), row, static_cast<std::size_t>(table.row_wid));
+  }
+}
+
+void erase_row(TEVPF_TABLE& table, std::int32_t row_number) noexcept {
+  RowSlots& slots = table.slots;
+  // The last row of an identity: the slot behind the rows is the next one anyway.
+  if (slots.order.is_identity()) return;
+  slots.free[slots.num_free++] = slot_of(table, row_number);
+  slots.order.erase(table.num_rows, slots.order.place_at(row_number));
+  if (table.num_rows > 1) return;
+  slots.order.clear();
+  slots.num_free = 0;
 }
 
 void end_texts(const TEVPF_TABLE& table, unsigned char* rows, std::int64_t count) noexcept {
@@ -67,28 +94,50 @@ void end_texts(const TEVPF_TABLE& table, unsigned char* rows, std::int64_t count
 
 void release_rows(TEVPF_TABLE& table) noexcept { adopt_rows(table, nullptr, 0); }
 
-void adopt_rows(TEVPF_TABLE& table, Owned<unsigned char> rows, std::int64_t room) noexcept {
+void adopt_rows(TEVPF_TABLE& table, Owned<unsigned char> rows, std::int64_t bytes) noexcept {
   heap_free(table.row_data);
+  heap_free(table.slots.free);
+  table.slots.order.clear();
   table.row_data = rows.release();
-  table.row_room = room;
+  table.slots = {};
+  table.slots.bytes = bytes;
+}
+
+// Rows in another order than their slots are cache misses: some are prefetched while one is copied.
+void copy_rows_to(const TEVPF_TABLE& table, unsigned char* out) noexcept {
+  constexpr std::int32_t kAhead = 8;
+  const std::int64_t row_wid = table.row_wid;
+  table.slots.order.for_each_chunk(table.num_rows, [&](const SequenceChunk& chunk) {
+    const auto bytes = static_cast<std::size_t>(chunk.count * row_wid);
+    if (chunk.items == nullptr) {
+      if (bytes != 0) std::memcpy(out, row_at(table, chunk.first), bytes);
+    } else {
+      for (std::int32_t i = 0; i < chunk.count; ++i) {
+        __builtin_prefetch(row_at(table, chunk[std::min(i + kAhead, chunk.count - 1)]));
+        copy_short(out + i * row_wid, row_at(table, chunk[i]), row_wid);
+      }
+    }
+    out += bytes;
+  });
 }
 
 bool copy_rows(const TEVPF_TABLE& source, TEVPF_TABLE& copy) noexcept {
   const std::int64_t bytes = std::int64_t{source.num_rows} * source.row_wid;
   auto rows = new_array<unsigned char>(static_cast<std::uint64_t>(bytes));
   if (!rows) return false;
-  if (bytes > 0) std::memcpy(rows.get(), source.row_data, static_cast<std::size_t>(bytes));
+  copy_rows_to(source, rows.get());
   adopt_rows(copy, std::move(rows), bytes);
   return true;
 }
 
 void copy_values(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
                  unsigned char* out) noexcept {
-  const unsigned char* value = column_base(table, column);
+  const Values values = values_of(table, column);
   const auto copy = [&](auto size) {  // a constant for numbers, so that each copy is a plain move
-    for (std::int32_t row = 0; row < table.num_rows; ++row, value += table.row_wid, out += size) {
-      std::memcpy(out, value, size);
-    }
+    for_each_slot(table, [&](std::int32_t slot) {
+      std::memcpy(out, values.of(slot), size);
+      out += size;
+    });
   };
   if (column.def.type == PF_TYPE_STRING) return copy(static_cast<std::size_t>(column_size(column)));
   with_number(column.def.type,

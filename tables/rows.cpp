@@ -14,6 +14,7 @@
 #include "tables/layout.h"
 #include "tables/row_store.h"
 #include "tables/search_keys.h"
+#include "tables/settle.h"
 #include "tables/validate.h"
 
 using namespace tevpf;
@@ -57,99 +58,173 @@ void copy_row(const TEVPF_TABLE& table, const void* from, void* to) noexcept {
   if (table.row_wid > 0) std::memmove(to, from, static_cast<std::size_t>(table.row_wid));
 }
 
-void store_row(TEVPF_TABLE& table, const void* row, std::int32_t row_number) noexcept {
-  copy_row(table, row, row_at(table, row_number));
+// ---- Slots --------------------------------------------------------------------------------------
+
+// Makes room for the documented number of further rows: the initial increment for a table without rows, else
+// the later one; at most as many as free_rows can count.
+TEVPF_STATUS make_space(TEVPF_TABLE& table) noexcept {
+  const std::int32_t most = std::numeric_limits<std::int32_t>::max() - table.num_rows;
+  const std::int32_t wanted = table.num_rows == 0 ? library.alloc_initial : library.alloc_increment;
+  const std::int32_t increment = std::min({wanted, kMaxFreeRows, most});
+  if (increment < 1 || !reserve_rows(table, increment)) return fail_empty(PF_NOMEM);
+  table.free_rows = static_cast<std::int16_t>(increment);
+  return PF_NORMAL;
 }
 
 // ---- Insertion and removal ----------------------------------------------------------------------
 
-// Puts a row into its place, for which there is a spare slot; the indexes know its number as a gap.
-void open_slot(TEVPF_TABLE& table, const void* row, std::int32_t row_number) noexcept {
-  if (row_number < table.num_rows) {
-    open_row_gap(table, row_number);
-    renumber_for_insertion(table, row_number);
+// What an operation found out about the index of each column: places or positions, of which nothing changes
+// before the operation does. Few columns are indexed, so a small array holds them; else there is a block.
+template <class T>
+class PerColumn {
+ public:
+  // cppcheck-suppress uninitMemberVar; written for each indexed column before it is read
+  explicit PerColumn(const TEVPF_TABLE& table) noexcept {
+    if (table.num_cols > kFew) block_ = new_array<T>(static_cast<std::uint64_t>(table.num_cols));
+    values_ = table.num_cols > kFew ? block_.get() : few_;
   }
-  store_row(table, row, row_number);
-}
+  bool exists() const noexcept { return values_ != nullptr; }  // false: memory ran out
+  T& operator[](std::int32_t column) noexcept { return values_[column]; }
+  const T* get() const noexcept { return values_; }
 
-// Gives a row its entries in all indexes, at the points that the value checks have found.
-void insert_entries(TEVPF_TABLE& table, const unsigned char* row, std::int32_t row_number,
-                    const InsertionPoints& points) noexcept {
-  drop_search_keys(table);
+ private:
+  static constexpr std::int32_t kFew = 32;
+  T few_[kFew];
+  Owned<T> block_;
+  T* values_;
+};
+
+using Places = PerColumn<SequencePlace>;
+
+// Finds the places of a row's values in all indexes, those that the value checks have found apart, and
+// allocates what inserting there can need.
+bool prepare_entries(TEVPF_TABLE& table, const unsigned char* row, const InsertionPoints& points,
+                     Places& places) noexcept {
+  const std::int32_t slot = next_slot(table);
   std::int32_t known = 0;
   for (std::int32_t i = 0; i < table.num_cols; ++i) {
     TEVPF_COLUMN& column = table.col_array[i];
     if (!is_indexed(column)) continue;
-    std::int32_t position = 0;
-    if (is_unique(column) && known < points.count) {
-      position = points.position[known++];
-    } else {
-      (void)search_index(table, column, 0, table.num_rows, row + column.offset, position);
-    }
-    insert_entry(column, table.num_rows, position, row_number);
+    const bool is_known = is_unique(column) && known < points.count;
+    places[i] =
+        is_known ? points.place[known++] : search_index(table, column, row + column.offset).place;
+    if (!column.index.make_ready_to_insert(table.num_rows, places[i].position, slot)) return false;
+  }
+  return true;
+}
+
+void insert_entries(TEVPF_TABLE& table, const unsigned char* row, Places& places) noexcept {
+  const std::int32_t slot = next_slot(table);
+  for (std::int32_t i = 0; i < table.num_cols; ++i) {
+    TEVPF_COLUMN& column = table.col_array[i];
+    if (is_indexed(column)) insert_entry(table, column, places[i], slot, row + column.offset);
   }
 }
 
-void count_row(TEVPF_TABLE& table) noexcept {
-  ++table.num_rows;
-  --table.free_rows;
+void note_change(TEVPF_TABLE& table) noexcept {
+  drop_search_keys(table);
+  table.reads = 0;
 }
 
 // The numbers of rows run from 0 to num_rows: PF_END_POS and beyond append.
-TEVPF_STATUS insert_row(TEVPF_TABLE& table, const void* row, std::int32_t row_number) noexcept {
+TEVPF_STATUS add_row(TEVPF_TABLE& table, const void* row, std::int32_t row_number) noexcept {
   const GivenRow given(table, row);
   if (given.get() == nullptr) return fail_empty(PF_NOMEM);
-  if (table.free_rows <= 0) PF_TRY(TEV8R1_get_space(&table));
+  if (table.free_rows <= 0) PF_TRY(make_space(table));
   InsertionPoints points;
   if (library.interactive == 0) PF_TRY(check_row(table, given.get(), kNobody, points));
 
-  const std::int32_t place = std::clamp(row_number, 0, table.num_rows);
-  open_slot(table, given.get(), place);
-  insert_entries(table, row_at(table, place), place, points);
-  count_row(table);
+  const std::int32_t number = std::clamp(row_number, 0, table.num_rows);
+  Places places(table);
+  if (!places.exists() || !prepare_entries(table, given.get(), points, places) ||
+      !ready_to_insert_row(table, number)) {
+    return fail_empty(PF_NOMEM);
+  }
+  note_change(table);
+  insert_entries(table, given.get(), places);
+  insert_row(table, number, given.get());
+  ++table.num_rows;
+  --table.free_rows;
   return PF_NORMAL;
 }
 
-// Takes a row out; positions as remove_row_from_indexes has them.
-void erase_row(TEVPF_TABLE& table, std::int32_t row_number, std::int32_t* positions) noexcept {
-  remove_row_from_indexes(table, row_number, positions);
-  close_row_gap(table, row_number);
-  --table.num_rows;
-  if (table.free_rows < kMaxFreeRows) ++table.free_rows;
+// Finds the entries of a stored row in all indexes.
+void find_entries(const TEVPF_TABLE& table, std::int32_t slot, Places& places) noexcept {
+  for (std::int32_t i = 0; i < table.num_cols; ++i) {
+    const TEVPF_COLUMN& column = table.col_array[i];
+    if (is_indexed(column)) places[i] = entry_of(table, column, slot);
+  }
 }
 
-// Undoes erase_row: every index is in the same order again.
-void put_row_back(TEVPF_TABLE& table, const void* row, std::int32_t row_number,
-                  const std::int32_t* positions) noexcept {
-  open_slot(table, row, row_number);
+TEVPF_STATUS delete_row(TEVPF_TABLE& table, std::int32_t slot, std::int32_t row_number) noexcept {
+  Places places(table);
+  if (!places.exists()) return fail_empty(PF_NOMEM);
+  find_entries(table, slot, places);
   for (std::int32_t i = 0; i < table.num_cols; ++i) {
     TEVPF_COLUMN& column = table.col_array[i];
-    if (is_indexed(column)) insert_entry(column, table.num_rows, positions[i], row_number);
+    if (is_indexed(column) &&
+        !column.index.make_ready_to_erase(table.num_rows, places[i].position)) {
+      return fail_empty(PF_NOMEM);
+    }
   }
-  count_row(table);
-}
+  if (!ready_to_erase_row(table, row_number)) return fail_empty(PF_NOMEM);
 
-TEVPF_STATUS move_row(TEVPF_TABLE& table, std::int32_t from, std::int32_t to) noexcept {
-  const auto row = new_array<unsigned char>(static_cast<std::uint64_t>(table.row_wid));
-  const auto positions = new_array<std::int32_t>(static_cast<std::uint64_t>(table.num_cols));
-  if (!row || !positions) return fail_empty(PF_NOMEM);
-  copy_row(table, row_at(table, from), row.get());
-
-  const std::int16_t free_rows = table.free_rows;
-  erase_row(table, from, positions.get());
-  const TEVPF_STATUS status = insert_row(table, row.get(), to);
-  if (status != PF_NORMAL) put_row_back(table, row.get(), from, positions.get());
-  table.free_rows = free_rows;
-  return status;
-}
-
-TEVPF_STATUS find_with_default_row(const char* table_name, TEVPF_TABLE*& table) noexcept {
-  PF_TRY(find_table(table_name, table));
-  if (table->num_cols > 0 && !ensure_default_row(*table)) return fail_empty(PF_NOMEM);
+  note_change(table);
+  for (std::int32_t i = 0; i < table.num_cols; ++i) {
+    TEVPF_COLUMN& column = table.col_array[i];
+    if (is_indexed(column)) erase_entry(table, column, places[i]);
+  }
+  erase_row(table, row_number);
+  --table.num_rows;
+  if (table.free_rows < kMaxFreeRows) ++table.free_rows;
   return PF_NORMAL;
 }
 
-// ---- Replacement --------------------------------------------------------------------------------
+// ---- Moves and replacement ----------------------------------------------------------------------
+
+// Where an entry stands and where it goes to, among the others.
+struct EntryMove {
+  std::int32_t from;
+  std::int32_t to;
+};
+using Moves = PerColumn<EntryMove>;
+
+// Finds where the entry of a stored row goes when its value becomes that of `row`, and allocates what moving
+// it can need.
+bool prepare_move(const TEVPF_TABLE& table, TEVPF_COLUMN& column, std::int32_t slot,
+                  const unsigned char* row, EntryMove& move) noexcept {
+  move.from = entry_of(table, column, slot).position;
+  move.to = search_others(table, column, move.from, row + column.offset).place.position;
+  return column.index.make_ready_to_move(table.num_rows, move.from, move.to);
+}
+
+// A row that moves leaves its place in every index and comes back in front of those of equal value, under
+// the same checks as a new one.
+TEVPF_STATUS move_row(TEVPF_TABLE& table, std::int32_t from, std::int32_t to) noexcept {
+  Moves moves(table);
+  PerColumn<std::int32_t> positions(table);
+  if (!moves.exists() || !positions.exists()) return fail_empty(PF_NOMEM);
+  const std::int32_t slot = slot_of(table, from);
+  const unsigned char* const row = row_at(table, slot);
+  for (std::int32_t i = 0; i < table.num_cols; ++i) {
+    TEVPF_COLUMN& column = table.col_array[i];
+    if (!is_indexed(column)) continue;
+    if (!prepare_move(table, column, slot, row, moves[i])) return fail_empty(PF_NOMEM);
+    positions[i] = moves[i].from;
+  }
+  if (library.interactive == 0) PF_TRY(check_row_without(table, row, slot, positions.get()));
+  Sequence& order = table.slots.order;
+  const std::int32_t target = std::clamp(to, 0, table.num_rows - 1);
+  if (!order.make_ready_to_move(table.num_rows, from, target)) return fail_empty(PF_NOMEM);
+
+  note_change(table);
+  for (std::int32_t i = 0; i < table.num_cols; ++i) {
+    TEVPF_COLUMN& column = table.col_array[i];
+    if (is_indexed(column)) move_entry(column, moves[i].from, moves[i].to, row + column.offset);
+  }
+  order.move(from, target);
+  return PF_NORMAL;
+}
 
 bool values_differ(const TEVPF_COLUMN& column, const unsigned char* stored_row,
                    const unsigned char* new_row) noexcept {
@@ -157,36 +232,58 @@ bool values_differ(const TEVPF_COLUMN& column, const unsigned char* stored_row,
                         column.tolerance) != PF_NORMAL;
 }
 
-void replace_row(TEVPF_TABLE& table, std::int32_t row_number, const unsigned char* row) noexcept {
-  const unsigned char* const stored = row_at(table, row_number);
+TEVPF_STATUS replace_row(TEVPF_TABLE& table, std::int32_t slot, const unsigned char* row) noexcept {
+  Moves moves(table);
+  if (!moves.exists()) return fail_empty(PF_NOMEM);
+  unsigned char* const stored = row_at(table, slot);
   for (std::int32_t i = 0; i < table.num_cols; ++i) {
     TEVPF_COLUMN& column = table.col_array[i];
-    if (is_indexed(column) && values_differ(column, stored, row)) {
-      move_entry(table, column, row_number, row + column.offset);
+    if (!is_indexed(column)) continue;
+    moves[i] = {-1, -1};
+    if (values_differ(column, stored, row) && !prepare_move(table, column, slot, row, moves[i])) {
+      return fail_empty(PF_NOMEM);
     }
   }
-  store_row(table, row, row_number);
+  note_change(table);
+  for (std::int32_t i = 0; i < table.num_cols; ++i) {
+    TEVPF_COLUMN& column = table.col_array[i];
+    if (!is_indexed(column)) continue;
+    if (moves[i].from >= 0) {
+      move_entry(column, moves[i].from, moves[i].to, row + column.offset);
+    } else {
+      note_value(table, column, slot, row + column.offset);
+    }
+  }
+  copy_row(table, row, stored);
+  return PF_NORMAL;
+}
+
+// ---- Finding ------------------------------------------------------------------------------------
+
+TEVPF_STATUS find_with_default_row(const char* table_name, TEVPF_TABLE*& table) noexcept {
+  PF_TRY(find_table(table_name, table));
+  if (table->num_cols > 0 && !ensure_default_row(*table)) return fail_empty(PF_NOMEM);
+  return PF_NORMAL;
+}
+
+// The table, and the slot of its current row.
+TEVPF_STATUS find_current_row(const char* table_name, TEVPF_TABLE*& table,
+                              std::int32_t& slot) noexcept {
+  PF_TRY(find_table(table_name, table));
+  if (!has_position(*table, table->cur_row)) return fail_empty(PF_NOCURROW);
+  slot = traversal_of(*table).at(table->cur_row);
+  return PF_NORMAL;
 }
 
 }  // namespace
 
 TEVPF_STATUS TEV8R1_get_space(TEVPF_TABLE* table) noexcept {
-  const std::int32_t most = std::numeric_limits<std::int32_t>::max() - table->num_rows;
-  const std::int32_t wanted =
-      table->num_rows == 0 ? library.alloc_initial : library.alloc_increment;
-  const std::int32_t increment = std::min({wanted, kMaxFreeRows, most});
-  if (increment < 1 || !reserve_rows(*table, increment) ||
-      !reserve_index_entries(*table, increment)) {
-    return fail_empty(PF_NOMEM);
-  }
-  table->free_rows = static_cast<std::int16_t>(increment);
-  return PF_NORMAL;
-}
-
-TEVPF_STATUS TEV8R1_update_indexes(TEVPF_TABLE* table, const void* row,
-                                   int32_t row_number) noexcept {
-  insert_entries(*table, static_cast<const unsigned char*>(row), row_number, InsertionPoints{});
-  return PF_NORMAL;
+  const std::int16_t free_rows = table->free_rows;
+  if (!settle(*table)) return fail_empty(PF_NOMEM);
+  PF_TRY(make_space(*table));
+  if (settle(*table)) return PF_NORMAL;  // with room in the indexes, too
+  table->free_rows = free_rows;
+  return fail_empty(PF_NOMEM);
 }
 
 TEVPF_STATUS TEV8R1_PF_add_row(const char* table_name, const void* row) noexcept {
@@ -197,7 +294,7 @@ TEVPF_STATUS TEV8R1_PF_add_row_by_pos(const char* table_name, const void* row,
                                       int32_t row_number) noexcept {
   TEVPF_TABLE* table;
   PF_TRY(find_table(table_name, table));
-  return insert_row(*table, row, row_number);
+  return add_row(*table, row, row_number);
 }
 
 TEVPF_STATUS TEV8R1_PF_add_row_with_dft(const char* table_name, void* row,
@@ -210,30 +307,25 @@ TEVPF_STATUS TEV8R1_PF_add_row_with_dft(const char* table_name, void* row,
     std::memcpy(static_cast<unsigned char*>(row) + column.offset, table->dft_row + column.offset,
                 static_cast<std::size_t>(column_size(column)));
   }
-  return insert_row(*table, row, PF_END_POS);
+  return add_row(*table, row, PF_END_POS);
 }
 
 TEVPF_STATUS TEV8R1_PF_replace_row(const char* table_name, const void* row) noexcept {
   TEVPF_TABLE* table;
-  void* stored;
-  int32_t row_number;
-  PF_TRY(find_table(table_name, table));
-  PF_TRY(TEV8R1_get_cur_row_ptr(table, &stored, &row_number));
+  std::int32_t slot;
+  PF_TRY(find_current_row(table_name, table, slot));
   const GivenRow given(*table, row);
   if (given.get() == nullptr) return fail_empty(PF_NOMEM);
   InsertionPoints points;
-  PF_TRY(check_row(*table, given.get(), row_number, points));
-  replace_row(*table, row_number, given.get());
-  return PF_NORMAL;
+  PF_TRY(check_row(*table, given.get(), slot, points));
+  return replace_row(*table, slot, given.get());
 }
 
 TEVPF_STATUS TEV8R1_PF_delete_row(const char* table_name) noexcept {
   TEVPF_TABLE* table;
-  void* stored;
-  int32_t row_number;
-  PF_TRY(find_table(table_name, table));
-  PF_TRY(TEV8R1_get_cur_row_ptr(table, &stored, &row_number));
-  erase_row(*table, row_number, nullptr);
+  std::int32_t slot;
+  PF_TRY(find_current_row(table_name, table, slot));
+  PF_TRY(delete_row(*table, slot, row_number_at(*table, table->cur_row)));
   table->cur_row = -1;
   --table->next_row;
   return PF_NORMAL;

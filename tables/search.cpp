@@ -11,6 +11,7 @@
 #include "tables/layout.h"
 #include "tables/row_store.h"
 #include "tables/search_keys.h"
+#include "tables/settle.h"
 #include "tables/validate.h"
 #include "values/compare.h"
 #include "values/value_text.h"
@@ -22,66 +23,76 @@ namespace {
 constexpr std::int8_t kExact = 0;
 constexpr std::int8_t kNearest = 1;
 
-// The first position from `first` on whose row has a value equal to the key, walking in storage
-// order (order null) or through an index; `count` when there is none. At the speed of memory.
+// The first position from `first` on whose row has a value equal to the key, walking through a sequence;
+// `count` when there is none. At the speed of memory.
 template <class Key>
-std::int32_t walk(const Values& values, std::int32_t count, const std::int32_t* order,
+std::int32_t walk(const Values& values, std::int32_t count, const Sequence& through,
                   std::int32_t first, const Key& key) noexcept {
-  if (order == nullptr) {
+  if (through.is_identity()) {
     return find_first(first, count, key, [&](std::int32_t at) {
       const unsigned char* const value = values.of(at);
       fetch_along(value);
       return value;
     });
   }
+  if (through.items == nullptr) {
+    return find_first(first, count, key,
+                      [&](std::int32_t at) { return values.of(through.at(at)); });
+  }
+  const std::int32_t* const slots = through.items;
   return find_first(first, count, key, [&](std::int32_t at) {
-    __builtin_prefetch(values.of(order[std::min(at, count - 1 - kRowsAhead) + kRowsAhead]));
-    return values.of(order[at]);
+    __builtin_prefetch(values.of(slots[std::min(at, count - 1 - kRowsAhead) + kRowsAhead]));
+    return values.of(slots[at]);
   });
 }
 
+// Along search keys, which lie in storage order.
 std::int32_t walk_along_keys(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
-                             const unsigned char* keys, const std::int32_t* order,
+                             const unsigned char* keys, const Sequence& traversal,
                              std::int32_t first, const void* key) noexcept {
   return with_number(column.def.type, [&](auto tag) {
     using T = decltype(tag);
     const NumberKey<T> prepared(key, column.tolerance);
-    if (order == nullptr) return find_in_line(keys, table.num_rows, first, prepared);
-    return walk(Values{keys, sizeof(T)}, table.num_rows, order, first, prepared);
+    if (&traversal == &table.slots.order) {
+      return find_in_line(keys, table.num_rows, first, prepared);
+    }
+    return walk(Values{keys, sizeof(T)}, table.num_rows, traversal, first, prepared);
   });
 }
 
-std::int32_t walk_for_key(const TEVPF_TABLE& table, TEVPF_COLUMN& column, std::int32_t first,
+std::int32_t walk_for_key(TEVPF_TABLE& table, TEVPF_COLUMN& column, std::int32_t first,
                           const void* key) noexcept {
-  const std::int32_t* const order =
-      table.cur_col != nullptr ? index_entries(*table.cur_col) : nullptr;
-  // The keys of an indexed column follow its own index, not the traversal.
-  const bool may_have_keys = is_number_type(column.def.type) && !is_indexed(column);
+  const Sequence& order = table.slots.order;
+  const Sequence& traversal = traversal_of(table);
+  // The keys of an indexed column follow its own index, not the traversal; those of the others are found by
+  // row number.
+  const bool may_have_keys = is_number_type(column.def.type) && !is_indexed(column) &&
+                             (order.is_identity() || &traversal == &order);
   if (may_have_keys) {
     const unsigned char* const keys = search_keys(table, column, nullptr);
-    if (keys != nullptr) return walk_along_keys(table, column, keys, order, first, key);
+    if (keys != nullptr) return walk_along_keys(table, column, keys, traversal, first, key);
   }
   const std::int32_t position =
       with_key(column.def.type, column.tolerance, key, readable_bytes(table, column),
                [&](const auto& prepared) {
-                 return walk(values_of(table, column), table.num_rows, order, first, prepared);
+                 return walk(values_of(table, column), table.num_rows, traversal, first, prepared);
                });
-  if (may_have_keys) count_search(column, std::int64_t{position} - first + 1);
+  const std::int64_t walked = std::int64_t{position} - first + 1;
+  if (may_have_keys) count_search(column, walked);
+  if (traversal.blocks != nullptr) count_reads(table, walked);
   return position;
 }
 
 // The position from `first` on whose row has the key, or in nearest mode, which acts on the search
 // column only, the next greater value.
-TEVPF_STATUS find_position(const TEVPF_TABLE& table, TEVPF_COLUMN& column, std::int8_t mode,
+TEVPF_STATUS find_position(TEVPF_TABLE& table, TEVPF_COLUMN& column, std::int8_t mode,
                            const void* key, std::int32_t first, std::int32_t& position) noexcept {
-  const std::int32_t remaining = table.num_rows - first;
   bool found = false;
-  if (remaining > 0 && is_indexed(column) && &column == table.cur_col) {
-    std::int32_t pos = 0;
-    const TEVPF_STATUS status = find_in_index(table, column, first, remaining, key, pos);
-    found = status == PF_NORMAL || (mode == kNearest && pos < remaining);
-    position = first + pos;
-  } else if (remaining > 0) {
+  if (first < table.num_rows && is_indexed(column) && &column == table.cur_col) {
+    const IndexPlace place = find_in_index(table, column, first, key);
+    position = place.place.position;
+    found = place.found || (mode == kNearest && position < table.num_rows);
+  } else if (first < table.num_rows) {
     position = walk_for_key(table, column, first, key);
     found = position < table.num_rows;
   }
@@ -96,7 +107,7 @@ TEVPF_STATUS TEV8R1_PF_define_table_search(const char* table_name,
   PF_TRY(find_table(table_name, table));
   TEVPF_COLUMN* column = nullptr;
   if (column_name != nullptr) {
-    PF_TRY(TEV8R1_get_col_ptr(table, column_name, &column));
+    PF_TRY(find_column(*table, column_name, column));
     if (!is_indexed(*column)) return fail(PF_BADSEARCH, column_name);
   }
   table->cur_col = column;
@@ -111,7 +122,7 @@ TEVPF_STATUS TEV8R1_PF_get_row_by_value(const char* table_name, int8_t mode,
   int32_t position = 0;
   PF_TRY(find_table(table_name, table));
   if (table->num_rows == 0) return fail_empty(PF_NOTFOUND);
-  PF_TRY(TEV8R1_get_col_ptr(table, column_name, &column));
+  PF_TRY(find_column(*table, column_name, column));
   PF_TRY(find_position(*table, *column, mode, key, table->next_row, position));
   deliver_row(*table, position, row_out);
   return PF_NORMAL;
@@ -127,8 +138,8 @@ TEVPF_STATUS TEV8R1_PF_get_value(const char* table_name, const char* column_name
   if (table->num_cols == 0) return PF_NORMAL;
   if (table->num_rows == 0) return fail_empty(PF_NOTFOUND);
   PF_TRY(find_position(*table, table->col_array[0], kExact, key, 0, position));
-  PF_TRY(TEV8R1_get_col_ptr(table, column_name, &column));
-  std::memcpy(value_out, row_at(*table, row_at_position(*table, position)) + column->offset,
+  PF_TRY(find_column(*table, column_name, column));
+  std::memcpy(value_out, row_at(*table, traversal_of(*table).at(position)) + column->offset,
               static_cast<std::size_t>(column_size(*column)));
   return PF_NORMAL;
 }
@@ -139,7 +150,7 @@ TEVPF_STATUS TEV8R1_PF_get_col_values(const char* table_name, const char* column
   TEVPF_COLUMN* column;
   PF_TRY(find_table(table_name, table));
   if (table->num_rows == 0) return PF_NOMORE;
-  PF_TRY(TEV8R1_get_col_ptr(table, column_name, &column));
+  PF_TRY(find_column(*table, column_name, column));
   copy_values(*table, *column, static_cast<unsigned char*>(values_out));
   return PF_NORMAL;
 }

@@ -1,19 +1,24 @@
 // Tables and their columns as records.
 //
-// Terms: a row number counts rows as they are stored; a position counts them as they are traversed,
-// which follows the search column's index when there is one.
+// Terms. A slot is a place in the row block, where a row stays while it is in the table. A row number
+// counts rows as they are stored; a position counts them as they are traversed, which follows the search
+// column's index when there is one.
 //
 // Invariants: the columns' offsets, row_wid, mod and extra_bytes are what laying them out one
-// behind the other into an empty row gives; each index lists every row number once, in ascending
-// order of value, with room for num_rows + free_rows; header.btf = 24 + the stored sizes of all
-// columns. Rows keep the padding bytes that callers and files hand in; those that the library adds are
-// zero.
+// behind the other into an empty row gives; each index lists every row's slot once, in ascending
+// order of value; header.btf = 24 + the stored sizes of all columns. Rows keep the padding bytes that
+// callers and files hand in; those that the library adds are zero.
+//
+// A table is settled when rows lie in storage order, so that slots are row numbers, and every index is one
+// array with room for num_rows + free_rows entries: row_data and idx_ptr then are what callers outside may
+// look at and change. Changes in the middle leave that state; tables/settle brings it back.
 #pragma once
 
 #include <cstddef>
 #include <cstdint>
 
 #include "core/element.h"
+#include "core/sequence/sequence.h"
 
 namespace tevpf {
 
@@ -25,6 +30,15 @@ struct SearchKeys {
   std::int64_t effort;    // of searches since the last change, in rows looked at
 };
 
+// The state of tables/row_store.
+struct RowSlots {
+  Sequence order;          // slots in storage order; an identity as long as rows lie in that order
+  std::int32_t* free;      // slots below num_rows + num_free that hold no row
+  std::int32_t num_free;   // 0 while the order is an identity
+  std::int32_t free_room;  // entries that the block really has
+  std::int64_t bytes;      // of the row block
+};
+
 }  // namespace tevpf
 
 extern "C" {
@@ -34,11 +48,14 @@ struct TEVPF_COLUMN {
   std::int32_t offset;  // of the value within a row
   char RESERVED[4];     // zero in columns defined here; carried through as read
   TEVPF_COL_DEF def;
-  char format[32];          // printf format of a value as reports show it; empty until it is made
-  double tolerance;         // reals and doubles: 10^-(precision + 1)
-  std::int32_t* idx_ptr;    // row numbers in ascending order of value, while idx_flag is set
-  std::int8_t desc_flag;    // 0: no description, else its stored offset - 41
-  std::int32_t index_room;  // entries that the index block really has
+  char format[32];   // printf format of a value as reports show it; empty until it is made
+  double tolerance;  // reals and doubles: 10^-(precision + 1)
+  union {
+    std::int32_t* idx_ptr;  // of a settled table: row numbers in ascending order of value
+    tevpf::Sequence index;  // slots in that order, while idx_flag is set
+  };
+  std::int8_t desc_flag;  // 0: no description, else its stored offset - 41
+  char padding[7];
   tevpf::SearchKeys keys;
 };
 #pragma pack(pop)
@@ -57,19 +74,21 @@ struct TEVPF_TABLE {
   std::int16_t mod;          // alignment of rows: the largest number's size; 0 without numbers
   std::int16_t extra_bytes;  // padding behind the last column's value
   TEVPF_COLUMN* cur_col;     // the search column, or null
-  unsigned char* row_data;   // the rows in storage order
+  unsigned char* row_data;   // the rows by their slots; of a settled table: in storage order
   TEVPF_COLUMN* col_array;   // in column order
   unsigned char* dft_row;    // the default row; null until the first column is defined
   TEVPF_COL_DEF* col_dft;    // the five column templates in type order, or null
 
-  std::int64_t row_room;  // bytes that the row block really has
+  tevpf::RowSlots slots;
+  std::int64_t reads;  // rows read since the last change, while the table is not settled
 };
 
 static_assert(sizeof(void*) != 4 || sizeof(TEVPF_COL_DEF) == 68);
 static_assert(offsetof(TEVPF_COLUMN, def) == 8);
 static_assert(offsetof(TEVPF_COLUMN, keys) % alignof(tevpf::SearchKeys) == 0 &&
-                  sizeof(TEVPF_COLUMN) % alignof(tevpf::SearchKeys) == 0,
-              "search keys lie where they may be referred to");
+                  offsetof(TEVPF_COLUMN, index) % alignof(tevpf::Sequence) == 0 &&
+                  sizeof(TEVPF_COLUMN) % alignof(tevpf::Sequence) == 0,
+              "what is more than a field lies where it may be referred to");
 }
 
 namespace tevpf {

@@ -1,6 +1,7 @@
 // Tables, as the core knows them.
 #include "core/element_kind.h"
 #include "tables/directory.h"
+#include "tables/settle.h"
 #include "tables/table_builder.h"
 #include "tables/table_fields.h"
 #include "tables/table_writer.h"
@@ -17,7 +18,8 @@ const ElementKind table_kind = {
     .reserve = [](TEVPF_ELEM_HEADER&) noexcept { return true; },
     .copy =
         [](TEVPF_ELEM_HEADER& source, TEVPF_ELEM_HEADER& copy) noexcept {
-          return copy_table_body(*as_table(&source), *as_table(&copy));
+          return settle(*as_table(&source)) &&
+                 copy_table_body(*as_table(&source), *as_table(&copy));
         },
     .release = [](TEVPF_ELEM_HEADER* element) noexcept { release_table(as_table(element)); },
     .read = build_table,

@@ -4,6 +4,7 @@
 #include "core/writer.h"
 #include "tables/column_index.h"
 #include "tables/row_store.h"
+#include "tables/settle.h"
 #include "tables/table_fields.h"
 #include "values/value_type.h"
 
@@ -22,6 +23,7 @@ TEVPF_STATUS put_column(Sink& sink, const TEVPF_COLUMN& column) noexcept {
 }  // namespace
 
 TEVPF_STATUS store_table(Sink& sink, TEVPF_TABLE& table) noexcept {
+  if (!settle(table)) return fail_empty(PF_NOMEM);
   sink.put(&table.header, sizeof table.header);
   put_fields<kTableFields>(sink, &table);
   for (std::int32_t i = 0; i < table.num_cols; ++i) PF_TRY(put_column(sink, table.col_array[i]));

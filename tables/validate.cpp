@@ -3,6 +3,7 @@
 #include "core/base/status.h"
 #include "core/library.h"
 #include "tables/column_index.h"
+#include "tables/row_store.h"
 #include "values/compare.h"
 #include "values/value_text.h"
 
@@ -20,22 +21,30 @@ bool is_in_range(const TEVPF_COLUMN& column, const void* value) noexcept {
   });
 }
 
-// The check of one value; for a unique column that does not hold it, `point` is its place in the
-// index.
-TEVPF_STATUS check_value(const TEVPF_TABLE& table, const TEVPF_COLUMN& column, const void* value,
-                         std::int32_t& point) noexcept {
-  if (!is_in_range(column, value)) {
-    return fail(PF_RANGE, ValueText(column.def.type, value).c_str());
-  }
-  if (!is_unique(column)) return PF_NORMAL;
-  if (search_index(table, column, 0, table.num_rows, value, point) != PF_NORMAL) return PF_NORMAL;
-  library.dup_row = index_entries(column)[point];
+TEVPF_STATUS check_range(const TEVPF_COLUMN& column, const void* value) noexcept {
+  if (is_in_range(column, value)) return PF_NORMAL;
+  return fail(PF_RANGE, ValueText(column.def.type, value).c_str());
+}
+
+// The refusal of a value that the row of that number holds.
+TEVPF_STATUS duplicate(const TEVPF_COLUMN& column, const void* value,
+                       std::int32_t row_number) noexcept {
+  library.dup_row = row_number;
   return fail(PF_DUPLICATE, {"value ", ValueText(column.def.type, value).c_str()},
               {"column ", column.def.name});
 }
 
-bool puts_up_with_duplicate(std::int32_t holder) noexcept {
-  return holder == kAnybody || library.dup_row == holder;
+// The check of one value. For a unique column `place` is where the value belongs, or stands already; then
+// `holder` is the slot of its row.
+TEVPF_STATUS check_value(const TEVPF_TABLE& table, const TEVPF_COLUMN& column, const void* value,
+                         SequencePlace& place, std::int32_t& holder) noexcept {
+  PF_TRY(check_range(column, value));
+  if (!is_unique(column)) return PF_NORMAL;
+  const IndexPlace found = search_index(table, column, value);
+  place = found.place;
+  if (!found.found) return PF_NORMAL;
+  holder = column.index.at(place.position);
+  return duplicate(column, value, row_number_of(table, holder));
 }
 
 }  // namespace
@@ -45,13 +54,32 @@ TEVPF_STATUS check_row(const TEVPF_TABLE& table, const unsigned char* row, std::
   points.count = 0;
   for (std::int32_t i = 0; i < table.num_cols; ++i) {
     const TEVPF_COLUMN& column = table.col_array[i];
-    std::int32_t point = 0;
-    const TEVPF_STATUS status = check_value(table, column, row + column.offset, point);
-    if (status == PF_DUPLICATE && puts_up_with_duplicate(holder)) continue;
+    SequencePlace place{0};
+    std::int32_t found = kNobody;
+    const TEVPF_STATUS status = check_value(table, column, row + column.offset, place, found);
+    if (status == PF_DUPLICATE && (holder == kAnybody || holder == found)) continue;
     PF_TRY(status);
     if (is_unique(column) && points.count < InsertionPoints::kMost) {
-      points.position[points.count++] = point;
+      points.place[points.count++] = place;
     }
+  }
+  return PF_NORMAL;
+}
+
+TEVPF_STATUS check_row_without(const TEVPF_TABLE& table, const unsigned char* row,
+                               std::int32_t slot, const std::int32_t* positions) noexcept {
+  const std::int32_t own_number = row_number_of(table, slot);
+  for (std::int32_t i = 0; i < table.num_cols; ++i) {
+    const TEVPF_COLUMN& column = table.col_array[i];
+    const unsigned char* const value = row + column.offset;
+    PF_TRY(check_range(column, value));
+    if (!is_unique(column)) continue;
+    const IndexPlace found = search_others(table, column, positions[i], value);
+    if (!found.found) continue;
+    const std::int32_t at = found.place.position;
+    const std::int32_t holder = column.index.at(at < positions[i] ? at : at + 1);
+    const std::int32_t number = row_number_of(table, holder);
+    return duplicate(column, value, number > own_number ? number - 1 : number);
   }
   return PF_NORMAL;
 }
@@ -62,6 +90,7 @@ using namespace tevpf;
 
 TEVPF_STATUS TEV8R1_validate_value(const TEVPF_TABLE* table, const TEVPF_COLUMN* column,
                                    const void* value) noexcept {
-  std::int32_t point = 0;
-  return check_value(*table, *column, value, point);
+  SequencePlace place{0};
+  std::int32_t holder = kNobody;
+  return check_value(*table, *column, value, place, holder);
 }

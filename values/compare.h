@@ -31,7 +31,9 @@ int compare_numbers(T a, T b, [[maybe_unused]] double tolerance) noexcept {
 template <class T>
 class NumberKey {
  public:
+  using Number = T;
   static constexpr bool kIsNumber = true;
+  static constexpr bool kTotalOrder = !kIsFloating<T>;  // equality is transitive
 
   NumberKey(const void* key, double tolerance) noexcept
       : key_(load<T>(key)), tolerance_(tolerance) {}
@@ -40,7 +42,8 @@ class NumberKey {
   int compare(const unsigned char* place) const noexcept {
     return compare_numbers(load<T>(place), key_, tolerance_);
   }
-  bool is_above(const unsigned char* place) const noexcept { return load<T>(place) < key_; }
+  bool is_above(T value) const noexcept { return value < key_; }
+  bool is_above(const unsigned char* place) const noexcept { return is_above(load<T>(place)); }
   // compare() == 0 in fewer steps.
   bool equals(const unsigned char* place) const noexcept {
     const T value = load<T>(place);
@@ -122,6 +125,7 @@ template <bool kWide>
 class TextKey {
  public:
   static constexpr bool kIsNumber = false;
+  static constexpr bool kTotalOrder = true;
 
   explicit TextKey(const void* key) noexcept
       : pattern_(make_pattern(static_cast<const char*>(key))) {
@@ -141,6 +145,7 @@ class TextKey {
     if (!has_rest_) return 0;
     return compare_rest(place);
   }
+  bool is_above(const unsigned char* place) const noexcept { return compare(place) < 0; }
   // compare() == 0: without the order, what stands behind a terminator need not be cut off.
   bool equals(const unsigned char* place) const noexcept {
     if constexpr (kWide) {

@@ -96,8 +96,9 @@ void Sequence::erase(std::int32_t count, SequencePlace place) noexcept {
 }
 
 void Sequence::move(std::int32_t from, std::int32_t to, const void* key) noexcept {
-  if (from == to) return;
-  if (blocks != nullptr) {
+  if (from == to) {
+    if (blocks != nullptr && key != nullptr) blocks->set_key({from}, key);  // of a new value
+  } else if (blocks != nullptr) {
     const std::int32_t item = at(from);
     blocks->erase({from});
     blocks->insert({to}, item, key);

@@ -22,7 +22,7 @@
 #include "tables/columns.h"
 #include "tables/cursor.h"
 #include "tables/default_row.h"
-#include "tables/directory.h"
+#include "tables/settle.h"
 #include "tables/formats.h"
 #include "tables/layout.h"
 #include "tables/rows.h"
@@ -348,9 +348,9 @@ void add_column_calls(std::vector<Call>& calls) {
     MORE(calc_col_width, kNoStatus, (n[0], n[1]), 5, 9),
     {"adjust_data", {}, [](Numbers) {
        TEVPF_TABLE alike = table();
-       alike.row_room = std::int64_t{alike.num_rows} * alike.row_wid;
-       alike.row_data = static_cast<unsigned char*>(std::malloc(std::size_t(alike.row_room)));
-       std::memcpy(alike.row_data, table().row_data, std::size_t(alike.row_room));
+       alike.slots.bytes = std::int64_t{alike.num_rows} * alike.row_wid;
+       alike.row_data = static_cast<unsigned char*>(std::malloc(std::size_t(alike.slots.bytes)));
+       std::memcpy(alike.row_data, table().row_data, std::size_t(alike.slots.bytes));
        const TEVPF_STATUS status =
            TEV8R1_adjust_data(&alike, 4, alike.row_wid, 0, &alike.col_array->def);
        std::free(alike.row_data);

@@ -14,6 +14,10 @@
 
 namespace tevpf_test {
 
+using tevpf::row_at;
+using tevpf::row_number_of;
+using tevpf::slot_of;
+
 inline const char* broken_layout(const TEVPF_TABLE& table) {
   tevpf::Layout fresh;
   for (const TEVPF_COLUMN& column : std::span(table.col_array, table.num_cols)) {
@@ -38,8 +42,8 @@ inline bool are_search_keys_true(const TEVPF_TABLE& table, const TEVPF_COLUMN& c
   const std::int32_t size = tevpf::column_size(column), count = table.num_rows;
   const auto key = [&](int i) { return column.keys.values + std::int64_t{i} * size; };
   for (int i = 0; i < count; ++i) {
-    const int row = column.idx_ptr != nullptr ? column.idx_ptr[i] : i;
-    if (std::memcmp(key(i), tevpf::row_at(table, row) + column.offset, size) != 0) return false;
+    const int slot = column.idx_ptr != nullptr ? column.idx_ptr[i] : slot_of(table, i);
+    if (std::memcmp(key(i), row_at(table, slot) + column.offset, size) != 0) return false;
   }
   const bool fenced = column.idx_ptr != nullptr && !tevpf::is_floating_type(column.def.type);
   for (int i = fenced ? count / tevpf::kFenceStep : 0; i > 0; --i) {
@@ -48,17 +52,62 @@ inline bool are_search_keys_true(const TEVPF_TABLE& table, const TEVPF_COLUMN& c
   return true;
 }
 
-inline const char* broken_index(const TEVPF_TABLE& table, const TEVPF_COLUMN& column) {
-  const int room = table.num_rows + table.free_rows;
-  if (column.def.idx_flag == 0) return column.idx_ptr != nullptr ? "index without flag" : nullptr;
-  if (room > 0 && (column.idx_ptr == nullptr || column.index_room < room)) return "no index room";
-  std::vector<bool> seen(table.num_rows);
+// The keys that blocks of an index keep beside their items.
+inline bool are_block_keys_true(const TEVPF_TABLE& table, const TEVPF_COLUMN& column) {
+  const tevpf::SequenceBlocks* const blocks = column.index.blocks;
+  if (blocks == nullptr || blocks->key_size == 0) return true;
+  const auto is_true = [&](const void* key, int slot) {
+    return std::memcmp(key, row_at(table, slot) + column.offset, blocks->key_size) == 0;
+  };
+  for (const tevpf::SequenceGroup* group : std::span(blocks->groups, blocks->num_groups)) {
+    for (int b = 0; b < group->count; ++b) {
+      const tevpf::SequenceChunk chunk = group->chunk(b);
+      const auto* const keys = static_cast<const char*>(group->block[b].keys);
+      for (int i = 0; keys != nullptr && i < chunk.count; ++i) {
+        if (!is_true(keys + std::ptrdiff_t{i} * blocks->key_size, chunk[i])) return false;
+      }
+      if (group->has_last_keys && !is_true(&group->last_key[b], group->last[b])) return false;
+    }
+  }
+  return true;
+}
+
+// Every slot is in the order or free.
+inline const char* broken_slots(const TEVPF_TABLE& table) {
+  const tevpf::RowSlots& slots = table.slots;
+  if (slots.order.is_identity() && slots.num_free != 0) return "free slots among rows in order";
+  const std::int64_t used = std::int64_t{table.num_rows} + slots.num_free;
+  const std::int64_t room = std::max(used, std::int64_t{table.num_rows} + table.free_rows);
+  if (slots.bytes < room * table.row_wid) return "no room for the rows";
+  std::vector<bool> seen(used);
+  const auto is_new = [&](int slot) {
+    const bool fits = slot >= 0 && slot < used && !seen[slot];
+    if (fits) seen[slot] = true;
+    return fits;
+  };
+  for (int i = 0; i < slots.num_free; ++i) {
+    if (!is_new(slots.free[i])) return "free slots are distinct";
+  }
   for (int i = 0; i < table.num_rows; ++i) {
-    const int row = column.idx_ptr[i];
-    if (row < 0 || row >= table.num_rows || seen[row]) return "index entries are all row numbers";
-    seen[row] = true;
+    const int slot = slot_of(table, i);
+    if (!is_new(slot)) return "slots in order are distinct";
+    if (row_number_of(table, slot) != i) return "a slot's row number";
+    if (const char* rule = broken_row(table, row_at(table, slot))) return rule;
   }
   return nullptr;
+}
+
+inline const char* broken_index(const TEVPF_TABLE& table, const TEVPF_COLUMN& column) {
+  const tevpf::Sequence& index = column.index;
+  if (column.def.idx_flag == 0) return index.is_identity() ? nullptr : "index without flag";
+  if (index.items != nullptr && index.room < table.num_rows) return "no index room";
+  std::vector<int> slots(table.num_rows), expected;
+  index.copy_items(table.num_rows, slots.data());
+  tevpf::for_each_slot(table, [&](int slot) { expected.push_back(slot); });
+  std::sort(slots.begin(), slots.end());
+  std::sort(expected.begin(), expected.end());
+  if (slots != expected) return "index entries are all slots";
+  return are_block_keys_true(table, column) ? nullptr : "keys of blocks are not the values";
 }
 
 // The first broken rule, or null.
@@ -74,12 +123,7 @@ inline const char* broken_rule(const TEVPF_TABLE& table) {
   }
   if (table.header.btf != stored) return "btf is not the stored size";
   if (const char* rule = broken_layout(table)) return rule;
-  if (table.row_room < (std::int64_t{table.num_rows} + table.free_rows) * table.row_wid) {
-    return "no room for the rows";
-  }
-  for (int i = 0; i < table.num_rows; ++i) {
-    if (const char* rule = broken_row(table, tevpf::row_at(table, i))) return rule;
-  }
+  if (const char* rule = broken_slots(table)) return rule;
   // There is none yet where loading has failed.
   if (const char* rule = table.dft_row ? broken_row(table, table.dft_row) : nullptr) return rule;
   for (const TEVPF_COLUMN& column : std::span(table.col_array, table.num_cols)) {

@@ -7,6 +7,7 @@
 #include "support/definitions.h"
 #include "support/temp_file.h"
 #include "tables/column_index.h"
+#include "tables/directory.h"
 #include "tables/row_store.h"
 
 #define ASSERT_OK(expr) ASSERT_EQ(expr, PF_NORMAL)
@@ -25,14 +26,24 @@ class TableTest : public TempFileTest {
   }
   static TEVPF_TABLE& table(const char* name = "t") {
     TEVPF_TABLE* found = nullptr;
-    EXPECT_EQ(TEV8R1_get_table_ptr(name, &found), PF_NORMAL);
+    EXPECT_EQ(find_table(name, found), PF_NORMAL);
     EXPECT_STREQ(tevpf_test::broken_rule(*found), nullptr);
     return *found;
   }
-  static TEVPF_COLUMN& column(int i) { return table().col_array[i]; }
+  // The record as callers outside get it: rows in order, indexes one array each.
+  static TEVPF_TABLE& settled() {
+    TEVPF_TABLE* found = nullptr;
+    EXPECT_EQ(TEV8R1_get_table_ptr("t", &found), PF_NORMAL);
+    return *found;
+  }
+  static TEVPF_COLUMN& column(int i) { return settled().col_array[i]; }
+  // The row numbers in the order of an index, whatever state it is in.
   static std::vector<int> order(int i) {
-    const std::int32_t* entries = index_entries(column(i));
-    return {entries, entries + table().num_rows};
+    const TEVPF_TABLE& t = table();
+    std::vector<int> rows(t.num_rows);
+    t.col_array[i].index.copy_items(t.num_rows, rows.data());
+    for (int& row : rows) row = row_number_of(t, row);
+    return rows;
   }
 
   static void define(const std::vector<TEVPF_COL_DEF>& defs) {

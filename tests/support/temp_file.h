@@ -15,7 +15,7 @@
 #include "support/error_texts.h"
 #include "support/param_def.h"
 #include "support/state.h"
-#include "tables/directory.h"
+#include "tables/settle.h"
 
 // A folder that goes away with the test.
 class TempDir {

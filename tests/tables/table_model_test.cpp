@@ -361,10 +361,11 @@ class TableModelTest : public TableTest, public testing::WithParamInterface<unsi
         {1, false, &TableModelTest::copy},
         {1, false, &TableModelTest::reopen},
         {2, true, &TableModelTest::column_values},
+        {2, true, &TableModelTest::hand_out},
     };
     set_error_texts();
     const auto* operation = kOperations;
-    for (int pick = below(115); pick >= operation->weight; ++operation) pick -= operation->weight;
+    for (int pick = below(117); pick >= operation->weight; ++operation) pick -= operation->weight;
     if (!operation->needs_columns || !model_.columns.empty()) (this->*operation->run)();
   }
 
@@ -383,7 +384,7 @@ class TableModelTest : public TableTest, public testing::WithParamInterface<unsi
     EXPECT_EQ(t.cur_col == nullptr ? "" : t.cur_col->def.name, model_.search);
     for (int i = 0; i < t.num_rows; ++i) {
       SCOPED_TRACE(testing::Message() << "row " << i);
-      compare_bytes(tevpf::row_at(t, i), model_.rows[i]);
+      compare_bytes(tevpf::row_at(t, slot_of(t, i)), model_.rows[i]);
     }
     for (int i = 0; i < t.num_cols; ++i) {
       const Column& expected = model_.columns[i];
@@ -687,6 +688,18 @@ class TableModelTest : public TableTest, public testing::WithParamInterface<unsi
          TEV8R1_PF_get_col_values("t", def.name, values));
     for (int i = 0; i < model_.count(); ++i) {
       EXPECT_EQ(load_value(def, values + i * size), model_.rows[i][column]);
+    }
+  }
+  // What callers outside get: rows in storage order, indexes as arrays of row numbers.
+  void hand_out() {
+    const TEVPF_TABLE& t = settled();
+    EXPECT_TRUE(t.slots.order.is_identity());
+    for (int i = 0; i < t.num_rows; ++i) {
+      compare_bytes(t.row_data + std::ptrdiff_t{i} * t.row_wid, model_.rows[i]);
+    }
+    for (size_t i = 0; i < model_.columns.size(); ++i) {
+      const Index& index = model_.columns[i].index;
+      EXPECT_TRUE(std::equal(index.begin(), index.end(), t.col_array[i].idx_ptr));
     }
   }
   std::mt19937 random_;

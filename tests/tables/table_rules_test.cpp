@@ -3,6 +3,7 @@
 #include <limits>
 
 #include "support/table_fixture.h"
+#include "tables/columns.h"
 #include "tables/cursor.h"
 #include "tables/formats.h"
 #include "tables/layout.h"
