@@ -4,7 +4,8 @@ include(CMakePackageConfigHelpers)
 set(package_dir "${CMAKE_INSTALL_LIBDIR}/cmake/tevpf")
 
 install(TARGETS tevpf tevpf_static EXPORT tevpfTargets)
-install(FILES include/tevpf.h DESTINATION "${CMAKE_INSTALL_INCLUDEDIR}")
+install(FILES include/tevpf.h include/tevpf_access.h include/tevpf_message.h
+  DESTINATION "${CMAKE_INSTALL_INCLUDEDIR}")
 install(EXPORT tevpfTargets NAMESPACE tevpf:: DESTINATION "${package_dir}")
 
 configure_package_config_file(cmake/tevpfConfig.cmake.in
