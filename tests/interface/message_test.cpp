@@ -2,9 +2,9 @@
 // the failure.
 #include <tevpf_message.h>
 
+#include <cstdio>
 #include <fstream>
 #include <map>
-#include <regex>
 #include <string>
 #include <vector>
 
@@ -21,12 +21,12 @@ std::string message_of(TEVPF_STATUS status, const std::string& item, const std::
 // The statuses that the header defines.
 std::map<std::string, TEVPF_STATUS> defined_statuses() {
   std::map<std::string, TEVPF_STATUS> found;
-  const std::regex line(R"(#define (PF_\w+) \(\(TEVPF_STATUS\)0x(\w+)u\).*)");
   std::ifstream header(TEVPF_HEADER);
-  std::smatch parts;
-  for (std::string text; std::getline(header, text);) {
-    if (!std::regex_match(text, parts, line)) continue;
-    found[parts[1]] = static_cast<TEVPF_STATUS>(std::stoul(parts[2], nullptr, 16));
+  char name[20];
+  for (std::string line; std::getline(header, line);) {
+    TEVPF_STATUS status = 0;
+    const int read = std::sscanf(line.c_str(), "#define %19s ((TEVPF_STATUS)0x%x", name, &status);
+    if (read == 2) found[name] = status;
   }
   return found;
 }
