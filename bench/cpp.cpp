@@ -15,10 +15,10 @@ std::string name_of(std::int64_t i) {
   return name;
 }
 
-// A file with a list of n doubles, in name order, and a table of n rows; some of 56 bytes each.
+// A file with a list of doubles, and a table of rows of 48 bytes.
 class Data {
  public:
-  explicit Data(std::int64_t list, std::int64_t rows) : file_(tevpf::File::create(path())) {
+  Data(std::int64_t list, std::int64_t rows) : file_(tevpf::File::create(path())) {
     auto params = file_.create_list("list");
     for (std::int64_t i = 0; i < list; ++i) names_.push_back(name_of(i));
     std::vector<std::string> sorted = names_;
@@ -41,7 +41,6 @@ class Data {
     }
     table.redefine("group", table.definition("group").indexed());
   }
-  ~Data() { file_.close(); }
 
   const std::vector<std::string>& names() const { return names_; }
   tevpf::List list() const { return file_.list("list"); }
@@ -116,6 +115,20 @@ void column_cpp(benchmark::State& state) {
   const tevpf::Table table = data.table();
   run(state, [&] { return table.column<double>("measure").back(); });
 }
+void column_span_cpp(benchmark::State& state) {
+  const Data data(0, state.range(0));
+  const tevpf::Table table = data.table();
+  std::vector<double> values(static_cast<std::size_t>(state.range(0)));
+  run(state, [&] { return values[table.column("measure", std::span(values)) - 1]; });
+}
+void column_span_c(benchmark::State& state) {
+  const Data data(0, state.range(0));
+  std::vector<double> values(static_cast<std::size_t>(state.range(0)));
+  run(state, [&] {
+    MUST(TEV8R1_PF_get_col_values("parts", "measure", values.data()));
+    return values.back();
+  });
+}
 void column_c(benchmark::State& state) {
   const Data data(0, state.range(0));
   run(state, [] {
@@ -181,6 +194,8 @@ const int registered = [] {
   add("C++ rows in index order", "limit: C calls", ordered_c, kFewPasses);
   add("C++ column", "tevpf", column_cpp, kManyPasses);
   add("C++ column", "limit: C calls", column_c, kManyPasses);
+  add("C++ column into a span", "tevpf", column_span_cpp, kManyPasses);
+  add("C++ column into a span", "limit: C calls", column_span_c, kManyPasses);
   add("C++ parameter by name", "tevpf", parameter_cpp, kFewPasses);
   add("C++ parameter by name", "limit: C calls", parameter_c, kFewPasses);
   add("C++ parameter by name", "limit: C calls, type looked up", parameter_c_checked, kFewPasses);

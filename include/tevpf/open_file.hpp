@@ -69,7 +69,8 @@ struct OpenFile {
 
   void close() noexcept {
     if (!is_open()) return;
-    if (TEV8R1_PF_change_file(name.c_str()) == PF_NORMAL) TEV8R1_PF_close(0);
+    const bool is_known = TEV8R1_PF_change_file(name.c_str()) == PF_NORMAL;
+    if (is_known && tevpf_current_file() == handle) TEV8R1_PF_close(0);
     handle = this;
     ++layout_changes;
     ++row_changes;

@@ -98,13 +98,13 @@ class Table {
   //   PF_BADARG  the prefix holds a "*"
   std::optional<Row> find_prefix(std::string_view column, std::string_view prefix) const;
 
-  // One column's values of all rows in storage order, in one call into the library; not of
-  // std::string_view. O(n).   PF_NOCOLUMN; PF_BADTYPE: not exactly that type
+  // One column's values of all rows in storage order; not of std::string_view. O(n).
+  //   PF_NOCOLUMN; PF_BADTYPE: not exactly that type
   template <Readable T>
   requires(!std::same_as<T, std::string_view>) std::vector<T> column(std::string_view column)
   const;
 
-  // The same into storage of the caller; gives the number of rows.
+  // The same into storage of the caller, without the vector's zeroing; gives the number of rows.
   //   PF_BADARG  there are more rows than the storage has room for
   template <Number T>
   std::size_t column(std::string_view column, std::span<T> values_out) const;

@@ -73,6 +73,13 @@ constexpr const char* to_string(Type type) noexcept {
   return "unknown";
 }
 
+namespace detail {
+template <class T>
+inline constexpr bool is_character =
+    std::same_as<T, char> || std::same_as<T, wchar_t> || std::same_as<T, char8_t> ||
+    std::same_as<T, char16_t> || std::same_as<T, char32_t>;
+}  // namespace detail
+
 // A value as it is handed in: any integer, floating-point number or text. It becomes a value of the
 // type that the parameter or column has:
 //   an integer    any type of numbers; PF_RANGE beyond an integer type's range
