@@ -40,12 +40,11 @@ class List {
 
   // ---- Values ----
 
-  // The value of a parameter of exactly the type T (no std::string_view); the list's cursor, which
+  // The value of a parameter of exactly the type T (text: std::string); the list's cursor, which
   // only C code sees, stays. One call into the library, for texts beyond 255 characters two.
   //   PF_NOPARAM, PF_BADTYPE
-  template <Readable T>
-  requires(!std::same_as<T, std::string_view>) T get(const NameArg& parameter)
-  const;
+  template <Storable T>
+  T get(const NameArg& parameter) const;
 
   // Changes a value. An integer or a fraction becomes a value of the parameter's type, see Cell.
   //   PF_NOPARAM, PF_BADTYPE
@@ -184,9 +183,8 @@ inline std::size_t List::size() const {
   return static_cast<std::size_t>(count);
 }
 
-template <Readable T>
-requires(!std::same_as<T, std::string_view>) T List::get(const NameArg& parameter)
-const {
+template <Storable T>
+T List::get(const NameArg& parameter) const {
   const char* const name = exact(parameter);
   constexpr auto type = static_cast<std::int32_t>(type_of<T>);
   std::size_t size = 0;

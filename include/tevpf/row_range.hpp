@@ -165,9 +165,7 @@ class RowRange : public std::ranges::view_base {
   //   for (auto [symbol, melting] : rows.fields<std::string_view, float>("symbol", "melting"))
   // Names and types are checked here, once.   PF_NOCOLUMN; PF_BADTYPE: not exactly that type
   template <Readable... Ts, std::convertible_to<std::string_view>... Names>
-  requires(sizeof...(Ts) == sizeof...(Names) &&
-           sizeof...(Ts) > 0) FieldRange<Ts...> fields(const Names&... columns)
-  const;
+  FieldRange<Ts...> fields(const Names&... columns) const;
 
  private:
   friend class Table;
@@ -265,9 +263,8 @@ inline RowRange RowRange::from(const Cell& key) const {
 }
 
 template <Readable... Ts, std::convertible_to<std::string_view>... Names>
-requires(sizeof...(Ts) == sizeof...(Names) &&
-         sizeof...(Ts) > 0) FieldRange<Ts...> RowRange::fields(const Names&... columns)
-const {
+FieldRange<Ts...> RowRange::fields(const Names&... columns) const {
+  static_assert(sizeof...(Ts) == sizeof...(Names) && sizeof...(Ts) > 0, "a type for each column");
   const detail::Layout& layout = *table_.layout();
   return {
       *this, table_.layout(), {layout.typed<Ts>(layout.at(std::string_view(columns))).offset...}};

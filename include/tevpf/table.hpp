@@ -98,11 +98,10 @@ class Table {
   //   PF_BADARG  the prefix holds a "*"
   std::optional<Row> find_prefix(std::string_view column, std::string_view prefix) const;
 
-  // One column's values of all rows in storage order; not of std::string_view. O(n).
+  // One column's values of all rows in storage order. O(n).
   //   PF_NOCOLUMN; PF_BADTYPE: not exactly that type
-  template <Readable T>
-  requires(!std::same_as<T, std::string_view>) std::vector<T> column(std::string_view column)
-  const;
+  template <Storable T>
+  std::vector<T> column(std::string_view column) const;
 
   // The same into storage of the caller, without the vector's zeroing; gives the number of rows.
   //   PF_BADARG  there are more rows than the storage has room for
@@ -307,9 +306,8 @@ inline const detail::Place& Table::typed_place(std::string_view column, Type typ
   return place;
 }
 
-template <Readable T>
-requires(!std::same_as<T, std::string_view>) std::vector<T> Table::column(std::string_view column)
-const {
+template <Storable T>
+std::vector<T> Table::column(std::string_view column) const {
   const detail::Place& place = typed_place(column, type_of<T>);
   const std::size_t rows = size();
   std::vector<T> result(rows);

@@ -37,13 +37,15 @@ struct Bounds {
   bool operator==(const Bounds&) const = default;
 };
 
-// The C++ types in which stored numbers are read, and those in which all values are: a string as
-// std::string, or where the text stays in place (in a row) as std::string_view.
+// The C++ types of numbers, of all values, and of values as rows are read: where the text stays in place
+// a string can be a std::string_view.
 template <class T>
 concept Number = std::same_as<T, std::int32_t> || std::same_as<T, std::int16_t> ||
     std::same_as<T, float> || std::same_as<T, double>;
 template <class T>
-concept Readable = Number<T> || std::same_as<T, std::string> || std::same_as<T, std::string_view>;
+concept Storable = Number<T> || std::same_as<T, std::string>;
+template <class T>
+concept Readable = Storable<T> || std::same_as<T, std::string_view>;
 
 template <Readable T>
 inline constexpr Type type_of = std::same_as<T, std::int32_t>   ? Type::int32
@@ -74,10 +76,11 @@ constexpr const char* to_string(Type type) noexcept {
 }
 
 namespace detail {
+// The integral types that are numbers.
 template <class T>
-inline constexpr bool is_character =
-    std::same_as<T, char> || std::same_as<T, wchar_t> || std::same_as<T, char8_t> ||
-    std::same_as<T, char16_t> || std::same_as<T, char32_t>;
+concept Integer = std::integral<T> && !std::same_as<T, bool> && !std::same_as<T, char> &&
+                  !std::same_as<T, wchar_t> && !std::same_as<T, char8_t> &&
+                  !std::same_as<T, char16_t> && !std::same_as<T, char32_t>;
 }  // namespace detail
 
 // A value as it is handed in: any integer, floating-point number or text. It becomes a value of the
@@ -89,9 +92,8 @@ inline constexpr bool is_character =
 // call that it is an argument of.
 class Cell {
  public:
-  template <std::integral T>
-  requires(!std::same_as<T, bool>) Cell(T number)
-  noexcept {
+  template <detail::Integer T>
+  Cell(T number) noexcept {
     if (std::in_range<std::int64_t>(number)) {
       given_ = static_cast<std::int64_t>(number);
     } else {
