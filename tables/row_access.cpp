@@ -2,12 +2,12 @@
 // column, which are then as before.
 #include <algorithm>
 
-#include "core/directory.h"
-#include "core/status.h"
+#include "core/base/status.h"
 #include "include/tevpf_access.h"
 #include "tables/column_index.h"
 #include "tables/column_record.h"
 #include "tables/cursor.h"
+#include "tables/directory.h"
 
 using namespace tevpf;
 
@@ -55,7 +55,7 @@ TEVPF_STATUS tevpf_get_rows(const char* table_name, const char* order_name, std:
                             std::int32_t* numbers_out) noexcept {
   TEVPF_TABLE* table;
   TEVPF_COLUMN* order;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_table(table_name, table));
   PF_TRY(find_order(*table, order_name, order));
   if (*count < 0) return fail(PF_BADPOS, Text(*count), Text(table->num_rows));
   PF_TRY(check_request(*table, first, row_size));
@@ -78,7 +78,7 @@ TEVPF_STATUS tevpf_find_row(const char* table_name, const char* column_name, std
                             std::int32_t* number_out) noexcept {
   TEVPF_TABLE* table;
   TEVPF_COLUMN* column;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_table(table_name, table));
   PF_TRY(TEV8R1_get_col_ptr(table, column_name, &column));
   PF_TRY(check_request(*table, first, row_size));
 
