@@ -4,13 +4,14 @@
 #include <cerrno>
 #include <cstdio>
 #include <cstdlib>
-#include <cstring>
+#include <filesystem>
 #include <memory>
 #include <system_error>
 #include <utility>
 
 #include "failure.h"
 #include "messages.h"
+#include "platform.h"
 #include "temp_file.h"
 #include "text.h"
 
@@ -31,25 +32,58 @@ std::string library_name(const std::string& path) {
   return path.starts_with('$') ? "./" + path : path;
 }
 
+struct CloseStream {
+  void operator()(std::FILE* stream) const { std::fclose(stream); }
+};
+using Stream = std::unique_ptr<std::FILE, CloseStream>;
+
+[[noreturn]] void cannot_read(const std::string& path, const std::error_code& error) {
+  throw Failure(kUnreadable, visible(path) + ": it cannot be read: " + error.message());
+}
+
+std::error_code last_error() { return {errno, std::generic_category()}; }
+
 // Opening with the library creates a file that is not there, and empties one that it may write but
 // not read. Neither may happen by looking at it.
-void check_readable(const std::string& path) {
+Stream open_readable(const std::string& path) {
   std::error_code error;
   const fs::file_status status = fs::status(path, error);
   if (status.type() == fs::file_type::not_found) {
     throw Failure(kUnreadable, visible(path) + ": there is no such file; 'tevpf new' makes one");
   }
-  if (!error && status.type() != fs::file_type::regular) {
+  if (error) cannot_read(path, error);
+  if (status.type() != fs::file_type::regular) {
     throw Failure(kUnreadable, visible(path) + ": it is not a regular file; name a parameter file");
   }
-  std::FILE* stream = error ? nullptr : std::fopen(path.c_str(), "rb");
-  if (stream == nullptr) {
-    throw Failure(kUnreadable, visible(path) + ": it cannot be read: " +
-                                   (error ? error.message() : std::strerror(errno)) +
-                                   "; check its permissions");
-  }
-  std::fclose(stream);
+  Stream stream(std::fopen(path.c_str(), "rb"));
+  if (!stream) cannot_read(path, last_error());
+  return stream;
 }
+
+void read_to_the_end(const std::string& path) {
+  const Stream stream = open_readable(path);
+  std::vector<char> block(std::size_t{1} << 20U);
+  while (std::fread(block.data(), 1, block.size(), stream.get()) == block.size()) {
+  }
+  if (std::ferror(stream.get()) != 0) cannot_read(path, last_error());
+}
+
+bool means_damage(TEVPF_STATUS status) {
+  return status == PF_BADFORMAT || status == PF_BADTYPE || status == PF_DUPLICATE ||
+         status == PF_BADFILE;
+}
+
+// What tells whether a file on the disk has been touched.
+struct Stamp {
+  std::uintmax_t size;
+  fs::file_time_type written;
+  explicit Stamp(const std::string& path) {
+    std::error_code ignored;
+    size = fs::file_size(path, ignored);
+    written = fs::last_write_time(path, ignored);
+  }
+  bool operator==(const Stamp&) const = default;
+};
 
 void check_length(const std::string& path) {
   if (library_name(path).size() < TEVPF_FILE_NAME_SIZE) return;
@@ -69,33 +103,40 @@ const char* kind_word(Kind kind) {
   return kind == Kind::kList ? "list" : kind == Kind::kTable ? "table" : "list or table";
 }
 
-PfFile::PfFile(std::string path, Use use) : path_(std::move(path)) {
+PfFile::PfFile(std::string path, Use use) : path_(std::move(path)), new_(use == Use::kCreate) {
   check_length(path_);
   TEV8R1_PF_init();
-  const TEVPF_STATUS status = TEV8R1_PF_open(library_name(path_).c_str());
-  switch (status) {
-    case PF_NEWFILE:
-    case PF_NORMAL:
-      break;
-    case PF_BADFORMAT:
-    case PF_BADTYPE:
-    case PF_DUPLICATE:
-      damage_ = find_damage(status);
-      break;
-    case PF_BADFILE:
-      throw Failure(kUnreadable, visible(path_) + ": " + reason(status));
-    default:
-      if (status == PF_NOMEM) TEV8R1_PF_close(0);  // it may be open with what was loaded
-      throw library_failure(status, path_, "open it");
+  // The library would make a new file at once and leave it there, empty, if it were killed.
+  const std::string name = new_ ? empty_device() : library_name(path_);
+  TEVPF_STATUS status = load(name);
+  if (means_damage(status)) {
+    // A failed read looks like the end of the file to it: damage is what stays when all can be read.
+    read_to_the_end(path_);
+    close();
+    status = load(name);
   }
-  open_ = true;
-  if (use == Use::kRead) return;
+  if (status == PF_BADFILE) throw Failure(kUnreadable, visible(path_) + ": " + reason(status));
+  if (means_damage(status)) {
+    damage_ = find_damage(status);
+  } else if (status != PF_NORMAL) {
+    close();
+    throw library_failure(status, path_, "open it");
+  }
+  if (use != Use::kChange) return;
   try {
     refuse_changes();
   } catch (...) {
     close();
     throw;
   }
+}
+
+TEVPF_STATUS PfFile::load(const std::string& name) {
+  const TEVPF_STATUS status = TEV8R1_PF_open(name.c_str());
+  // A file that could not be loaded whole is open with a part of it.
+  open_ =
+      status == PF_NORMAL || status == PF_NOMEM || (means_damage(status) && status != PF_BADFILE);
+  return status;
 }
 
 std::string PfFile::find_damage(TEVPF_STATUS status) const {
@@ -129,12 +170,12 @@ void PfFile::close() {
 }
 
 PfFile PfFile::open_to_read(const std::string& path) {
-  check_readable(path);
+  open_readable(path);
   return {path, Use::kRead};
 }
 
 PfFile PfFile::open_to_change(const std::string& path) {
-  check_readable(path);
+  open_readable(path);
   return {path, Use::kChange};
 }
 
@@ -146,13 +187,19 @@ PfFile PfFile::create(const std::string& path) {
                                 (error ? "cannot be looked at: " + error.message()
                                        : "exists already; choose another name or remove it first"));
   }
-  return {path, Use::kChange};
+  return {path, Use::kCreate};
 }
 
 PfFile PfFile::open_or_create(const std::string& path) {
   std::error_code ignored;
   const bool is_there = fs::symlink_status(path, ignored).type() != fs::file_type::not_found;
   return is_there ? open_to_change(path) : create(path);
+}
+
+std::uintmax_t PfFile::size() const {
+  std::error_code error;
+  const std::uintmax_t bytes = fs::file_size(path_, error);
+  return error ? 0 : bytes;
 }
 
 std::vector<Element> PfFile::elements() const {
@@ -202,20 +249,26 @@ Element PfFile::find(const std::string& name, Kind kind) const {
 }
 
 void PfFile::save() {
-  std::error_code error;
-  const fs::path resolved = fs::canonical(path_, error);  // a link stays a link
-  const fs::path target = error ? fs::path(path_) : resolved;
-  TempFile whole = TempFile::beside(target);
-  const TEVPF_STATUS status = TEV8R1_PF_save(whole.path().string().c_str());
+  const HoldInterrupts hold;
+  const Stamp before(path_);
+  const TEVPF_STATUS status = new_ ? save_new() : TEV8R1_PF_save(nullptr);
   if (status != PF_NORMAL) {
-    throw Failure(kCannotWrite,
-                  visible(path_) + ": it cannot be saved: " +
-                      (status == PF_OPENFAIL ? "its new content found no room beside it; make room"
-                                             : reason(status)) +
-                      "; the file is as it was before");
+    // A file that cannot be replaced in one step was written over.
+    const bool touched = Stamp(path_) != before;
+    throw Failure(
+        kCannotWrite,
+        visible(path_) + ": it cannot be saved: " +
+            (status == PF_OPENFAIL ? "its new content could not be written; make room" : reason(status)) +
+            (touched ? "; only a part of it is on the disk" : "; it is as it was before"));
   }
   close();
-  whole.replace(target);
+}
+
+TEVPF_STATUS PfFile::save_new() const {
+  TempFile file(path_);
+  const TEVPF_STATUS status = TEV8R1_PF_save(file.path_for_library().c_str());
+  if (status == PF_NORMAL) file.become_target();
+  return status;
 }
 
 void check_new_name(const std::string& name, const std::string& what) {

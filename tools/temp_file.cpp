@@ -1,8 +1,6 @@
 #include "temp_file.h"
 
 #include <cerrno>
-#include <cstring>
-#include <random>
 #include <system_error>
 #include <utility>
 
@@ -13,68 +11,47 @@
 namespace fs = std::filesystem;
 
 namespace tool {
-namespace {
 
-std::string random_letters() {
-  static constexpr std::string_view kLetters = "abcdefghijklmnopqrstuvwxyz0123456789";
-  std::random_device device;
-  std::uniform_int_distribution<std::size_t> pick(0, kLetters.size() - 1);
-  std::string letters(10, ' ');
-  for (char& letter : letters) letter = kLetters[pick(device)];
-  return letters;
-}
-
-fs::path new_file(const fs::path& folder, const std::string& prefix, bool is_private) {
-  for (int attempt = 0; attempt < 100; ++attempt) {
-    fs::path path = folder / (prefix + random_letters());
-    if (create_exclusively(path, is_private)) return path;
-    if (errno != EEXIST) break;
+TempFile::TempFile(fs::path target) : target_(std::move(target)) {
+  const HoldInterrupts hold;  // until the file is known as one to remove
+  const fs::path folder = target_.parent_path();
+  std::string name = (folder / ".tevpf-XXXXXX").string();
+  stream_ = make_unique_file(name);
+  if (stream_ == nullptr) {
+    throw Failure(kCannotWrite, "cannot create a file in " +
+                                    in_quotes(folder.empty() ? "." : folder.string()) + ": " +
+                                    std::generic_category().message(errno) +
+                                    "; make room or choose another folder");
   }
-  const std::string place = folder.empty() ? "." : folder.string();
-  throw Failure(kCannotWrite, "cannot create a file in " + in_quotes(place) + ": " +
-                                  std::strerror(errno) + "; make room or choose another folder");
-}
-
-}  // namespace
-
-TempFile::TempFile(fs::path path) : path_(std::move(path)) { remove_on_interrupt(path_); }
-
-TempFile::TempFile(TempFile&& other) noexcept : path_(std::exchange(other.path_, {})) {}
-
-TempFile TempFile::beside(const fs::path& target) {
-  return TempFile(new_file(target.parent_path(), ".tevpf-", false));
-}
-
-TempFile TempFile::anywhere() {
-  std::error_code error;
-  const fs::path folder = fs::temp_directory_path(error);
-  return TempFile(new_file(error ? fs::path(".") : folder, "tevpf-", true));
+  name_ = std::move(name);
+  remove_on_interrupt(name_);
 }
 
 TempFile::~TempFile() {
-  if (path_.empty()) return;
+  if (stream_ != nullptr) std::fclose(stream_);
+  if (name_.empty()) return;
   std::error_code ignored;
-  fs::remove(path_, ignored);
+  fs::remove(name_, ignored);
   remove_on_interrupt({});
 }
 
-void TempFile::replace(const fs::path& target) {
-  std::error_code error, ignored;
-  if (!flush_to_disk(path_)) {
-    error = std::error_code(errno, std::generic_category());
-  } else {
-    const fs::file_status old = fs::status(target, ignored);
-    if (fs::is_regular_file(old)) {
-      copy_owner(target, path_);
-      fs::permissions(path_, old.permissions(), ignored);
-    }
-    fs::rename(path_, target, error);
-  }
+std::string TempFile::path_for_library() const { return path_of(stream_, name_); }
+
+void TempFile::commit(bool replace) {
+  std::error_code error;
+  const auto require = [&](bool done) {
+    if (!done && !error) error = std::error_code(errno, std::generic_category());
+  };
+  require(copy_rights(stream_, replace ? target_ : fs::path()));
+  require(flush_to_disk(stream_));
+  require(std::fclose(std::exchange(stream_, nullptr)) == 0);
+  if (!error && replace) fs::rename(name_, target_, error);
+  if (!error && !replace) require(rename_to_new(name_, target_));
   if (error) {
-    throw Failure(kCannotWrite, in_quotes(target.string()) + " cannot be written: " +
-                                    error.message() + "; it is as it was before");
+    throw Failure(kCannotWrite, in_quotes(target_.string()) + " cannot be written: " +
+                                    error.message() + "; what was there is as before");
   }
-  path_.clear();
+  name_.clear();
   remove_on_interrupt({});
 }
 

@@ -1,7 +1,9 @@
-// A file under construction: it takes its final name only when it is whole, and is removed
-// otherwise.
+// A file under construction: this user's alone until it takes its final name, which it does only
+// when it is whole; removed otherwise. It is opened once: whatever happens to its name, nothing
+// else is written.
 #pragma once
 
+#include <cstdio>
 #include <filesystem>
 #include <string>
 
@@ -9,23 +11,27 @@ namespace tool {
 
 class TempFile {
  public:
-  // An empty new file beside `target`, so that it can be renamed to it.
-  static TempFile beside(const std::filesystem::path& target);
-  // One in the system's folder for temporary files, readable by this user alone.
-  static TempFile anywhere();
-
-  TempFile(TempFile&& other) noexcept;
-  TempFile& operator=(TempFile&&) = delete;
+  // An empty new file beside `target`, which will be its final name.
+  explicit TempFile(std::filesystem::path target);
+  TempFile(const TempFile&) = delete;
+  TempFile& operator=(const TempFile&) = delete;
   ~TempFile();
 
-  const std::filesystem::path& path() const { return path_; }
+  std::FILE* stream() const { return stream_; }
+  std::string path_for_library() const;
 
-  // Takes the target's place, with the permissions and the owner that the target had.
-  void replace(const std::filesystem::path& target);
+  // It is whole, and takes the place of the target, with the permissions and the owner of what
+  // stood there.
+  void replace_target() { commit(true); }
+  // The same, but a file that has come to stand there stays, and this is a Failure.
+  void become_target() { commit(false); }
 
  private:
-  explicit TempFile(std::filesystem::path path);
-  std::filesystem::path path_;
+  void commit(bool replace);
+
+  std::filesystem::path target_;
+  std::string name_;  // empty: not, or no longer, a temporary file
+  std::FILE* stream_ = nullptr;
 };
 
 }  // namespace tool
