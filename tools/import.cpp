@@ -1,12 +1,11 @@
 // tevpf import: the rows of a CSV file into a table, all of them or none.
 #include <array>
-#include <cerrno>
 #include <cstdio>
-#include <cstring>
 #include <memory>
 
 #include "commands.h"
 #include "output.h"
+#include "platform.h"
 #include "table_import.h"
 #include "text.h"
 
@@ -26,12 +25,11 @@ std::string read_whole(const std::string& path) {
   std::array<char, 65536> block;
   while (stream) {
     const std::size_t count = std::fread(block.data(), 1, block.size(), stream.get());
-    text.append(block.data(), count);
-    if (count == block.size()) continue;
     if (std::ferror(stream.get()) != 0) break;
-    return text;
+    text.append(block.data(), count);
+    if (count < block.size()) return text;
   }
-  throw Failure(kUnreadable, visible(path) + ": it cannot be read: " + std::strerror(errno) +
+  throw Failure(kUnreadable, visible(path) + ": it cannot be read: " + last_error().message() +
                                  "; name a CSV file, or - for standard input");
 }
 

@@ -41,7 +41,7 @@ Output::Output(const std::string& name, const fs::path& source) : name_(name) {
   if (!fs::exists(target_, ignored) || fs::is_regular_file(target_, ignored)) {
     if (fs::exists(target_, ignored)) {
       std::FILE* writable = std::fopen(name.c_str(), "r+b");
-      if (writable == nullptr) fail(errno);
+      if (writable == nullptr) fail(last_error());
       std::fclose(writable);
     }
     temp_.emplace(target_);
@@ -49,7 +49,7 @@ Output::Output(const std::string& name, const fs::path& source) : name_(name) {
     return;
   }
   stream_ = std::fopen(target_.string().c_str(), "wb");
-  if (stream_ == nullptr) fail(errno);
+  if (stream_ == nullptr) fail(last_error());
   to_terminal_ = is_terminal(stream_);
 }
 
@@ -57,15 +57,15 @@ Output::~Output() {
   if (stream_ != nullptr && stream_ != stdout && !temp_) std::fclose(stream_);
 }
 
-void Output::fail(int error) {
-  if (error == EPIPE) throw ClosedPipe{};
+void Output::fail(const std::error_code& error) {
+  if (error == std::errc::broken_pipe) throw ClosedPipe{};
   throw Failure(kCannotWrite, (target_.empty() ? "standard output" : in_quotes(name_)) +
-                                  " cannot be written: " + std::generic_category().message(error) +
+                                  " cannot be written: " + error.message() +
                                   "; make room or choose another file");
 }
 
 void Output::put(std::string_view text) {
-  if (std::fwrite(text.data(), 1, text.size(), stream_) != text.size()) fail(errno);
+  if (std::fwrite(text.data(), 1, text.size(), stream_) != text.size()) fail(last_error());
 }
 
 void Output::write(std::string_view text) {
@@ -78,9 +78,12 @@ void Output::write(std::string_view text) {
 
 void Output::finish() {
   put(visible_lines(line_));
-  if (std::fflush(stream_) != 0) fail(errno);
-  if (temp_) return temp_->replace_target();
-  if (stream_ != stdout && std::fclose(std::exchange(stream_, nullptr)) != 0) fail(errno);
+  if (std::fflush(stream_) != 0) fail(last_error());
+  if (temp_) {
+    if (const std::error_code error = temp_->replace_target()) fail(error);
+    return;
+  }
+  if (stream_ != stdout && std::fclose(std::exchange(stream_, nullptr)) != 0) fail(last_error());
 }
 
 void print(const std::string& text) {

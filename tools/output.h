@@ -7,6 +7,7 @@
 #include <optional>
 #include <string>
 #include <string_view>
+#include <system_error>
 
 #include "temp_file.h"
 
@@ -28,7 +29,7 @@ class Output {
   void finish();
 
  private:
-  [[noreturn]] void fail(int error);
+  [[noreturn]] void fail(const std::error_code& error);
   void put(std::string_view text);
 
   std::string name_;              // as it was given, for messages

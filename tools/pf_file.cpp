@@ -1,7 +1,6 @@
 #include "pf_file.h"
 
 #include <algorithm>
-#include <cerrno>
 #include <cstdio>
 #include <cstdlib>
 #include <filesystem>
@@ -40,8 +39,6 @@ using Stream = std::unique_ptr<std::FILE, CloseStream>;
 [[noreturn]] void cannot_read(const std::string& path, const std::error_code& error) {
   throw Failure(kUnreadable, visible(path) + ": it cannot be read: " + error.message());
 }
-
-std::error_code last_error() { return {errno, std::generic_category()}; }
 
 // Opening with the library creates a file that is not there, and empties one that it may write but
 // not read. Neither may happen by looking at it.
@@ -251,24 +248,29 @@ Element PfFile::find(const std::string& name, Kind kind) const {
 void PfFile::save() {
   const HoldInterrupts hold;
   const Stamp before(path_);
-  const TEVPF_STATUS status = new_ ? save_new() : TEV8R1_PF_save(nullptr);
-  if (status != PF_NORMAL) {
+  const std::string obstacle = new_ ? write_new() : write_again();
+  if (!obstacle.empty()) {
     // A file that cannot be replaced in one step was written over.
     const bool touched = Stamp(path_) != before;
-    throw Failure(
-        kCannotWrite,
-        visible(path_) + ": it cannot be saved: " +
-            (status == PF_OPENFAIL ? "its new content could not be written; make room" : reason(status)) +
-            (touched ? "; only a part of it is on the disk" : "; it is as it was before"));
+    throw Failure(kCannotWrite, visible(path_) + ": it cannot be saved: " + obstacle +
+                                    (touched ? "; only a part of it is on the disk"
+                                             : "; it is as it was before"));
   }
   close();
 }
 
-TEVPF_STATUS PfFile::save_new() const {
+std::string PfFile::write_again() const {
+  const TEVPF_STATUS status = TEV8R1_PF_save(nullptr);
+  if (status == PF_OPENFAIL) return "its new content could not be written; make room";
+  return status == PF_NORMAL ? "" : reason(status);
+}
+
+std::string PfFile::write_new() const {
   TempFile file(path_);
   const TEVPF_STATUS status = TEV8R1_PF_save(file.path_for_library().c_str());
-  if (status == PF_NORMAL) file.become_target();
-  return status;
+  if (status != PF_NORMAL) return "it could not be written; make room";
+  const std::error_code error = file.become_target();
+  return error ? error.message() : "";
 }
 
 void check_new_name(const std::string& name, const std::string& what) {

@@ -11,7 +11,6 @@
 #include <cstring>
 #include <memory>
 #include <string>
-#include <system_error>
 
 #ifdef _WIN32
 #include <io.h>
@@ -51,6 +50,8 @@ void catch_interrupts() {
 }
 
 }  // namespace
+
+std::error_code last_error() { return {errno, std::generic_category()}; }
 
 void remove_on_interrupt(const fs::path& file) {
   const HoldInterrupts hold;
@@ -111,7 +112,7 @@ void collect(const std::function<void(const std::string& path)>& make,
     }
   };
   const Removed file;
-  if (file.stream == nullptr) throw std::system_error(errno, std::generic_category(), file.name);
+  if (file.stream == nullptr) throw std::system_error(last_error(), file.name);
   make(file.name);
   std::array<char, 65536> block;
   while (const std::size_t count = std::fread(block.data(), 1, block.size(), file.stream)) {
@@ -229,7 +230,7 @@ const char* empty_device() { return "/dev/null"; }
 void collect(const std::function<void(const std::string& path)>& make,
              const std::function<void(std::string_view)>& take) {
   int ends[2];
-  if (pipe2(ends, O_CLOEXEC) != 0) throw std::system_error(errno, std::generic_category(), "pipe");
+  if (pipe2(ends, O_CLOEXEC) != 0) throw std::system_error(last_error(), "pipe");
   std::future<void> made = std::async(std::launch::async, [&make, end = ends[1]] {
     const Descriptor closed_afterwards(end);
     make(path_of(end));
@@ -238,7 +239,7 @@ void collect(const std::function<void(const std::string& path)>& make,
   std::array<char, 65536> block;
   for (;;) {
     const ssize_t count = read(ends[0], block.data(), block.size());
-    if (count < 0) throw std::system_error(errno, std::generic_category(), "pipe");
+    if (count < 0) throw std::system_error(last_error(), "pipe");
     if (count == 0) break;
     take({block.data(), static_cast<std::size_t>(count)});
   }

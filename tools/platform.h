@@ -7,8 +7,12 @@
 #include <functional>
 #include <string>
 #include <string_view>
+#include <system_error>
 
 namespace tool {
+
+// What errno says.
+std::error_code last_error();
 
 // To be called first. Standard output carries bytes unchanged; a closed pipe and a size limit are
 // errors of writing, not signals; an interrupt removes the file that remove_on_interrupt names,

@@ -1,7 +1,5 @@
 #include "temp_file.h"
 
-#include <cerrno>
-#include <system_error>
 #include <utility>
 
 #include "failure.h"
@@ -18,10 +16,9 @@ TempFile::TempFile(fs::path target) : target_(std::move(target)) {
   std::string name = (folder / ".tevpf-XXXXXX").string();
   stream_ = make_unique_file(name);
   if (stream_ == nullptr) {
-    throw Failure(kCannotWrite, "cannot create a file in " +
-                                    in_quotes(folder.empty() ? "." : folder.string()) + ": " +
-                                    std::generic_category().message(errno) +
-                                    "; make room or choose another folder");
+    throw Failure(kCannotWrite,
+                  "cannot create a file in " + in_quotes(folder.empty() ? "." : folder.string()) +
+                      ": " + last_error().message() + "; make room or choose another folder");
   }
   name_ = std::move(name);
   remove_on_interrupt(name_);
@@ -37,22 +34,21 @@ TempFile::~TempFile() {
 
 std::string TempFile::path_for_library() const { return path_of(stream_, name_); }
 
-void TempFile::commit(bool replace) {
+std::error_code TempFile::commit(bool replace) {
   std::error_code error;
   const auto require = [&](bool done) {
-    if (!done && !error) error = std::error_code(errno, std::generic_category());
+    if (!done && !error) error = last_error();
   };
   require(copy_rights(stream_, replace ? target_ : fs::path()));
   require(flush_to_disk(stream_));
   require(std::fclose(std::exchange(stream_, nullptr)) == 0);
   if (!error && replace) fs::rename(name_, target_, error);
   if (!error && !replace) require(rename_to_new(name_, target_));
-  if (error) {
-    throw Failure(kCannotWrite, in_quotes(target_.string()) + " cannot be written: " +
-                                    error.message() + "; what was there is as before");
+  if (!error) {
+    name_.clear();
+    remove_on_interrupt({});
   }
-  name_.clear();
-  remove_on_interrupt({});
+  return error;
 }
 
 }  // namespace tool

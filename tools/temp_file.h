@@ -6,6 +6,7 @@
 #include <cstdio>
 #include <filesystem>
 #include <string>
+#include <system_error>
 
 namespace tool {
 
@@ -21,13 +22,13 @@ class TempFile {
   std::string path_for_library() const;
 
   // It is whole, and takes the place of the target, with the permissions and the owner of what
-  // stood there.
-  void replace_target() { commit(true); }
-  // The same, but a file that has come to stand there stays, and this is a Failure.
-  void become_target() { commit(false); }
+  // stood there. After an error, that is as it was.
+  [[nodiscard]] std::error_code replace_target() { return commit(true); }
+  // The same, but a file that has come to stand there stays, and this is an error.
+  [[nodiscard]] std::error_code become_target() { return commit(false); }
 
  private:
-  void commit(bool replace);
+  std::error_code commit(bool replace);
 
   std::filesystem::path target_;
   std::string name_;  // empty: not, or no longer, a temporary file
