@@ -94,6 +94,21 @@ void append(std::vector<Element>& elements, Kind kind, std::int32_t count,
   for (std::int32_t i = 0; i < count; ++i) elements.push_back({kind, names[i], descriptions[i]});
 }
 
+// Gives what stood in the way, or nothing.
+std::string save_in_place() {
+  const TEVPF_STATUS status = TEV8R1_PF_save(nullptr);
+  if (status == PF_OPENFAIL) return "its new content could not be written; make room";
+  return status == PF_NORMAL ? "" : reason(status);
+}
+
+std::string save_as_new(const std::string& path) {
+  TempFile file(path);
+  const TEVPF_STATUS status = TEV8R1_PF_save(file.path_for_library().c_str());
+  if (status != PF_NORMAL) return "it could not be written; make room";
+  const std::error_code error = file.become_target();
+  return error ? error.message() : "";
+}
+
 }  // namespace
 
 const char* kind_word(Kind kind) {
@@ -108,8 +123,8 @@ PfFile::PfFile(std::string path, Use use) : path_(std::move(path)), new_(use == 
   TEVPF_STATUS status = load(name);
   if (means_damage(status)) {
     // A failed read looks like the end of the file to it: damage is what stays when all can be read.
-    read_to_the_end(path_);
     close();
+    read_to_the_end(path_);
     status = load(name);
   }
   if (status == PF_BADFILE) throw Failure(kUnreadable, visible(path_) + ": " + reason(status));
@@ -130,9 +145,8 @@ PfFile::PfFile(std::string path, Use use) : path_(std::move(path)), new_(use == 
 
 TEVPF_STATUS PfFile::load(const std::string& name) {
   const TEVPF_STATUS status = TEV8R1_PF_open(name.c_str());
-  // A file that could not be loaded whole is open with a part of it.
-  open_ =
-      status == PF_NORMAL || status == PF_NOMEM || (means_damage(status) && status != PF_BADFILE);
+  // A file that could not be loaded whole is open with a part of it; closing none does no harm.
+  open_ = status != PF_BADFILE && status != PF_OPENFAIL;
   return status;
 }
 
@@ -248,7 +262,7 @@ Element PfFile::find(const std::string& name, Kind kind) const {
 void PfFile::save() {
   const HoldInterrupts hold;
   const Stamp before(path_);
-  const std::string obstacle = new_ ? write_new() : write_again();
+  const std::string obstacle = new_ ? save_as_new(path_) : save_in_place();
   if (!obstacle.empty()) {
     // A file that cannot be replaced in one step was written over.
     const bool touched = Stamp(path_) != before;
@@ -257,20 +271,6 @@ void PfFile::save() {
                                              : "; it is as it was before"));
   }
   close();
-}
-
-std::string PfFile::write_again() const {
-  const TEVPF_STATUS status = TEV8R1_PF_save(nullptr);
-  if (status == PF_OPENFAIL) return "its new content could not be written; make room";
-  return status == PF_NORMAL ? "" : reason(status);
-}
-
-std::string PfFile::write_new() const {
-  TempFile file(path_);
-  const TEVPF_STATUS status = TEV8R1_PF_save(file.path_for_library().c_str());
-  if (status != PF_NORMAL) return "it could not be written; make room";
-  const std::error_code error = file.become_target();
-  return error ? error.message() : "";
 }
 
 void check_new_name(const std::string& name, const std::string& what) {

@@ -51,9 +51,6 @@ class PfFile {
   TEVPF_STATUS load(const std::string& name);
   std::string find_damage(TEVPF_STATUS status) const;
   void refuse_changes() const;  // throws when it may not be written, or is damaged
-  // Both give what stood in the way, or nothing.
-  std::string write_again() const;
-  std::string write_new() const;
   void close();
 
   std::string path_, damage_;
