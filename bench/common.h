@@ -20,9 +20,18 @@ namespace bench {
 
 inline constexpr std::uint32_t kSeed = 20240229;
 
-// Beyond this size an operation that costs O(n) is timed over kFewOperations of them.
+// What changes a table or list of n is timed over so many operations at most, spread at random over
+// all of it. Beyond kManyRows, adding is the last of them, to what was there before.
 inline constexpr std::int64_t kManyRows = 100'000;
-inline constexpr std::int64_t kFewOperations = 1'000;
+inline constexpr std::int64_t kFewOperations = 10'000;
+// The same for what costs milliseconds where each operation moves everything behind it.
+inline constexpr std::int64_t kFewMoves = 1'000;
+
+constexpr std::int64_t already_there(std::int64_t n) {
+  return n > kManyRows ? n - kFewOperations : 0;
+}
+constexpr std::int64_t changes(std::int64_t n) { return std::min(n / 2, kFewOperations); }
+constexpr std::int64_t moves(std::int64_t n) { return std::min(n / 2, kFewMoves); }
 
 // So many random accesses are enough to time one that costs the same from the first on.
 inline constexpr std::int64_t kManyAccesses = 1'000'000;
@@ -38,6 +47,13 @@ inline constexpr std::int64_t kManyAccesses = 1'000'000;
       ::bench::give_up(#call, static_cast<long>(must_));                              \
   } while (0)
 
+// Scrambles a number: always the same for the same number, and never the same for two of them.
+constexpr std::uint32_t scrambled(std::uint32_t x) {
+  x = (x ^ (x >> 16)) * 0x85EBCA6Bu;
+  x = (x ^ (x >> 13)) * 0xC2B2AE35u;
+  return x ^ (x >> 16);
+}
+
 inline std::vector<std::int32_t> shuffled(std::int64_t n) {
   std::vector<std::int32_t> order(static_cast<std::size_t>(n));
   std::iota(order.begin(), order.end(), 0);
@@ -50,6 +66,15 @@ inline std::vector<std::int32_t> some_of(std::int64_t n, std::int64_t count) {
   std::vector<std::int32_t> order = shuffled(n);
   order.resize(static_cast<std::size_t>(std::min(n, count)));
   return order;
+}
+
+// So many random numbers from 0 to below - 1.
+inline std::vector<std::int32_t> random_numbers(std::int64_t count, std::int64_t below) {
+  std::mt19937 random(kSeed);
+  std::uniform_int_distribution<std::int32_t> any(0, static_cast<std::int32_t>(below - 1));
+  std::vector<std::int32_t> numbers(static_cast<std::size_t>(count));
+  std::generate(numbers.begin(), numbers.end(), [&] { return any(random); });
+  return numbers;
 }
 
 // Paths in a folder of this process, which goes when the program ends.
@@ -168,10 +193,12 @@ std::vector<char> contents(const std::string& path);
 // of some figures; a few seconds after memory was given back the host may have taken it again.
 void warm_memory();
 
-// Whole files, timed: saving what is open into a new one, and opening one; and their limits, one
-// write() or read() of the same bytes. `operations` is what the time is divided by.
+// Whole files, timed: saving what is open into a new one, and opening one; SQLite's two ways of
+// saving a database from memory, page by page and as one image; and the limits, one write() or read()
+// of the same bytes. `operations` is what the time is divided by.
 void time_save(benchmark::State& state, std::int64_t operations);
 void time_backup(benchmark::State& state, const Database& from, std::int64_t operations);
+void time_serialize(benchmark::State& state, const Database& from, std::int64_t operations);
 void time_write(benchmark::State& state, const std::string& source, std::int64_t operations);
 void time_open(benchmark::State& state, const std::string& path, std::int64_t operations);
 void time_read(benchmark::State& state, const std::string& path, std::int64_t operations);
@@ -200,8 +227,12 @@ class Timer {
   enum class Clock : clockid_t { kProcessor = CLOCK_THREAD_CPUTIME_ID, kWall = CLOCK_MONOTONIC };
 
   explicit Timer(Clock clock = Clock::kProcessor) : clock_(clock), start_(now()) {}
+  double seconds() const { return now() - start_; }
+  // Ends a pass. All passes of a run must be of as many operations.
   void stop(benchmark::State& state, std::int64_t operations) const {
-    const double seconds = now() - start_;
+    record(state, seconds(), operations);
+  }
+  static void record(benchmark::State& state, double seconds, std::int64_t operations) {
     state.SetIterationTime(seconds);
     state.counters["operations"] = static_cast<double>(operations);
   }

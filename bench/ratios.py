@@ -5,7 +5,8 @@
     ratios.py RESULT.json... --plots D  SVG plots of time per operation against n, in D
 
 A factor above 1 against a peer: the library is faster by it. Against a limit (the plain thing
-without a library) the figure is how many times the limit's time the library takes.
+without a library) the figure is how many times the limit's time the library takes. Where it matters
+how cost grows, it is how many times its own time at the smallest size. Memory is compared likewise.
 """
 import argparse
 import json
@@ -17,7 +18,8 @@ UNIT = {"ns": 1.0, "us": 1e3, "ms": 1e6, "s": 1e9}
 
 
 def medians(paths):
-    """{workload: {contestant: {n: nanoseconds per operation}}}, medians where a run was repeated."""
+    """{workload: {contestant: {n: nanoseconds per operation}}}, medians where a run was repeated; of
+    workloads that measure memory, bytes per operation."""
     runs = defaultdict(list)
     for path in paths:
         with open(path, encoding="utf-8") as file:
@@ -26,8 +28,8 @@ def medians(paths):
             if run.get("run_type") == "aggregate":
                 continue
             workload, contestant, n = run["name"].split("/")[:3]
-            runs[workload, contestant, int(n)].append(
-                run["real_time"] * UNIT[run["time_unit"]] / run["operations"])
+            figure = run.get("bytes", run["real_time"] * UNIT[run["time_unit"]])
+            runs[workload, contestant, int(n)].append(figure / run["operations"])
     table = defaultdict(lambda: defaultdict(dict))
     for (workload, contestant, n), times in runs.items():
         table[workload][contestant][n] = sorted(times)[len(times) // 2]
@@ -38,6 +40,9 @@ def short(n):
     return f"{n // 1_000_000} M" if n >= 1_000_000 else f"{n // 1000} k"
 
 
+MEMORY = {"table memory"}  # the workloads whose figures are bytes
+
+
 def nice(ns):
     return f"{ns:.3g} ns" if ns < 1e3 else f"{ns / 1e3:.3g} us" if ns < 1e6 else f"{ns / 1e6:.3g} ms"
 
@@ -45,20 +50,32 @@ def nice(ns):
 # What is wanted: the factor against each peer and the multiple of the limit's time, by n; a key of 0
 # holds for every n that is not named, and nothing is wanted where neither is there.
 PEER = {
-    "list add": {1_000: 4, 10_000: 3},
+    "list add": {0: 5},
+    "list remove": {1_000_000: 2, 0: 3},
     "list look up": {0: 3},
     "list change": {0: 3},
     "list walk": {0: 15},
-    "list save": {0: {"json": 4, "sqlite": 2}},
+    "list walk after opening": {0: 15},
+    "list walk in a fresh process": {0: 15},
+    "list save": {0: {"json": 4, "sqlite": 1, "sqlite backup": 1}},
     "list open": {0: 15},
     "open lists of 5": {0: 4},
     "open lists of 50": {0: 4},
-    "table append in order": {1_000: 6, 10_000: 6},
-    "table append at random": {1_000: 4, 10_000: 2.5},
-    "table append few values": {1_000: 5, 10_000: 5},
+    "save lists of 5": {0: 1},
+    "save lists of 50": {0: 1},
+    "table append in order": {0: 10},
+    "table append in order, second index at random": {0: 4},
+    "table append at random": {0: 4},
+    "table append few values": {0: 5},
+    "table append and find in turn": {0: 4},
+    "table first 1000 appends after opening": {0: 1},
+    "table session after opening": {1_000_000: 2, 0: 3},
+    "table delete": {1_000_000: 2, 0: 3},
+    "table replace": {0: 3},
     "table read in index order": {0: 30},
     "table find indexed": {1_000: 8, 0: 4},
-    "table find unindexed": {0: 30},
+    "table find unindexed": {1_000: None, 0: 30},
+    "table find unindexed, absent": {1_000: None, 0: 30},
     "table save": {100_000: 1.5, 1_000_000: 1.5},
     "table open": {0: 15},
     "table dump": {0: 3},
@@ -68,6 +85,8 @@ LIMIT = {
     "list look up": {0: 1},
     "list change": {0: 1},
     "list walk": {0: 2},
+    "list walk after opening": {0: 2},
+    "list walk in a fresh process": {0: 2},
     "list save": {100_000: 2, 1_000_000: 2},
     "list open": {0: 5},
     "open lists of 5": {0: 5},
@@ -75,11 +94,25 @@ LIMIT = {
     "table read in index order": {0: 3},
     "table find indexed": {10_000: 2.5, 100_000: 2.5, 1_000_000: 2.5},
     "table find unindexed": {0: 1.5},
+    "table find unindexed, absent": {0: 1.5},
     "table save": {0: 1.4},
     "table save in place": {0: 1.4},
     "table open": {0: 1.5},
     "table dump": {0: 0.5},
     "table listing": {0: 0.5},
+}
+# At most so many nanoseconds, or bytes, per operation.
+MOST = {
+    "table find unindexed": {1_000: None, 0: 0.8},
+    "table find unindexed, absent": {1_000: None, 0: 0.8},
+    "table memory": {0: 100},
+}
+# At most so many times the time at the smallest size; for workloads that no peer does.
+GROWTH = {
+    "list add at a position": {1_000_000: 10},
+    "list move a parameter": {1_000_000: 10},
+    "table insert at a position": {1_000_000: 10},
+    "table move a row": {1_000_000: 10},
 }
 
 
@@ -93,11 +126,40 @@ def factor(ratio):
     return f"{ratio:.2f}" if ratio >= 0.1 else f"{ratio:.1g}"
 
 
-def judged(ratio, text, wanted, met):
+def judged(figure, text, wanted, met):
     if wanted is None:
-        return f"{factor(ratio)}x {text}"
-    figure = f"{factor(ratio)}x {text}" if met else f"**{factor(ratio)}x** {text}"
-    return f"{figure} (wanted {wanted:g})"
+        return f"{figure}{text}"
+    return f"{figure if met else f'**{figure}**'}{text} (wanted {wanted:g})"
+
+
+def at_most(figure, ratio, text, wanted):
+    return judged(figure, text, wanted, wanted is None or ratio <= wanted)
+
+
+def at_least(figure, ratio, text, wanted):
+    return judged(figure, text, wanted, wanted is None or ratio >= wanted)
+
+
+def print_row(workload, n, contestants):
+    ours = contestants["tevpf"]
+    mine = f"{ours[n]:.3g} bytes" if workload in MEMORY else nice(ours[n])
+    own = at_most(mine, ours[n], "", target(MOST, workload, n, None))
+    peers, limits = [], []
+    for name in sorted(contestants):
+        if name == "tevpf" or n not in contestants[name]:
+            continue
+        theirs = contestants[name][n]
+        if name.startswith("limit: "):
+            ratio = ours[n] / theirs
+            limits.append(at_most(factor(ratio) + "x", ratio, " " + name[7:], target(LIMIT, workload, n, name)))
+        else:
+            ratio = theirs / ours[n]
+            peers.append(at_least(factor(ratio) + "x", ratio, " " + name, target(PEER, workload, n, name)))
+    smallest = min(ours)
+    if workload in GROWTH and n != smallest:
+        ratio = ours[n] / ours[smallest]
+        limits.append(at_most(factor(ratio) + "x", ratio, " " + short(smallest), target(GROWTH, workload, n, None)))
+    print(f"| {workload} | {short(n)} | {own} | {', '.join(peers)} | {', '.join(limits)} |")
 
 
 def print_table(context, table):
@@ -105,21 +167,8 @@ def print_table(context, table):
     print("| workload | n | per operation | times as fast as | times the time of |")
     print("|---|---|---|---|---|")
     for workload in sorted(table):
-        contestants = table[workload]
-        for n in sorted(contestants["tevpf"]):
-            ours = contestants["tevpf"][n]
-            peers, limits = [], []
-            for name in sorted(contestants):
-                if name == "tevpf" or n not in contestants[name]:
-                    continue
-                theirs = contestants[name][n]
-                if name.startswith("limit: "):
-                    wanted = target(LIMIT, workload, n, name)
-                    limits.append(judged(ours / theirs, name[7:], wanted, wanted is None or ours / theirs <= wanted))
-                else:
-                    wanted = target(PEER, workload, n, name)
-                    peers.append(judged(theirs / ours, name, wanted, wanted is None or theirs / ours >= wanted))
-            print(f"| {workload} | {short(n)} | {nice(ours)} | {', '.join(peers)} | {', '.join(limits)} |")
+        for n in sorted(table[workload]["tevpf"]):
+            print_row(workload, n, table[workload])
 
 
 WIDTH, HEIGHT, LEFT, TOP, RIGHT, BOTTOM = 640, 400, 70, 40, 170, 50

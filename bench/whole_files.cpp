@@ -83,6 +83,20 @@ void time_backup(benchmark::State& state, const Database& from, std::int64_t ope
   }
 }
 
+void time_serialize(benchmark::State& state, const Database& from, std::int64_t operations) {
+  const std::string path = folder().file("saved.db");
+  warm_memory();
+  for (auto _ : state) {
+    std::filesystem::remove(path);
+    const Timer timer;
+    sqlite3_int64 size = 0;
+    unsigned char* image = sqlite3_serialize(from.get(), "main", &size, 0);
+    write_plainly(path, {reinterpret_cast<const char*>(image), static_cast<std::size_t>(size)});
+    timer.stop(state, operations);
+    sqlite3_free(image);
+  }
+}
+
 void time_write(benchmark::State& state, const std::string& source, std::int64_t operations) {
   const std::vector<char> bytes = contents(source);
   const std::string path = folder().file("saved.pf");

@@ -1,35 +1,57 @@
-// The directory of the current file: its lists and tables by name and in order.
+// The directory of the current file: its elements by name and in order. Elements of every kind go by the
+// same rules; each function takes the type code of the kind.
 #pragma once
 
-#include "core/element.h"
+#include <cstdint>
 
-extern "C" {
-
-TEVPF_API TEVPF_STATUS TEV8R1_create_list(TEVPF_ELEM_HEADER header, TEVPF_LIST** list_out) noexcept;
-TEVPF_API TEVPF_STATUS TEV8R1_create_table(TEVPF_ELEM_HEADER header,
-                                           TEVPF_TABLE** table_out) noexcept;
-TEVPF_API TEVPF_STATUS TEV8R1_insert_list(TEVPF_LIST** list_out) noexcept;
-TEVPF_API TEVPF_STATUS TEV8R1_insert_table(TEVPF_TABLE** table_out) noexcept;
-
-// Find an element of the current file by its exact name.
-//   PF_NOFILE  no file is current; texts empty
-//   PF_NOELEM  no such element; texts: "list" or "table", the name
-TEVPF_API TEVPF_STATUS TEV8R1_get_list_ptr(const char* name, TEVPF_LIST** list_out) noexcept;
-TEVPF_API TEVPF_STATUS TEV8R1_get_table_ptr(const char* name, TEVPF_TABLE** table_out) noexcept;
-
-TEVPF_API TEVPF_STATUS TEV8R1_get_list_array_pos(const TEVPF_LIST* list,
-                                                 std::int32_t* pos_out) noexcept;
-TEVPF_API TEVPF_STATUS TEV8R1_get_table_array_pos(const TEVPF_TABLE* table,
-                                                  std::int32_t* pos_out) noexcept;
-TEVPF_API TEVPF_STATUS TEV8R1_free_list(TEVPF_LIST* list) noexcept;
-TEVPF_API TEVPF_STATUS TEV8R1_free_table(TEVPF_TABLE* table) noexcept;
-}
+#include "core/base/text_field.h"
+#include "core/file.h"
+#include "core/library.h"
 
 namespace tevpf {
 
-// The element that was found last if it has this name, of fewer than 8 characters; else null, and the
-// operations above find it.
-TEVPF_LIST* last_list(const char* name) noexcept;
-TEVPF_TABLE* last_table(const char* name) noexcept;
+// The element that was found last if it has this name, of fewer than 8 characters; else null, and
+// find_element finds it. Every operation starts here, and mostly with the element of the last one and a
+// short name: that case calls nothing.
+inline TEVPF_ELEM_HEADER* last_element(std::int32_t elem_type, const char* name) noexcept {
+  if (library.current_file == nullptr) return nullptr;
+  TEVPF_ELEM_HEADER* const last = directory_of(*library.current_file, elem_type).last;
+  return last != nullptr && holds_short_text(last->elem_name, name) ? last : nullptr;
+}
+
+// Finds an element of the current file by its exact name.
+//   PF_NOFILE  no file is current; texts empty
+//   PF_NOELEM  no such element; texts: the word for the kind, the name
+[[nodiscard]] TEVPF_STATUS find_element(std::int32_t elem_type, const char* name,
+                                        TEVPF_ELEM_HEADER*& element) noexcept;
+
+// The position of this very record.
+//   PF_NOELEM  it is not there; the texts stay as they were
+[[nodiscard]] TEVPF_STATUS element_position(std::int32_t elem_type,
+                                            const TEVPF_ELEM_HEADER* element,
+                                            std::int32_t& position) noexcept;
+
+// Whether no element has a name with the same first 19 characters.
+//   PF_NOFILE, PF_DUPLICATE  texts: the word and the name, "the file"
+[[nodiscard]] TEVPF_STATUS check_name_unique(std::int32_t elem_type, const char* name) noexcept;
+
+// Appends a new element of that header.
+//   PF_NOFILE, PF_DUPLICATE, PF_NOMEM
+[[nodiscard]] TEVPF_STATUS create_element(TEVPF_ELEM_HEADER header, std::int32_t elem_type,
+                                          TEVPF_ELEM_HEADER*& element) noexcept;
+
+// Appends a record that a caller outside fills in, its name included.
+//   PF_NOFILE, PF_NOMEM
+[[nodiscard]] TEVPF_STATUS insert_unnamed(std::int32_t elem_type,
+                                          TEVPF_ELEM_HEADER*& element) noexcept;
+
+//   PF_NOFILE, PF_NOELEM
+[[nodiscard]] TEVPF_STATUS delete_element(std::int32_t elem_type, const char* name) noexcept;
+
+// Appends a copy under another name.
+//   PF_NOFILE, PF_NOELEM, PF_DUPLICATE, PF_NOMEM
+//   PF_BADNAME  the new name starts with a blank; the texts stay as they were
+[[nodiscard]] TEVPF_STATUS copy_element(std::int32_t elem_type, const char* source_name,
+                                        const char* new_name) noexcept;
 
 }  // namespace tevpf

@@ -15,14 +15,5 @@ struct TEVPF_ELEM_HEADER {
 };
 static_assert(sizeof(TEVPF_ELEM_HEADER) == 108);
 
-struct TEVPF_LIST;
-struct TEVPF_TABLE;
 struct TEVPF_FILE;
 }
-
-namespace tevpf {
-
-inline constexpr std::int32_t kListHead = 12;   // stored body of a list without parameters
-inline constexpr std::int32_t kTableHead = 24;  // stored body of a table without columns
-
-}  // namespace tevpf

@@ -4,11 +4,9 @@
 #include <cerrno>
 #include <cstring>
 
+#include "core/base/status.h"
+#include "core/base/text_field.h"
 #include "core/library.h"
-#include "core/status.h"
-#include "core/text_field.h"
-#include "lists/list.h"
-#include "tables/table.h"
 
 namespace tevpf {
 
@@ -51,23 +49,27 @@ bool access_denied(int error_number) noexcept {
 namespace {
 
 // Names and descriptions of elements in arrays that become the caller's.
-template <class Record>
-TEVPF_STATUS hand_out_elements(Record* const* elements, std::int32_t count,
-                               char (**names_out)[TEVPF_NAME_SIZE],
+TEVPF_STATUS hand_out_elements(const Directory& directory, char (**names_out)[TEVPF_NAME_SIZE],
                                char (**descs_out)[TEVPF_DESC_SIZE]) noexcept {
-  if (count <= 0) return PF_NORMAL;
-  const auto slots = static_cast<std::uint64_t>(count);
+  if (directory.count <= 0) return PF_NORMAL;
+  const auto slots = static_cast<std::uint64_t>(directory.count);
   auto* names = static_cast<char(*)[TEVPF_NAME_SIZE]>(heap_zeroed(slots, TEVPF_NAME_SIZE));
   if (names == nullptr) return fail_empty(PF_NOMEM);
   *names_out = names;
   auto* descs = static_cast<char(*)[TEVPF_DESC_SIZE]>(heap_zeroed(slots, TEVPF_DESC_SIZE));
   if (descs == nullptr) return fail_empty(PF_NOMEM);
   *descs_out = descs;
-  for (std::int32_t i = 0; i < count; ++i) {
-    set_field(names[i], elements[i]->header.elem_name);
-    set_field(descs[i], elements[i]->header.elem_desc);
+  for (std::int32_t i = 0; i < directory.count; ++i) {
+    set_field(names[i], directory.entries[i]->elem_name);
+    set_field(descs[i], directory.entries[i]->elem_desc);
   }
   return PF_NORMAL;
+}
+
+void release_elements(Directory& directory, const ElementKind& kind) noexcept {
+  for (std::int32_t i = 0; i < directory.count; ++i) kind.release(directory.entries[i]);
+  drop_names(directory.names);
+  heap_free(directory.entries);
 }
 
 }  // namespace
@@ -86,12 +88,9 @@ TEVPF_STATUS TEV8R1_add_file(std::FILE* stream, const char* name, std::uint8_t r
 }
 
 TEVPF_STATUS TEV8R1_free_file(TEVPF_FILE* file) noexcept {
-  for (std::int32_t i = 0; i < file->num_lists; ++i) release_list(file->list_ptr[i]);
-  for (std::int32_t i = 0; i < file->num_tables; ++i) release_table(file->table_ptr[i]);
-  drop_names(file->list_names);
-  drop_names(file->table_names);
-  heap_free(file->list_ptr);
-  heap_free(file->table_ptr);
+  for (std::int32_t type = 1; type <= kNumKinds; ++type) {
+    release_elements(directory_of(*file, type), kind_of(type));
+  }
   heap_free(file);
   return PF_NORMAL;
 }
@@ -126,8 +125,10 @@ TEVPF_STATUS TEV8R1_PF_inq_file_elements(char* file_name_out, std::int32_t* num_
   const TEVPF_FILE* file = library.current_file;
   if (file == nullptr) return fail_empty(PF_NOFILE);
   std::strcpy(file_name_out, file->file_name);
-  *num_lists_out = file->num_lists;
-  PF_TRY(hand_out_elements(file->list_ptr, file->num_lists, list_names_out, list_descs_out));
-  *num_tables_out = file->num_tables;
-  return hand_out_elements(file->table_ptr, file->num_tables, table_names_out, table_descs_out);
+  const Directory& lists = directory_of(*file, PF_ELEM_LIST);
+  *num_lists_out = lists.count;
+  PF_TRY(hand_out_elements(lists, list_names_out, list_descs_out));
+  const Directory& tables = directory_of(*file, PF_ELEM_TABLE);
+  *num_tables_out = tables.count;
+  return hand_out_elements(tables, table_names_out, table_descs_out);
 }

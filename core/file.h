@@ -4,33 +4,34 @@
 #include <cstdint>
 #include <cstdio>
 
-#include "core/element.h"
-#include "core/heap.h"
+#include "core/base/heap.h"
+#include "core/element_kind.h"
 #include "core/name_set.h"
+
+namespace tevpf {
+
+// The elements of one kind in one file.
+struct Directory {
+  std::int32_t count;
+  std::int32_t room;            // slots that `entries` really has
+  TEVPF_ELEM_HEADER** entries;  // in directory order; owned, like the records
+  TEVPF_ELEM_HEADER* last;      // the last one found by name, or null
+  std::uint16_t free_slots;     // slots beyond `count` that growing has counted
+  std::uint8_t is_unhashed;  // a caller outside has appended a record and names it without telling
+  NameSet names;             // beside the entries, so that names are found and checked in O(1)
+};
+
+}  // namespace tevpf
 
 extern "C" {
 
 struct TEVPF_FILE {
-  std::int32_t num_lists;
-  std::int32_t num_tables;
-  TEVPF_LIST** list_ptr;  // in directory order; owned, like the records
-  TEVPF_TABLE** table_ptr;
-  std::uint16_t free_lists;  // spare slots at the end of list_ptr
-  std::uint16_t free_tables;
+  tevpf::Directory directories[tevpf::kNumKinds];  // by type code - 1
   TEVPF_FILE* next_file;
-  TEVPF_LIST* last_list;  // the last one found by name, or null
-  TEVPF_TABLE* last_table;
   std::FILE* fp;           // null once a save could not open the file again
   std::uint8_t new_file;   // created by this open and not saved since: deleted when closed unsaved
   std::uint8_t read_only;  // could only be opened for reading
   char file_name[TEVPF_FILE_NAME_SIZE];
-
-  std::int32_t list_room;  // slots that the two arrays really have
-  std::int32_t table_room;
-
-  // Beside the directory, so that names are found and checked in O(1).
-  tevpf::NameSet list_names;
-  tevpf::NameSet table_names;
 };
 
 TEVPF_API TEVPF_STATUS TEV8R1_add_file(std::FILE* stream, const char* name,
@@ -39,6 +40,13 @@ TEVPF_API TEVPF_STATUS TEV8R1_free_file(TEVPF_FILE* file) noexcept;
 }
 
 namespace tevpf {
+
+inline Directory& directory_of(TEVPF_FILE& file, std::int32_t elem_type) noexcept {
+  return file.directories[elem_type - 1];
+}
+inline const Directory& directory_of(const TEVPF_FILE& file, std::int32_t elem_type) noexcept {
+  return file.directories[elem_type - 1];
+}
 
 // A record for a file of that name (at most TEVPF_FILE_NAME_SIZE - 1 characters) that is not yet in
 // the chain; null when memory runs out.

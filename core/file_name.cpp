@@ -3,8 +3,8 @@
 #include <cstdlib>
 #include <cstring>
 
-#include "core/heap.h"
-#include "core/status.h"
+#include "core/base/heap.h"
+#include "core/base/status.h"
 
 namespace tevpf {
 

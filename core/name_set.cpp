@@ -2,8 +2,8 @@
 
 #include <cstring>
 
-#include "core/heap.h"
-#include "core/text_field.h"
+#include "core/base/heap.h"
+#include "core/base/text_field.h"
 
 namespace tevpf {
 

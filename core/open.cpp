@@ -3,10 +3,11 @@
 #include <cstdio>
 #include <utility>
 
+#include "core/base/status.h"
 #include "core/file.h"
 #include "core/file_name.h"
+#include "core/io/disk_file.h"
 #include "core/reader.h"
-#include "core/status.h"
 
 namespace tevpf {
 
@@ -18,16 +19,33 @@ struct OpenedStream {
   bool created;
 };
 
-// For update where that is allowed, else for reading; a file that is not there, or gives neither
-// right, is made anew. Any other failure is no reason to empty a file that may be there: it may
-// pass.
+// A file that may be written but not read counts as none, and is emptied.
+OpenedStream open_emptied(const char* name) noexcept {
+  std::FILE* const stream = open_regular(name, Access::kWrite);
+  if (stream == nullptr || empty_file(stream)) return {stream, false, true};
+  std::fclose(stream);
+  return {nullptr, false, false};
+}
+
+// For update where that is allowed, else for reading. Any failure but "not there" and "no right" is no
+// reason to make a file: it may pass.
+OpenedStream open_existing(const char* name) noexcept {
+  if (std::FILE* const stream = open_regular(name, Access::kUpdate)) return {stream, false, false};
+  if (!access_denied(errno)) return {nullptr, false, false};
+  if (std::FILE* const stream = open_regular(name, Access::kRead)) return {stream, true, false};
+  return access_denied(errno) ? open_emptied(name) : OpenedStream{nullptr, false, false};
+}
+
+// A file that appears between looking and making is opened, its content with it.
 OpenedStream open_or_create(const char* name) noexcept {
-  if (std::FILE* stream = std::fopen(name, "r+b")) return {stream, false, false};
-  if (access_denied(errno)) {
-    if (std::FILE* stream = std::fopen(name, "rb")) return {stream, true, false};
+  constexpr int kTries = 3;  // more would be needed only by a link that leads nowhere
+  for (int i = 0; i < kTries; ++i) {
+    const OpenedStream existing = open_existing(name);
+    if (existing.stream != nullptr || errno != ENOENT) return existing;
+    std::FILE* const created = create_file(name);
+    if (created != nullptr || errno != EEXIST) return {created, false, true};
   }
-  if (errno != ENOENT && !access_denied(errno)) return {nullptr, false, false};
-  return {std::fopen(name, "wb"), false, true};
+  return {nullptr, false, false};
 }
 
 }  // namespace

@@ -1,11 +1,10 @@
 // Loads a file, element after element, in one pass.
 #include "core/reader.h"
 
-#include "core/element_builder.h"
+#include "core/base/status.h"
+#include "core/base/text_field.h"
 #include "core/file.h"
-#include "core/input.h"
-#include "core/status.h"
-#include "core/text_field.h"
+#include "core/io/input.h"
 
 namespace tevpf {
 
@@ -19,11 +18,6 @@ struct Scratch {
   std::int32_t room = 0;
 };
 
-void terminate_texts(TEVPF_ELEM_HEADER& header) noexcept {
-  terminate_field(header.elem_name);
-  terminate_field(header.elem_desc);
-}
-
 // The body of the element that was announced last, in the scratch block.
 Input::Got read_body(Input& input, std::int32_t bytes, Scratch& scratch) noexcept {
   if (bytes > scratch.room) {
@@ -35,14 +29,18 @@ Input::Got read_body(Input& input, std::int32_t bytes, Scratch& scratch) noexcep
   return input.read(scratch.block.get(), count) == count ? Input::Got::kAll : Input::Got::kPart;
 }
 
-// Builds the element whose header was read last.
-TEVPF_STATUS build_element(const TEVPF_ELEM_HEADER& header, Input& input,
-                           Scratch& scratch) noexcept {
-  const bool is_list = header.elem_type == PF_ELEM_LIST;
-  if (header.btf < (is_list ? kListHead : kTableHead)) return fail(PF_BADFORMAT, header.elem_name);
-  // A list can be as long as its file: one that the file does hold is taken as it comes.
-  if (is_list && input.weigh(static_cast<std::uint32_t>(header.btf)) == Input::Claim::kFits) {
-    return build_list(header, Body(input, header.btf), input);
+// Loads the element whose header was read last.
+TEVPF_STATUS load_element(const TEVPF_ELEM_HEADER& header, Input& input,
+                          Scratch& scratch) noexcept {
+  if (!is_element_type(header.elem_type)) {
+    return fail(PF_BADTYPE, {"element", header.elem_name}, Text(header.elem_type));
+  }
+  const ElementKind& kind = kind_of(header.elem_type);
+  if (header.btf < kind.smallest_body) return fail(PF_BADFORMAT, header.elem_name);
+  // A body that is streamed needs no block, but the file must hold it.
+  const auto bytes = static_cast<std::uint32_t>(header.btf);
+  if (kind.streams_body && input.weigh(bytes) == Input::Claim::kFits) {
+    return kind.read(header, Body(input, header.btf), input);
   }
   switch (read_body(input, header.btf, scratch)) {
     case Input::Got::kPart:
@@ -52,41 +50,49 @@ TEVPF_STATUS build_element(const TEVPF_ELEM_HEADER& header, Input& input,
     case Input::Got::kAll:
       break;
   }
-  return is_list ? build_list(header, Body(scratch.block.get(), header.btf), input)
-                 : build_table(header, scratch.block.get(), input);
+  return kind.read(header, Body(scratch.block.get(), header.btf), input);
 }
 
-TEVPF_STATUS load_element(TEVPF_FILE& file, const TEVPF_ELEM_HEADER& header, Input& input,
-                          Scratch& scratch) noexcept {
-  if (header.elem_type != PF_ELEM_LIST && header.elem_type != PF_ELEM_TABLE) {
-    PF_TRY(TEV8R1_check_valid_file(&file));
-    return fail(PF_BADTYPE, {"element", header.elem_name}, Text(header.elem_type));
-  }
-  const TEVPF_STATUS status = build_element(header, input, scratch);
-  if (status == PF_BADFORMAT) PF_TRY(TEV8R1_check_valid_file(&file));
-  return status;
-}
-
-}  // namespace
-
-TEVPF_STATUS load_file(TEVPF_FILE& file) noexcept {
-  Input input(file.fp);
+// Loads one element after the other until the stream ends between two of them.
+TEVPF_STATUS load_elements(Input& input) noexcept {
   Scratch scratch{new_array<unsigned char>(kFirstScratch), kFirstScratch};
   if (!scratch.block || !input.read_ahead()) return fail_empty(PF_NOMEM);
   for (;;) {
     TEVPF_ELEM_HEADER header = {};
     const std::uint64_t got = input.read(&header, sizeof header);
     terminate_texts(header);
-    if (got == 0 && !input.has_failed()) {
-      file.new_file = 0;
-      return PF_NORMAL;
-    }
-    if (got != sizeof header) {
-      PF_TRY(TEV8R1_check_valid_file(&file));
-      return fail(PF_BADFORMAT, header.elem_name);
-    }
-    PF_TRY(load_element(file, header, input, scratch));
+    if (got == 0) return PF_NORMAL;
+    if (got != sizeof header) return fail(PF_BADFORMAT, header.elem_name);
+    PF_TRY(load_element(header, input, scratch));
   }
+}
+
+// Closes a file of which nothing, or not all that it holds, can be said.
+TEVPF_STATUS give_up(TEVPF_FILE& file, TEVPF_STATUS reason) noexcept {
+  const TEVPF_STATUS status = fail(reason, file.file_name);
+  file.new_file = 0;
+  TEV8R1_PF_close(0);
+  return status;
+}
+
+}  // namespace
+
+void terminate_texts(TEVPF_ELEM_HEADER& header) noexcept {
+  terminate_field(header.elem_name);
+  terminate_field(header.elem_desc);
+}
+
+TEVPF_STATUS load_file(TEVPF_FILE& file) noexcept {
+  Input input(file.fp);
+  const TEVPF_STATUS status = load_elements(input);
+  // The disk failed: what was read may be a shorter file than there is, and must not be saved as such.
+  if (input.has_failed()) return give_up(file, PF_OPENFAIL);
+  if (status == PF_NORMAL) {
+    file.new_file = 0;
+  } else if (status == PF_BADFORMAT || status == PF_BADTYPE) {
+    PF_TRY(TEV8R1_check_valid_file(&file));
+  }
+  return status;
 }
 
 }  // namespace tevpf
@@ -94,23 +100,8 @@ TEVPF_STATUS load_file(TEVPF_FILE& file) noexcept {
 using namespace tevpf;
 
 TEVPF_STATUS TEV8R1_check_valid_file(TEVPF_FILE* file) noexcept {
-  if (file->num_lists > 0 || file->num_tables > 0) return PF_NORMAL;
-  const TEVPF_STATUS status = fail(PF_BADFILE, file->file_name);
-  file->new_file = 0;
-  TEV8R1_PF_close(0);
-  return status;
-}
-
-TEVPF_STATUS TEV8R1_format_list(TEVPF_ELEM_HEADER header, const void* body,
-                                std::FILE* stream) noexcept {
-  Input input(stream);
-  terminate_texts(header);
-  return build_list(header, Body(body, header.btf), input);
-}
-
-TEVPF_STATUS TEV8R1_format_table(TEVPF_ELEM_HEADER header, const void* body,
-                                 std::FILE* stream) noexcept {
-  Input input(stream);
-  terminate_texts(header);
-  return build_table(header, body, input);
+  for (const Directory& directory : file->directories) {
+    if (directory.count > 0) return PF_NORMAL;
+  }
+  return give_up(*file, PF_BADFILE);
 }

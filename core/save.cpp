@@ -3,10 +3,11 @@
 #include <cstdio>
 #include <cstring>
 
+#include "core/base/status.h"
 #include "core/file.h"
+#include "core/io/disk_file.h"
+#include "core/io/replacement.h"
 #include "core/library.h"
-#include "core/replacement.h"
-#include "core/status.h"
 #include "core/writer.h"
 
 namespace tevpf {
@@ -28,22 +29,38 @@ TEVPF_STATUS overwrite(TEVPF_FILE& file) noexcept {
   return write_elements(file, file.fp, file.file_name);
 }
 
-// Writes the file in place: by an image that takes its place once it is whole, or else plainly.
-TEVPF_STATUS rewrite(TEVPF_FILE& file) noexcept {
-  Replacement replacement(file.file_name);
-  if (replacement.has_failed()) return fail(PF_OPENFAIL, file.file_name);
-  if (!replacement.is_possible()) return overwrite(file);
-  PF_TRY(write_elements(file, replacement.stream(), file.file_name));
+// What came of putting the elements of a file in the place of an existing one.
+struct Replaced {
+  bool possible;        // no: nothing was done, and the caller writes plainly
+  TEVPF_STATUS status;  // when it was possible
+  std::FILE* stream;    // stands for the file that is in place now; null when the old one still is
+};
+
+Replaced replace_existing(const TEVPF_FILE& file, const char* name) noexcept {
+  Replacement replacement(name);
+  if (replacement.has_failed()) return {true, fail(PF_OPENFAIL, name), nullptr};
+  if (!replacement.is_possible()) return {false, PF_NORMAL, nullptr};
+  const TEVPF_STATUS status = write_elements(file, replacement.stream(), name);
+  if (status != PF_NORMAL) return {true, status, nullptr};
   switch (replacement.put_in_place()) {
-    case Replacement::Outcome::kFailed:
-      return fail(PF_OPENFAIL, file.file_name);
-    case Replacement::Outcome::kNotPossible:
-      return overwrite(file);
     case Replacement::Outcome::kDone:
+      return {true, PF_NORMAL, replacement.release_stream()};
+    case Replacement::Outcome::kNotFlushed:
+      return {true, fail(PF_OPENFAIL, name), replacement.release_stream()};
+    case Replacement::Outcome::kFailed:
+      return {true, fail(PF_OPENFAIL, name), nullptr};
+    case Replacement::Outcome::kNotPossible:
       break;
   }
-  adopt_stream(file, replacement.release_stream());
-  return PF_NORMAL;
+  return {false, PF_NORMAL, nullptr};
+}
+
+// Writes the file in place: by an image that takes its place once it is whole, or else plainly.
+TEVPF_STATUS rewrite(TEVPF_FILE& file) noexcept {
+  const Replaced replaced = replace_existing(file, file.file_name);
+  if (!replaced.possible) return overwrite(file);
+  if (replaced.stream != nullptr) adopt_stream(file, replaced.stream);
+  return replaced.status;
 }
 
 TEVPF_STATUS save_in_place(TEVPF_FILE& file) noexcept {
@@ -52,12 +69,27 @@ TEVPF_STATUS save_in_place(TEVPF_FILE& file) noexcept {
   return rewrite(file);
 }
 
-TEVPF_STATUS save_copy(const TEVPF_FILE& file, const char* path) noexcept {
-  std::FILE* stream = std::fopen(path, "wb");
+// Writes a copy where there is no file, or one that cannot be replaced. What could not be written whole
+// does not stay, unless it stands in the place of something else.
+TEVPF_STATUS write_copy(const TEVPF_FILE& file, const char* path) noexcept {
+  std::FILE* stream = create_file(path);
+  const bool created = stream != nullptr;
+  if (!created && errno == EEXIST) stream = std::fopen(path, "wb");
   if (stream == nullptr) return fail(access_denied(errno) ? PF_NOPRIV : PF_OPENFAIL, path);
-  const TEVPF_STATUS status = write_elements(file, stream, path);
+  TEVPF_STATUS status = write_elements(file, stream, path);
+  if (created && status != PF_NORMAL) {
+    remove_own_file(path, stream);
+    return status;
+  }
   const bool closed = std::fclose(stream) == 0;
   return status == PF_NORMAL && !closed ? fail(PF_OPENFAIL, path) : status;
+}
+
+TEVPF_STATUS save_copy(const TEVPF_FILE& file, const char* path) noexcept {
+  const Replaced replaced = replace_existing(file, path);
+  if (!replaced.possible) return write_copy(file, path);
+  const bool closed = replaced.stream == nullptr || std::fclose(replaced.stream) == 0;
+  return replaced.status == PF_NORMAL && !closed ? fail(PF_OPENFAIL, path) : replaced.status;
 }
 
 }  // namespace
@@ -79,9 +111,12 @@ TEVPF_STATUS TEV8R1_PF_close(std::int32_t save) noexcept {
   if (save != 0 && file->read_only != 0) return fail(PF_NOPRIV, file->file_name);
 
   TEVPF_STATUS status = save != 0 ? save_in_place(*file) : TEVPF_STATUS{PF_NORMAL};
-  const bool closed = file->fp == nullptr || std::fclose(file->fp) == 0;
-  if (!closed && save != 0 && status == PF_NORMAL) status = fail(PF_OPENFAIL, file->file_name);
-  if (file->new_file != 0) std::remove(file->file_name);
+  if (file->new_file != 0) {
+    remove_own_file(file->file_name, file->fp);
+  } else if (file->fp != nullptr && std::fclose(file->fp) != 0 && save != 0 &&
+             status == PF_NORMAL) {
+    status = fail(PF_OPENFAIL, file->file_name);
+  }
   unlink_file(*file);
   TEV8R1_free_file(file);
   return status;

@@ -1,13 +1,6 @@
-// The file format, written down once: the stored fields of each record in stored order. Sizes,
-// reader and writer follow from these tables. Little-endian, without padding; the stored form is
-// the same whatever the size of a pointer.
-//
-//   element      header, then btf bytes: list head or table head, and its parameters or columns
-//   parameter    kParamFields, type part, [description and terminator]
-//                type part: the first param_part bytes of `part`; strings: text and terminator, too
-//   column       kColumnFields, the first column_part bytes of `limits`, [description and
-//                terminator]
-//   behind       list: name index; table: the index of each indexed column, then the rows
+// How records are packed into their stored form: their fields in stored order, as data, from which sizes,
+// reader and writer follow. Little-endian, without padding; the stored form is the same whatever the size
+// of a pointer.
 #pragma once
 
 #include <array>
@@ -18,11 +11,7 @@
 #include <iterator>
 #include <utility>
 
-#include "lists/list.h"
-#include "lists/param_record.h"
-#include "tables/column_record.h"
-#include "tables/table.h"
-#include "values/value_type.h"
+#include "core/io/sink.h"
 
 namespace tevpf {
 
@@ -34,39 +23,6 @@ struct Field {
 };
 
 inline constexpr std::size_t kNowhere = SIZE_MAX;  // zero in the file, no part of the record
-
-// Bodies without parameters or columns.
-inline constexpr Field kListFields[] = {
-    {offsetof(TEVPF_LIST, num_params), 4},
-    {offsetof(TEVPF_LIST, RESERVED), 8},
-};
-inline constexpr Field kTableFields[] = {
-    {offsetof(TEVPF_TABLE, num_cols), 4}, {offsetof(TEVPF_TABLE, num_rows), 4},
-    {offsetof(TEVPF_TABLE, row_wid), 4},  {offsetof(TEVPF_TABLE, dsp_wid), 4},
-    {offsetof(TEVPF_TABLE, RESERVED), 8},
-};
-
-inline constexpr Field kParamFields[] = {
-    {offsetof(TEVPF_PARAM, RESERVED), 7},
-    {offsetof(TEVPF_PARAM, desc_loc), 1},
-    {offsetof(TEVPF_PARAM, def.type), 4},
-    {offsetof(TEVPF_PARAM, def.name), TEVPF_NAME_SIZE},
-    {offsetof(TEVPF_PARAM, def.units), TEVPF_UNITS_SIZE},
-    {kNowhere, 4},
-};
-
-inline constexpr Field kColumnFields[] = {
-    {offsetof(TEVPF_COLUMN, offset), 4},
-    {offsetof(TEVPF_COLUMN, RESERVED), 4},
-    {offsetof(TEVPF_COLUMN, def.type), 4},
-    {offsetof(TEVPF_COLUMN, def.name), TEVPF_NAME_SIZE},
-    {offsetof(TEVPF_COLUMN, def.units), TEVPF_UNITS_SIZE},
-    {offsetof(TEVPF_COLUMN, desc_flag), 1},  // in the place of desc_byte
-    {offsetof(TEVPF_COLUMN, def.spare_byte), 1},
-    {offsetof(TEVPF_COLUMN, def.idx_flag), 1},
-    {offsetof(TEVPF_COLUMN, def.unq_flag), 1},
-    {offsetof(TEVPF_COLUMN, def.width), 4},
-};
 
 template <std::size_t N>
 constexpr std::int32_t stored_size(const Field (&fields)[N]) noexcept {
@@ -82,11 +38,6 @@ constexpr std::size_t stored_place(const Field (&fields)[N], std::size_t place) 
   for (std::size_t i = 0; i < N && fields[i].place != place; ++i) bytes += fields[i].bytes;
   return bytes;
 }
-
-static_assert(stored_size(kListFields) == kListHead);
-static_assert(stored_size(kTableFields) == kTableHead);
-static_assert(stored_size(kParamFields) == kParamHead);
-static_assert(stored_size(kColumnFields) == kColumnHead);
 
 namespace stored_form {
 
@@ -142,6 +93,12 @@ template <const auto& Fields>
 void unpack(const unsigned char* in, void* record) noexcept {
   stored_form::unpack<stored_form::kRuns<Fields>>(in, record,
                                                   std::make_index_sequence<std::size(Fields)>{});
+}
+
+// Writes the fields of a record.
+template <const auto& Fields>
+void put_fields(Sink& sink, const void* record) noexcept {
+  pack<Fields>(record, sink.record(stored_size(Fields)));
 }
 
 }  // namespace tevpf

@@ -1,17 +1,15 @@
-// Writes elements as the file holds them.
+// Writes elements as the file holds them: every element of a kind in directory order, kind after kind.
 #pragma once
 
 #include <cstdio>
 
-#include "core/element.h"
+#include "core/element_kind.h"
 
 extern "C" {
 
-//   PF_OPENFAIL  not everything could be written; texts: the name of the file (of the element)
-//   PF_BADTYPE   an unknown value type; texts: "parameter" or "column", the type
+// Statuses of the kinds' writers, and
+//   PF_OPENFAIL  not everything could be written; texts: the name of the file
 TEVPF_API TEVPF_STATUS TEV8R1_store_file(TEVPF_FILE* file) noexcept;
-TEVPF_API TEVPF_STATUS TEV8R1_store_list(std::FILE* stream, const TEVPF_LIST* list) noexcept;
-TEVPF_API TEVPF_STATUS TEV8R1_store_table(std::FILE* stream, const TEVPF_TABLE* table) noexcept;
 }
 
 namespace tevpf {
@@ -19,5 +17,9 @@ namespace tevpf {
 // Writes all elements of a file to a stream that stands for the file of that name, and flushes it.
 [[nodiscard]] TEVPF_STATUS write_elements(const TEVPF_FILE& file, std::FILE* stream,
                                           const char* name) noexcept;
+
+// Writes one element and flushes the stream.
+[[nodiscard]] TEVPF_STATUS write_element(std::FILE* stream, TEVPF_ELEM_HEADER& element,
+                                         const ElementKind& kind) noexcept;
 
 }  // namespace tevpf

@@ -3,8 +3,8 @@
 #include <cstring>
 #include <limits>
 
-#include "core/heap.h"
-#include "core/status.h"
+#include "core/base/heap.h"
+#include "core/base/status.h"
 #include "lists/param_record.h"
 #include "values/value_type.h"
 

@@ -1,6 +1,6 @@
 // The operations on a list's default definitions.
-#include "core/directory.h"
-#include "core/status.h"
+#include "core/base/status.h"
+#include "lists/directory.h"
 #include "lists/list.h"
 #include "lists/param_check.h"
 #include "lists/param_record.h"
@@ -23,7 +23,7 @@ using namespace tevpf;
 TEVPF_STATUS TEV8R1_PF_inq_param_dft(const char* list_name, std::int32_t type,
                                      TEVPF_PARAM_DEF* definition_out) noexcept {
   TEVPF_LIST* list;
-  PF_TRY(TEV8R1_get_list_ptr(list_name, &list));
+  PF_TRY(find_list(list_name, list));
   const TEVPF_PARAM_DEF* const defaults = defaults_of(*list);
   if (defaults == nullptr) return fail_empty(PF_NOMEM);
   if (!is_value_type(type)) return fail(PF_BADTYPE, "function call", Text(type));
@@ -36,7 +36,7 @@ TEVPF_STATUS TEV8R1_PF_inq_param_dft(const char* list_name, std::int32_t type,
 
 TEVPF_STATUS TEV8R1_PF_set_param_dft(const char* list_name, TEVPF_PARAM_DEF definition) noexcept {
   TEVPF_LIST* list;
-  PF_TRY(TEV8R1_get_list_ptr(list_name, &list));
+  PF_TRY(find_list(list_name, list));
   PF_TRY(TEV8R1_validate_param_def(list, definition));
   // Unlike in a parameter, the length of a string is kept as the caller gave it.
   const std::int32_t length = definition.part.str.length;

@@ -4,14 +4,15 @@
 #include <cstring>
 #include <limits>
 
-#include "core/directory.h"
-#include "core/heap.h"
+#include "core/base/heap.h"
+#include "core/base/status.h"
 #include "core/library.h"
-#include "core/status.h"
+#include "lists/directory.h"
 #include "lists/list.h"
 #include "lists/name_index.h"
 #include "lists/param_check.h"
 #include "lists/param_record.h"
+#include "values/text_compare.h"
 
 namespace tevpf {
 namespace {
@@ -93,7 +94,10 @@ void redefine(const TEVPF_LIST& list, TEVPF_PARAM& param, TEVPF_PARAM_DEF defini
   char* const value = change.value.commit(old_value, list.texts);
   if (definition.type == PF_TYPE_STRING) definition.part.str.value = value;
   definition.description = change.description.commit(old.description, list.texts);
-  std::memcpy(definition.name, old.name, sizeof definition.name);  // the selection may be a pattern
+  // A pattern only selects: the parameter keeps its name.
+  if (make_pattern(definition.name).prefix) {
+    std::memcpy(definition.name, old.name, sizeof definition.name);
+  }
   old = definition;
   param.desc_loc = description_place(definition);
 }
@@ -106,7 +110,7 @@ using namespace tevpf;
 TEVPF_STATUS TEV8R1_PF_add_param(const char* list_name, const TEVPF_PARAM_DEF* definition,
                                  std::int32_t position) noexcept {
   TEVPF_LIST* list;
-  PF_TRY(TEV8R1_get_list_ptr(list_name, &list));
+  PF_TRY(find_list(list_name, list));
   PF_TRY(ensure_free_slot(*list));
 
   TEVPF_PARAM param{};
@@ -132,7 +136,7 @@ TEVPF_STATUS TEV8R1_PF_modify_param_def(const char* list_name,
                                         TEVPF_PARAM_DEF definition) noexcept {
   TEVPF_LIST* list;
   std::int32_t position;
-  PF_TRY(TEV8R1_get_list_ptr(list_name, &list));
+  PF_TRY(find_list(list_name, list));
   PF_TRY(normalise(definition));
   PF_TRY(find_param(*list, definition.name, position));
   PF_TRY(TEV8R1_validate_param_def(list, definition));

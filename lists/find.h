@@ -1,8 +1,8 @@
 // How operations on a list begin: they find it in the current file by its name, then its parameter.
 #pragma once
 
-#include "core/directory.h"
-#include "core/status.h"
+#include "core/base/status.h"
+#include "lists/directory.h"
 #include "lists/list.h"
 #include "lists/name_index.h"
 
@@ -13,7 +13,7 @@ namespace tevpf {
 [[nodiscard]] inline TEVPF_STATUS find_param_of(const char* list_name, const char* param_name,
                                                 TEVPF_LIST*& list,
                                                 std::int32_t& position) noexcept {
-  PF_TRY(TEV8R1_get_list_ptr(list_name, &list));
+  PF_TRY(find_list(list_name, list));
   return find_param(*list, param_name, position);
 }
 
@@ -22,7 +22,7 @@ namespace tevpf {
 //   PF_BADPOS  it has none; texts: the position, the number of parameters
 [[nodiscard]] inline TEVPF_STATUS find_list_with(const char* list_name, std::int32_t position,
                                                  TEVPF_LIST*& list) noexcept {
-  PF_TRY(TEV8R1_get_list_ptr(list_name, &list));
+  PF_TRY(find_list(list_name, list));
   if (position >= 0 && position < list->num_params) return PF_NORMAL;
   return fail(PF_BADPOS, Text(position), Text(list->num_params));
 }

@@ -45,7 +45,7 @@ TEVPF_STATUS TEV8R1_PF_inq_next_param_size(const char* list_name, std::int32_t* 
                                            std::int32_t* value_size_out,
                                            std::int32_t* desc_size_out) noexcept {
   TEVPF_LIST* list;
-  PF_TRY(TEV8R1_get_list_ptr(list_name, &list));
+  PF_TRY(find_list(list_name, list));
   if (list->cur_param >= list->num_params - 1) return PF_NOMORE;
   const TEVPF_PARAM_DEF& definition = list->param_ptr[list->cur_param + 1].def;
   return sizes_of(definition, type_out, value_size_out, desc_size_out);
@@ -53,7 +53,7 @@ TEVPF_STATUS TEV8R1_PF_inq_next_param_size(const char* list_name, std::int32_t* 
 
 TEVPF_STATUS TEV8R1_PF_inq_num_params(const char* list_name, std::int32_t* count_out) noexcept {
   TEVPF_LIST* list;
-  PF_TRY(TEV8R1_get_list_ptr(list_name, &list));
+  PF_TRY(find_list(list_name, list));
   *count_out = list->num_params;
   return PF_NORMAL;
 }
@@ -84,7 +84,7 @@ TEVPF_STATUS TEV8R1_get_param_type(const char* list_name, const char* param_name
 
 TEVPF_STATUS TEV8R1_set_interactive_list(const char* list_name) noexcept {
   TEVPF_LIST* list;
-  PF_TRY(TEV8R1_get_list_ptr(list_name, &list));
+  PF_TRY(find_list(list_name, list));
   library.interactive = 1;
   return PF_NORMAL;
 }

@@ -15,6 +15,8 @@
 
 namespace tevpf {
 
+inline constexpr std::int32_t kListHead = 12;  // stored body of a list without parameters
+
 struct NameSlot {
   std::uint32_t hash;
   std::int32_t position;  // -1: empty

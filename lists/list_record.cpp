@@ -1,8 +1,8 @@
 // Whole list records: their release, their copy and their first storage.
 #include <cstring>
 
-#include "core/heap.h"
-#include "core/text_field.h"
+#include "core/base/heap.h"
+#include "core/base/text_field.h"
 #include "lists/default_table.h"
 #include "lists/list.h"
 #include "lists/name_table.h"

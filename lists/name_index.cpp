@@ -5,8 +5,8 @@
 #include <cstring>
 #include <numeric>
 
-#include "core/status.h"
-#include "core/text_word.h"
+#include "core/base/status.h"
+#include "core/base/text_word.h"
 #include "lists/name_table.h"
 #include "values/text_compare.h"
 #include "values/value_type.h"

@@ -2,7 +2,7 @@
 
 #include <cstring>
 
-#include "core/heap.h"
+#include "core/base/heap.h"
 #include "values/text_compare.h"
 
 namespace tevpf {

@@ -1,6 +1,6 @@
 #include "lists/param_check.h"
 
-#include "core/text_field.h"
+#include "core/base/text_field.h"
 
 namespace tevpf {
 namespace {

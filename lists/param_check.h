@@ -1,7 +1,7 @@
 // What a parameter's definition and its value must fulfil.
 #pragma once
 
-#include "core/status.h"
+#include "core/base/status.h"
 #include "lists/list.h"
 #include "values/value_text.h"
 

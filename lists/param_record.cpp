@@ -3,8 +3,8 @@
 #include <cstring>
 #include <limits>
 
-#include "core/status.h"
-#include "core/text_field.h"
+#include "core/base/status.h"
+#include "core/base/text_field.h"
 #include "values/value_type.h"
 
 namespace tevpf {

@@ -5,7 +5,7 @@
 #include <cstdint>
 #include <cstring>
 
-#include "core/heap.h"
+#include "core/base/heap.h"
 #include "lists/list.h"
 #include "values/value_type.h"
 

@@ -3,9 +3,9 @@
 #include <algorithm>
 #include <cstring>
 
-#include "core/directory.h"
-#include "core/status.h"
-#include "core/text_field.h"
+#include "core/base/status.h"
+#include "core/base/text_field.h"
+#include "lists/directory.h"
 #include "lists/list.h"
 #include "lists/name_index.h"
 #include "lists/param_record.h"
@@ -17,7 +17,7 @@ namespace {
 // The list and the place of the parameter in its name index.
 TEVPF_STATUS find(const char* list_name, const char* param_name, TEVPF_LIST*& list,
                   std::int32_t& place) noexcept {
-  PF_TRY(TEV8R1_get_list_ptr(list_name, &list));
+  PF_TRY(find_list(list_name, list));
   TEVPF_PARAM* param;
   return TEV8R1_get_param_ptr(list, param_name, &param, &place);
 }

@@ -7,8 +7,8 @@
 
 #include <cstdint>
 
-#include "core/heap.h"
-#include "core/short_copy.h"
+#include "core/base/heap.h"
+#include "core/base/short_copy.h"
 
 namespace tevpf {
 

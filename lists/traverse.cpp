@@ -3,7 +3,8 @@
 #include <cstring>
 #include <limits>
 
-#include "core/fetch.h"
+#include "core/base/fetch.h"
+#include "core/base/text_field.h"
 #include "lists/find.h"
 #include "lists/param_record.h"
 
@@ -34,7 +35,7 @@ inline TEVPF_STATUS step(TEVPF_LIST& list, char* name_out, void* value_out) noex
   if (list.cur_param >= list.num_params) return PF_NOMORE;
   const TEVPF_PARAM_DEF& definition = list.param_ptr[list.cur_param].def;
   fetch_along(&definition, sizeof definition);
-  std::memcpy(name_out, definition.name, sizeof definition.name);
+  copy_field_text(name_out, definition.name);
   copy_value(definition, value_out);
   return PF_NORMAL;
 }
@@ -42,7 +43,7 @@ inline TEVPF_STATUS step(TEVPF_LIST& list, char* name_out, void* value_out) noex
 [[gnu::noinline]] TEVPF_STATUS find_and_step(const char* list_name, char* name_out,
                                              void* value_out) noexcept {
   TEVPF_LIST* list;
-  PF_TRY(TEV8R1_get_list_ptr(list_name, &list));
+  PF_TRY(find_list(list_name, list));
   return step(*list, name_out, value_out);
 }
 
@@ -62,7 +63,7 @@ TEVPF_STATUS TEV8R1_PF_get_next_param(const char* list_name, char* name_out,
 TEVPF_STATUS TEV8R1_PF_get_next_param_def(const char* list_name,
                                           TEVPF_PARAM_DEF* definition) noexcept {
   TEVPF_LIST* list;
-  PF_TRY(TEV8R1_get_list_ptr(list_name, &list));
+  PF_TRY(find_list(list_name, list));
   if (list->cur_param >= list->num_params - 1) return PF_NOMORE;
   deliver(*list, list->cur_param + 1, *definition);
   return PF_NORMAL;
@@ -71,7 +72,7 @@ TEVPF_STATUS TEV8R1_PF_get_next_param_def(const char* list_name,
 TEVPF_STATUS TEV8R1_PF_get_prev_param_def(const char* list_name,
                                           TEVPF_PARAM_DEF* definition) noexcept {
   TEVPF_LIST* list;
-  PF_TRY(TEV8R1_get_list_ptr(list_name, &list));
+  PF_TRY(find_list(list_name, list));
   if (list->cur_param <= 0 || list->num_params == 0) return PF_NOMORE;
   // A cursor that was left beyond the last parameter steps back to that one.
   deliver(*list, std::min(list->cur_param, list->num_params) - 1, *definition);
@@ -97,14 +98,14 @@ TEVPF_STATUS TEV8R1_PF_get_param_def_by_pos(const char* list_name, std::int32_t 
 
 TEVPF_STATUS TEV8R1_PF_reset_param(const char* list_name) noexcept {
   TEVPF_LIST* list;
-  PF_TRY(TEV8R1_get_list_ptr(list_name, &list));
+  PF_TRY(find_list(list_name, list));
   list->cur_param = -1;
   return PF_NORMAL;
 }
 
 TEVPF_STATUS TEV8R1_set_cur_param(const char* list_name, std::int32_t position) noexcept {
   TEVPF_LIST* list;
-  PF_TRY(TEV8R1_get_list_ptr(list_name, &list));
+  PF_TRY(find_list(list_name, list));
   if (position < 0 || position >= list->num_params) return PF_BADPOS;
   list->cur_param = position;
   return PF_NORMAL;

@@ -1,8 +1,8 @@
 // Values of parameters, in binary form and from text.
 #include <cstring>
 
-#include "core/heap.h"
-#include "core/status.h"
+#include "core/base/heap.h"
+#include "core/base/status.h"
 #include "lists/find.h"
 #include "lists/param_check.h"
 #include "lists/param_record.h"

@@ -1,6 +1,6 @@
 #include "reports/definition_text.h"
 
-#include "core/status.h"
+#include "core/base/status.h"
 #include "reports/display.h"
 
 namespace tevpf {

@@ -3,8 +3,8 @@
 #include <algorithm>
 #include <cstring>
 
-#include "core/heap.h"
-#include "core/status.h"
+#include "core/base/heap.h"
+#include "core/base/status.h"
 
 using namespace tevpf;
 

@@ -1,14 +1,15 @@
 // The text of a whole file: its header values, then every list, then every table.
 #include <cstring>
 
-#include "core/directory.h"
 #include "core/file.h"
 #include "core/library.h"
+#include "lists/directory.h"
 #include "reports/definition_text.h"
 #include "reports/display.h"
 #include "reports/list_dump.h"
 #include "reports/report_file.h"
 #include "reports/table_dump.h"
+#include "tables/directory.h"
 
 namespace tevpf {
 
@@ -34,10 +35,10 @@ void write_header_value(TextOut& out, const TEVPF_PARAM_DEF& def) noexcept {
 
 void write_file_block(TextOut& out, const TEVPF_FILE& file) noexcept {
   out.print("\t\tFile name           : ", file.file_name, "\n\n");
-  out.print(".\t\tNumber of lists     : ", file.num_lists, "\n\n");
-  out.print(".\t\tNumber of tables    : ", file.num_tables, "\n\n");
+  out.print(".\t\tNumber of lists     : ", directory_of(file, PF_ELEM_LIST).count, "\n\n");
+  out.print(".\t\tNumber of tables    : ", directory_of(file, PF_ELEM_TABLE).count, "\n\n");
   TEVPF_LIST* header = nullptr;
-  if (TEV8R1_get_list_ptr(kHeaderList, &header) == PF_NORMAL) {
+  if (find_list(kHeaderList, header) == PF_NORMAL) {
     for (std::int32_t pos = 0; pos < header->num_params; ++pos) {
       write_header_value(out, header->param_ptr[pos].def);
     }
@@ -48,13 +49,16 @@ void write_file_block(TextOut& out, const TEVPF_FILE& file) noexcept {
 TEVPF_STATUS write_file(TextOut& out, const TEVPF_FILE& file) noexcept {
   write_file_block(out, file);
   TEVPF_STATUS status = PF_NORMAL;
-  for (std::int32_t n = 0; n < file.num_lists && status == PF_NORMAL; ++n) {
-    if (std::strcmp(file.list_ptr[n]->header.elem_name, kHeaderList) == 0) continue;
-    status = write_list(out, *file.list_ptr[n]);
+  const std::int32_t num_lists = directory_of(file, PF_ELEM_LIST).count;
+  for (std::int32_t n = 0; n < num_lists && status == PF_NORMAL; ++n) {
+    const TEVPF_LIST& list = list_at(file, n);
+    if (std::strcmp(list.header.elem_name, kHeaderList) == 0) continue;
+    status = write_list(out, list);
     out.print(kElementEnd);
   }
-  for (std::int32_t n = 0; n < file.num_tables && status == PF_NORMAL; ++n) {
-    status = write_table(out, *file.table_ptr[n]);
+  const std::int32_t num_tables = directory_of(file, PF_ELEM_TABLE).count;
+  for (std::int32_t n = 0; n < num_tables && status == PF_NORMAL; ++n) {
+    status = write_table(out, table_at(file, n));
     out.print(kElementEnd);
   }
   return status;

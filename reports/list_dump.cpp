@@ -3,8 +3,8 @@
 #include <algorithm>
 #include <cstring>
 
-#include "core/directory.h"
 #include "core/library.h"
+#include "lists/directory.h"
 #include "reports/debug_text.h"
 #include "reports/definition_text.h"
 #include "reports/display.h"
@@ -168,7 +168,7 @@ TEVPF_STATUS TEV8R1_list_dump(const TEVPF_LIST* list, std::FILE* stream) noexcep
 TEVPF_STATUS TEV8R1_PF_dump_list(const char* name, const char* path) noexcept {
   return write_report(path, [&](TextOut& out) -> TEVPF_STATUS {
     TEVPF_LIST* list = nullptr;
-    PF_TRY(TEV8R1_get_list_ptr(name, &list));
+    PF_TRY(find_list(name, list));
     return write_list(out, *list);
   });
 }

@@ -3,7 +3,7 @@
 
 #include <cstdio>
 
-#include "core/status.h"
+#include "core/base/status.h"
 #include "reports/text_out.h"
 
 namespace tevpf {

@@ -3,12 +3,12 @@
 #include <algorithm>
 #include <cstring>
 
-#include "core/directory.h"
-#include "core/number_text.h"
-#include "core/status.h"
+#include "core/base/number_text.h"
+#include "core/base/status.h"
 #include "reports/display.h"
 #include "reports/escape.h"
 #include "reports/text_out.h"
+#include "tables/directory.h"
 #include "values/value_type.h"
 
 namespace tevpf {
@@ -225,7 +225,7 @@ TEVPF_STATUS TEV8R1_create_table_header(const char* table_name, std::int32_t fir
                                         std::int32_t fill_width, std::int32_t* first_lead,
                                         char* buffer) noexcept {
   TEVPF_TABLE* table = nullptr;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_table(table_name, table));
   first = std::max(first, 0);
   last = std::min(last, table->num_cols - 1);
   if (fill_width > 0) std::memset(buffer, ' ', static_cast<std::size_t>(fill_width));

@@ -8,8 +8,8 @@
 #include <cstdint>
 #include <string_view>
 
-#include "core/heap.h"
-#include "reports/formats.h"
+#include "core/base/heap.h"
+#include "tables/formats.h"
 #include "tables/table.h"
 
 extern "C" {

@@ -6,7 +6,7 @@
 #include <cstdint>
 #include <string_view>
 
-#include "core/heap.h"
+#include "core/base/heap.h"
 #include "reports/row_text.h"
 #include "reports/text_out.h"
 

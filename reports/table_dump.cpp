@@ -2,7 +2,6 @@
 
 #include <algorithm>
 
-#include "core/directory.h"
 #include "core/library.h"
 #include "reports/debug_text.h"
 #include "reports/definition_text.h"
@@ -10,6 +9,7 @@
 #include "reports/row_text.h"
 #include "reports/segments.h"
 #include "tables/column_index.h"
+#include "tables/directory.h"
 #include "tables/row_store.h"
 
 namespace tevpf {
@@ -115,7 +115,7 @@ TEVPF_STATUS TEV8R1_table_dump(TEVPF_TABLE* table, std::FILE* stream) noexcept {
 TEVPF_STATUS TEV8R1_PF_dump_table(const char* name, const char* path) noexcept {
   return write_report(path, [&](TextOut& out) -> TEVPF_STATUS {
     TEVPF_TABLE* table = nullptr;
-    PF_TRY(TEV8R1_get_table_ptr(name, &table));
+    PF_TRY(find_table(name, table));
     return write_table(out, *table);
   });
 }

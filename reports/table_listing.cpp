@@ -3,7 +3,6 @@
 #include <algorithm>
 #include <cstring>
 
-#include "core/directory.h"
 #include "reports/definition_text.h"
 #include "reports/report_file.h"
 #include "reports/row_text.h"
@@ -11,6 +10,7 @@
 #include "reports/table_dump.h"
 #include "tables/column_record.h"
 #include "tables/cursor.h"
+#include "tables/directory.h"
 #include "tables/row_store.h"
 
 namespace tevpf {
@@ -111,7 +111,7 @@ TEVPF_STATUS TEV8R1_PF_print_table(const char* table_name, const char* path,
                                    std::int32_t last) noexcept {
   return write_report(path, [&](TextOut& out) -> TEVPF_STATUS {
     TEVPF_TABLE* table = nullptr;
-    PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+    PF_TRY(find_table(table_name, table));
     return write_listing(out, *table, {definitions != 0, count, names, first, last});
   });
 }

@@ -8,8 +8,8 @@
 #include <cstring>
 #include <string_view>
 
-#include "core/heap.h"
-#include "core/number_text.h"
+#include "core/base/heap.h"
+#include "core/base/number_text.h"
 
 namespace tevpf {
 

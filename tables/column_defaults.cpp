@@ -1,8 +1,8 @@
 // The operations on a table's column templates.
-#include "core/directory.h"
-#include "core/heap.h"
-#include "core/status.h"
+#include "core/base/heap.h"
+#include "core/base/status.h"
 #include "tables/column_record.h"
+#include "tables/directory.h"
 #include "tables/templates.h"
 #include "values/value_type.h"
 
@@ -13,7 +13,7 @@ namespace {
 TEVPF_STATUS find_template(const char* table_name, std::int32_t type,
                            TEVPF_COL_DEF*& found) noexcept {
   TEVPF_TABLE* table = nullptr;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_table(table_name, table));
   if (table->col_dft == nullptr) PF_TRY(TEV8R1_load_col_dft(table));
   if (!is_value_type(type)) return fail(PF_BADTYPE, "function call", Text(type));
   found = &table->col_dft[type - PF_TYPE_INT];

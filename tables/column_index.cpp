@@ -5,7 +5,7 @@
 #include <limits>
 #include <utility>
 
-#include "core/status.h"
+#include "core/base/status.h"
 #include "tables/row_order.h"
 #include "tables/row_store.h"
 #include "tables/search_keys.h"
@@ -73,15 +73,10 @@ std::int32_t first_equal(const Values& values, std::int32_t low, std::int32_t fo
   return found;
 }
 
-// Texts that are equal stand together, so many of them are halved. A stored text that is a pattern
-// stands in front of what it matches and may part a few equal ones: nearby it is one step at a
-// time.
+// Equal texts stand together, however many match a pattern: the first of them is found by halving.
 template <class Values, bool kWide>
 std::int32_t first_equal(const Values& values, std::int32_t low, std::int32_t found,
                          const TextKey<kWide>& key) noexcept {
-  const std::int32_t near = std::max(low, found - 16);
-  while (found > near && key.equals(values.at(found - 1))) --found;
-  if (found > near) return found;
   while (low < found) {
     const std::int32_t middle = low + (found - low) / 2;
     if (key.equals(values.at(middle))) {

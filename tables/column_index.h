@@ -8,7 +8,7 @@
 
 #include <cstdint>
 
-#include "core/heap.h"
+#include "core/base/heap.h"
 #include "tables/table.h"
 
 extern "C" {

@@ -4,9 +4,9 @@
 #include <cstring>
 #include <utility>
 
-#include "core/heap.h"
-#include "core/status.h"
-#include "core/text_field.h"
+#include "core/base/heap.h"
+#include "core/base/status.h"
+#include "core/base/text_field.h"
 #include "tables/column_index.h"
 #include "tables/layout.h"
 #include "values/value_text.h"
@@ -60,6 +60,10 @@ TEVPF_STATUS copy_definition(const TEVPF_COL_DEF& source, TEVPF_COL_DEF& copy) n
   if (source.description == nullptr) return PF_NORMAL;
   copy.description = heap_copy(source.description);
   return copy.description == nullptr ? fail_empty(PF_NOMEM) : TEVPF_STATUS{PF_NORMAL};
+}
+
+TEVPF_STATUS row_too_wide(const TEVPF_COL_DEF& definition) noexcept {
+  return fail(PF_BADWIDTH, Text(definition.width), definition.name);
 }
 
 void release_column(TEVPF_COLUMN& column) noexcept {

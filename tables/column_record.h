@@ -51,6 +51,9 @@ std::int8_t description_flag(const TEVPF_COL_DEF& definition) noexcept;
 [[nodiscard]] TEVPF_STATUS copy_definition(const TEVPF_COL_DEF& source,
                                            TEVPF_COL_DEF& copy) noexcept;
 
+// The refusal of a definition with which a row would be wider than 31 bits can say.
+[[nodiscard]] TEVPF_STATUS row_too_wide(const TEVPF_COL_DEF& definition) noexcept;
+
 // Releases what the record owns: description, index and search keys.
 void release_column(TEVPF_COLUMN& column) noexcept;
 

@@ -6,14 +6,14 @@
 #include <cstring>
 #include <utility>
 
-#include "core/directory.h"
-#include "core/heap.h"
+#include "core/base/heap.h"
+#include "core/base/status.h"
 #include "core/library.h"
-#include "core/status.h"
-#include "reports/formats.h"
 #include "tables/column_index.h"
 #include "tables/column_record.h"
 #include "tables/default_row.h"
+#include "tables/directory.h"
+#include "tables/formats.h"
 #include "tables/layout.h"
 #include "tables/row_store.h"
 #include "values/value_type.h"
@@ -79,7 +79,7 @@ TEVPF_STATUS construct_new_column(const TEVPF_TABLE& table, const TEVPF_COL_DEF&
 
   column.layout = layout_of(table);
   record.offset = static_cast<std::int32_t>(place_column(column.layout, def));
-  if (column.layout.row_wid > kMaxRowWidth) return fail(PF_BADWIDTH, Text(def.width), def.name);
+  if (column.layout.row_wid > kMaxRowWidth) return row_too_wide(def);
 
   std::int32_t size = 0;
   std::int16_t mod = table.mod;
@@ -100,14 +100,7 @@ bool acquire_room(TEVPF_TABLE& table, NewColumn& column) noexcept {
   if (def.idx_flag != 0 && !make_identity_index(table.num_rows, table.num_rows, column.index)) {
     return false;
   }
-  void* default_row = table.dft_row;
-  const auto width = static_cast<std::int32_t>(column.layout.row_wid);
-  if (TEV8R1_adjust_default(&default_row, width, &def, column_size(column.record),
-                            column.record.offset) != PF_NORMAL) {
-    return false;
-  }
-  table.dft_row = static_cast<unsigned char*>(default_row);
-  return true;
+  return widen_default_row(table, column.layout.row_wid, column.record.offset, def);
 }
 
 // The bytes that a new column has in every row; null: zeros.
@@ -122,12 +115,6 @@ void append_column(TEVPF_TABLE& table, NewColumn column) noexcept {
   unsigned char value[8];
   widen_rows(table, column.layout.row_wid, record.offset, initial_value(record.def, value),
              column_size(record));
-
-  // Bytes of the default row between the old row's end and the new value are padding.
-  if (record.offset > table.row_wid) {
-    std::memset(table.dft_row + table.row_wid, 0,
-                static_cast<std::size_t>(record.offset - table.row_wid));
-  }
   if (column.larger) {
     replace_columns(table, std::move(column.larger), column_position(table, table.cur_col));
     table.free_cols = kColumnIncrement;
@@ -231,7 +218,8 @@ void print_move(const TEVPF_TABLE& table, std::int32_t from, std::int32_t to) no
   }
 }
 
-bool relay_storage(const TEVPF_TABLE& table, Reordered& next) noexcept {
+bool relay_storage(TEVPF_TABLE& table, Reordered& next) noexcept {
+  if (!ensure_default_row(table)) return false;
   const std::int64_t new_wid = next.layout.row_wid;
   next.default_row = new_zeroed<unsigned char>(static_cast<std::uint64_t>(new_wid));
   if (!next.default_row) return false;
@@ -275,7 +263,7 @@ TEVPF_STATUS TEV8R1_adjust_data(TEVPF_TABLE* table, std::int32_t size, std::int3
 
 TEVPF_STATUS TEV8R1_PF_def_column(const char* table_name, TEVPF_COL_DEF definition) noexcept {
   TEVPF_TABLE* table = nullptr;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_table(table_name, table));
   terminate_texts(definition);
   PF_TRY(TEV8R1_validate_col_def(table, definition));
 
@@ -289,11 +277,11 @@ TEVPF_STATUS TEV8R1_PF_def_column(const char* table_name, TEVPF_COL_DEF definiti
 TEVPF_STATUS TEV8R1_PF_delete_col(const char* table_name, const char* column_name) noexcept {
   TEVPF_TABLE* table = nullptr;
   TEVPF_COLUMN* column = nullptr;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_table(table_name, table));
   PF_TRY(TEV8R1_get_col_ptr(table, column_name, &column));
 
   const auto runs = new_array<Run>(static_cast<std::uint64_t>(table->num_cols));
-  if (!runs) return fail_empty(PF_NOMEM);
+  if (!runs || !ensure_default_row(*table)) return fail_empty(PF_NOMEM);
 
   const std::int32_t position = column_position(*table, column);
   std::int32_t num_runs = 0;
@@ -306,7 +294,7 @@ TEVPF_STATUS TEV8R1_PF_delete_col(const char* table_name, const char* column_nam
   } else {
     compact_rows(row_at(*table, 0), table->num_rows, table->row_wid, layout.row_wid, runs.get(),
                  num_runs);
-    compact_rows(table->dft_row, 1, table->row_wid, layout.row_wid, runs.get(), num_runs);
+    compact_row(table->dft_row, runs.get(), num_runs);
     set_layout(*table, layout);
   }
   give_up_spare_rows(*table);
@@ -317,7 +305,7 @@ TEVPF_STATUS TEV8R1_PF_move_col(const char* table_name, const char* column_name,
                                 const char* before_name) noexcept {
   TEVPF_TABLE* table = nullptr;
   TEVPF_COLUMN *column = nullptr, *before = nullptr;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_table(table_name, table));
   PF_TRY(TEV8R1_get_col_ptr(table, column_name, &column));
   if (before_name != nullptr) PF_TRY(TEV8R1_get_col_ptr(table, before_name, &before));
   if (table->num_cols < 2) return PF_NORMAL;
@@ -329,7 +317,7 @@ TEVPF_STATUS TEV8R1_PF_move_col(const char* table_name, const char* column_name,
   Reordered next;
   if (!lay_out_moved(*table, from, to, next)) return fail_empty(PF_NOMEM);
   if (next.layout.row_wid > kMaxRowWidth) {
-    return fail(PF_BADWIDTH, Text(column->def.width), column->def.name);
+    return row_too_wide(column->def);
   }
   if (library.debug_value != nullptr) print_move(*table, from, to);
   if (!relay_storage(*table, next)) return fail_empty(PF_NOMEM);

@@ -13,10 +13,8 @@ TEVPF_API TEVPF_STATUS TEV8R1_adjust_data(TEVPF_TABLE* table, std::int32_t size,
                                           std::int32_t offset, std::int32_t pad,
                                           const TEVPF_COL_DEF* definition) noexcept;
 
-// Holds the number at `offset` of every row, in storage order, against the definition's bounds;
-// then the definition's width.
-//   PF_RANGE     text: the first value outside
-//   PF_BADWIDTH  width below 1; takes the place of PF_RANGE, but leaves the texts alone
+// Compares the number at `offset` of every row, in storage order, with the definition's bounds.
+//   PF_RANGE  texts: the first value outside, empty
 TEVPF_API TEVPF_STATUS TEV8R1_check_column_values(const TEVPF_TABLE* table, std::int32_t offset,
                                                   TEVPF_COL_DEF definition,
                                                   double tolerance) noexcept;

@@ -1,7 +1,7 @@
 #include "tables/cursor.h"
 
-#include "core/directory.h"
-#include "core/status.h"
+#include "core/base/status.h"
+#include "tables/directory.h"
 #include "tables/search_keys.h"
 
 namespace tevpf {
@@ -20,7 +20,7 @@ inline TEVPF_STATUS step(TEVPF_TABLE& table, void* row_out) noexcept {
 
 [[gnu::noinline]] TEVPF_STATUS find_and_step(const char* table_name, void* row_out) noexcept {
   TEVPF_TABLE* table;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_table(table_name, table));
   return step(*table, row_out);
 }
 
@@ -56,7 +56,7 @@ TEVPF_STATUS TEV8R1_PF_get_next_row(const char* table_name, void* row_out) noexc
 
 TEVPF_STATUS TEV8R1_PF_get_row_by_pos(const char* table_name, int32_t pos, void* row_out) noexcept {
   TEVPF_TABLE* table;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_table(table_name, table));
   if (!has_position(*table, pos)) return fail(PF_BADPOS, Text(pos), Text(table->num_rows));
   deliver_row(*table, pos, row_out);
   return PF_NORMAL;
@@ -64,7 +64,7 @@ TEVPF_STATUS TEV8R1_PF_get_row_by_pos(const char* table_name, int32_t pos, void*
 
 TEVPF_STATUS TEV8R1_PF_reset_table(const char* table_name) noexcept {
   TEVPF_TABLE* table;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_table(table_name, table));
   table->cur_row = -1;
   table->next_row = 0;
   return PF_NORMAL;
@@ -72,6 +72,6 @@ TEVPF_STATUS TEV8R1_PF_reset_table(const char* table_name) noexcept {
 
 int32_t TEV8R1_convert_row(const char* table_name, int32_t pos) noexcept {
   TEVPF_TABLE* table;
-  if (TEV8R1_get_table_ptr(table_name, &table) != PF_NORMAL) return -1;
+  if (find_table(table_name, table) != PF_NORMAL) return -1;
   return has_position(*table, pos) ? row_at_position(*table, pos) : pos;
 }

@@ -3,7 +3,7 @@
 
 #include <cstdint>
 
-#include "core/short_copy.h"
+#include "core/base/short_copy.h"
 #include "tables/column_index.h"
 #include "tables/row_store.h"
 #include "tables/table.h"

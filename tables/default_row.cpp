@@ -2,7 +2,7 @@
 
 #include <cstring>
 
-#include "core/status.h"
+#include "core/base/status.h"
 #include "tables/layout.h"
 #include "values/value_type.h"
 
@@ -24,6 +24,23 @@ bool make_default_row(TEVPF_TABLE& table) noexcept {
   auto row = new_zeroed<unsigned char>(static_cast<std::uint64_t>(table.row_wid));
   if (!row) return false;
   adopt_minimums(table, std::move(row));
+  return true;
+}
+
+bool ensure_default_row(TEVPF_TABLE& table) noexcept {
+  return table.dft_row != nullptr || make_default_row(table);
+}
+
+bool widen_default_row(TEVPF_TABLE& table, std::int64_t new_wid, std::int64_t offset,
+                       const TEVPF_COL_DEF& definition) noexcept {
+  if (table.num_cols > 0 && !ensure_default_row(table)) return false;
+  auto row = new_zeroed<unsigned char>(static_cast<std::uint64_t>(new_wid));
+  if (!row) return false;
+  if (table.dft_row != nullptr) {
+    std::memcpy(row.get(), table.dft_row, static_cast<std::size_t>(table.row_wid));
+  }
+  put_min(row.get() + offset, definition);
+  adopt_default_row(table, std::move(row));
   return true;
 }
 
@@ -63,13 +80,13 @@ TEVPF_STATUS TEV8R1_init_row_defaults(TEVPF_TABLE* table) noexcept {
 TEVPF_STATUS TEV8R1_adjust_default(void** dft_row, std::int32_t row_wid,
                                    const TEVPF_COL_DEF* definition, std::int32_t size,
                                    std::int32_t offset) noexcept {
-  (void)size;  // the value reaches to the padding that ends the row
+  (void)size;  // follows from the definition
   const auto bytes = static_cast<std::uint64_t>(row_wid);
   void* row = *dft_row == nullptr ? heap_zeroed(bytes, 1) : heap_resize(*dft_row, bytes, 1);
   if (row == nullptr) return fail_empty(PF_NOMEM);
   *dft_row = row;
-  unsigned char* place = static_cast<unsigned char*>(row) + offset;
-  std::memset(place, 0, static_cast<std::size_t>(row_wid - offset));
-  if (is_value_type(definition->type)) put_min(place, *definition);
+  if (is_value_type(definition->type)) {
+    put_min(static_cast<unsigned char*>(row) + offset, *definition);
+  }
   return PF_NORMAL;
 }

@@ -1,8 +1,8 @@
 // The default row: one row of the table's layout that holds every column's min, strings the empty
-// text, until a caller sets other values. Bytes without a value are zero.
+// text, until a caller sets other values. Bytes without a value are zero in rows that are made here.
 #pragma once
 
-#include "core/heap.h"
+#include "core/base/heap.h"
 #include "tables/table.h"
 
 extern "C" {
@@ -21,7 +21,16 @@ void put_min(unsigned char* place, const TEVPF_COL_DEF& definition) noexcept;
 // when memory runs out, and then it keeps that.
 [[nodiscard]] bool make_default_row(TEVPF_TABLE& table) noexcept;
 
-// The same with a block of row_wid zeros that is already there.
+// Makes the default row where there is none yet: a table whose loading has failed has columns, but
+// gets a default row only when an operation needs it. False when memory runs out.
+[[nodiscard]] bool ensure_default_row(TEVPF_TABLE& table) noexcept;
+
+// Widens the default row from row_wid to new_wid bytes, or makes the first one, and puts the min of a
+// new column at `offset`. Bytes that were there stay, the others are zero. False when memory runs out.
+[[nodiscard]] bool widen_default_row(TEVPF_TABLE& table, std::int64_t new_wid, std::int64_t offset,
+                                     const TEVPF_COL_DEF& definition) noexcept;
+
+// The same as make_default_row with a block of row_wid zeros that is already there.
 void adopt_minimums(TEVPF_TABLE& table, Owned<unsigned char> zeroed) noexcept;
 
 // Replaces the default row by another block, or by none.

@@ -1,10 +1,10 @@
 // What callers need to know about columns to build rows: definitions, names, places. All that is
 // handed out is the caller's own.
-#include "core/directory.h"
-#include "core/heap.h"
-#include "core/status.h"
-#include "core/text_field.h"
+#include "core/base/heap.h"
+#include "core/base/status.h"
+#include "core/base/text_field.h"
 #include "tables/column_record.h"
+#include "tables/directory.h"
 #include "tables/table.h"
 
 namespace tevpf {
@@ -15,7 +15,7 @@ template <class Entry, class Fill>
 TEVPF_STATUS hand_out_columns(const char* table_name, std::int32_t* count_out, Entry** entries_out,
                               Fill fill) noexcept {
   TEVPF_TABLE* table = nullptr;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_table(table_name, table));
   const std::int32_t count = *count_out = table->num_cols;
   if (count == 0) return PF_NORMAL;
   auto* entries =
@@ -35,7 +35,7 @@ TEVPF_STATUS TEV8R1_PF_inq_col_def(const char* table_name, const char* column_na
                                    TEVPF_COL_DEF* def_out) noexcept {
   TEVPF_TABLE* table = nullptr;
   TEVPF_COLUMN* column = nullptr;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_table(table_name, table));
   PF_TRY(TEV8R1_get_col_ptr(table, column_name, &column));
   return copy_definition(column->def, *def_out);
 }
@@ -43,7 +43,7 @@ TEVPF_STATUS TEV8R1_PF_inq_col_def(const char* table_name, const char* column_na
 TEVPF_STATUS TEV8R1_PF_inq_col_def_by_pos(const char* table_name, std::int32_t pos,
                                           TEVPF_COL_DEF* def_out) noexcept {
   TEVPF_TABLE* table = nullptr;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_table(table_name, table));
   if (pos < 0 || pos >= table->num_cols) return fail(PF_BADPOS, Text(pos), Text(table->num_cols));
   return copy_definition(table->col_array[pos].def, *def_out);
 }
@@ -52,7 +52,7 @@ TEVPF_STATUS TEV8R1_get_col_type(const char* table_name, const char* column_name
                                  std::int32_t* type_out) noexcept {
   TEVPF_TABLE* table = nullptr;
   TEVPF_COLUMN* column = nullptr;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_table(table_name, table));
   PF_TRY(TEV8R1_get_col_ptr(table, column_name, &column));
   *type_out = column->def.type;
   return PF_NORMAL;

@@ -2,16 +2,16 @@
 #include <cstring>
 #include <utility>
 
-#include "core/directory.h"
-#include "core/heap.h"
+#include "core/base/heap.h"
+#include "core/base/status.h"
+#include "core/base/text_field.h"
 #include "core/library.h"
-#include "core/status.h"
-#include "core/text_field.h"
-#include "reports/formats.h"
 #include "tables/column_index.h"
 #include "tables/column_record.h"
 #include "tables/columns.h"
 #include "tables/default_row.h"
+#include "tables/directory.h"
+#include "tables/formats.h"
 #include "tables/layout.h"
 #include "tables/row_store.h"
 #include "values/compare.h"
@@ -65,10 +65,13 @@ TEVPF_STATUS check_redefinition(const TEVPF_TABLE& table, const TEVPF_COLUMN& co
   if (definition.type == PF_TYPE_STRING) {
     PF_TRY(check_string_width(table, column.def.width, definition.width));
   } else {
-    PF_TRY(TEV8R1_check_column_values(&table, column.offset, definition, column.tolerance));
+    const TEVPF_STATUS status =
+        TEV8R1_check_column_values(&table, column.offset, definition, column.tolerance);
+    if (definition.width < 1) return PF_BADWIDTH;  // over a value out of range, whose texts stay
+    PF_TRY(status);
   }
   row_wid = redefined_row_width(table, column_position(table, &column), definition);
-  return row_wid > kMaxRowWidth ? PF_BADWIDTH : PF_NORMAL;
+  return row_wid > kMaxRowWidth ? row_too_wide(definition) : PF_NORMAL;
 }
 
 // The index as the redefinition leaves it: built when it is switched on, and built anew when a
@@ -145,7 +148,7 @@ using namespace tevpf;
 TEVPF_STATUS TEV8R1_check_column_values(const TEVPF_TABLE* table, std::int32_t offset,
                                         TEVPF_COL_DEF definition, double tolerance) noexcept {
   if (!is_number_type(definition.type)) return PF_NORMAL;
-  const TEVPF_STATUS status = with_number(definition.type, [&](auto tag) -> TEVPF_STATUS {
+  return with_number(definition.type, [&](auto tag) -> TEVPF_STATUS {
     using T = decltype(tag);
     const T min = limits_of<T>(definition).min, max = limits_of<T>(definition).max;
     for (std::int32_t i = 0; i < table->num_rows; ++i) {
@@ -157,7 +160,6 @@ TEVPF_STATUS TEV8R1_check_column_values(const TEVPF_TABLE* table, std::int32_t o
     }
     return PF_NORMAL;
   });
-  return definition.width < 1 ? PF_BADWIDTH : status;
 }
 
 TEVPF_STATUS TEV8R1_check_unique_values(const TEVPF_TABLE* table,
@@ -172,7 +174,7 @@ TEVPF_STATUS TEV8R1_PF_modify_col_def(const char* table_name, const char* column
                                       TEVPF_COL_DEF definition) noexcept {
   TEVPF_TABLE* table = nullptr;
   TEVPF_COLUMN* column = nullptr;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_table(table_name, table));
   PF_TRY(TEV8R1_get_col_ptr(table, column_name, &column));
   terminate_texts(definition);
   std::int64_t row_wid = 0;

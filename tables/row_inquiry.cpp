@@ -1,15 +1,15 @@
 // Figures of a table, the check of a single value, and interactive mode.
-#include "core/directory.h"
+#include "core/base/status.h"
 #include "core/library.h"
-#include "core/status.h"
 #include "tables/column_record.h"
+#include "tables/directory.h"
 #include "tables/validate.h"
 
 using namespace tevpf;
 
 TEVPF_STATUS TEV8R1_PF_inq_num_rows(const char* table_name, int32_t* num_rows_out) noexcept {
   TEVPF_TABLE* table;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_table(table_name, table));
   *num_rows_out = table->num_rows;
   return PF_NORMAL;
 }
@@ -18,7 +18,7 @@ TEVPF_STATUS TEV8R1_PF_inq_table_info(const char* table_name, int32_t* num_cols_
                                       int32_t* num_rows_out, int32_t* row_wid_out,
                                       int32_t* dsp_wid_out, int32_t* cur_row_out) noexcept {
   TEVPF_TABLE* table;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_table(table_name, table));
   *num_cols_out = table->num_cols;
   *num_rows_out = table->num_rows;
   *row_wid_out = table->row_wid;
@@ -31,14 +31,14 @@ TEVPF_STATUS TEV8R1_validate_row_value(const char* table_name, const char* colum
                                        const void* value) noexcept {
   TEVPF_TABLE* table;
   TEVPF_COLUMN* column;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_table(table_name, table));
   PF_TRY(TEV8R1_get_col_ptr(table, column_name, &column));
   return TEV8R1_validate_value(table, column, value);
 }
 
 TEVPF_STATUS TEV8R1_set_interactive_table(const char* table_name) noexcept {
   TEVPF_TABLE* table;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_table(table_name, table));
   library.interactive = 1;
   return PF_NORMAL;
 }

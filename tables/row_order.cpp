@@ -4,7 +4,7 @@
 #include <cmath>
 #include <cstring>
 
-#include "core/heap.h"
+#include "core/base/heap.h"
 #include "tables/row_store.h"
 #include "values/compare.h"
 

@@ -10,91 +10,23 @@
 namespace tevpf {
 namespace {
 
-// Zeroes the same bytes of many rows in one pass over them, or in one for each kMost. A gap is a
-// few bytes, so each is a word of the row with a mask over it: a call to memset costs more than the
-// rest.
-class Eraser {
- public:
-  // cppcheck-suppress uninitMemberVar; add fills the words that are counted
-  Eraser(unsigned char* rows, std::int64_t count, std::int64_t row_wid) noexcept
-      : rows_(rows), count_(count), row_wid_(row_wid) {}
-
-  void zero(std::int64_t from, std::int64_t to) noexcept {
-    for (; from < to; from = std::min(from + kWord, to)) add(from, std::min(to - from, kWord));
+// Gives `count` fields of `size` bytes, a row apart, a terminator in their last byte where they have
+// none.
+void end_texts(unsigned char* field, std::int64_t size, std::int64_t count,
+               std::int64_t row_wid) noexcept {
+  const auto bytes = static_cast<std::size_t>(size);
+  for (; count > 0; --count, field += row_wid) {
+    if (field[size - 1] != 0 && std::memchr(field, 0, bytes) == nullptr) field[size - 1] = 0;
   }
+}
 
-  void finish() noexcept {
-    if (!is_clean()) erase();
-    used_ = 0;
+void put_value(unsigned char* place, const void* value, std::size_t size) noexcept {
+  if (value != nullptr) {
+    std::memcpy(place, value, size);
+  } else {
+    std::memset(place, 0, size);
   }
-
- private:
-  static constexpr int kMost = 4;
-  static constexpr std::int64_t kWord = 8;
-  struct Word {
-    std::int64_t offset;
-    std::uint64_t kept;
-  };
-
-  // Rows of a file mostly are clean, and reading them only is twice as fast as writing them.
-  bool is_clean() const noexcept {
-    switch (used_) {
-      case 0:
-        return true;
-      case 1:
-        return has_zeros<1>();
-      case 2:
-        return has_zeros<2>();
-      case 3:
-        return has_zeros<3>();
-      default:
-        static_assert(kMost == 4);
-        return has_zeros<kMost>();
-    }
-  }
-
-  template <int kWords>
-  bool has_zeros() const noexcept {
-    std::uint64_t stray = 0;
-    const unsigned char* row = rows_;
-    for (std::int64_t i = 0; i < count_; ++i, row += row_wid_) {
-      for (int w = 0; w < kWords; ++w) {
-        stray |= load<std::uint64_t>(row + words_[w].offset) & ~words_[w].kept;
-      }
-    }
-    return stray == 0;
-  }
-
-  void erase() noexcept {
-    for (std::int64_t row = 0; row < count_; ++row) {
-      unsigned char* const bytes = rows_ + row * row_wid_;
-      for (int i = 0; i < used_; ++i) {
-        unsigned char* const word = bytes + words_[i].offset;
-        store(word, load<std::uint64_t>(word) & words_[i].kept);
-      }
-    }
-  }
-
-  // `size` bytes, 1 to 8, from `offset` on; the word around them ends within the row.
-  void add(std::int64_t offset, std::int64_t size) noexcept {
-    if (row_wid_ < kWord) {
-      for (std::int64_t row = 0; row < count_; ++row) {
-        std::memset(rows_ + row * row_wid_ + offset, 0, static_cast<std::size_t>(size));
-      }
-      return;
-    }
-    const std::int64_t start = std::min(offset, row_wid_ - kWord);
-    const std::uint64_t gone = ~std::uint64_t{0} >> (8 * (kWord - size));
-    words_[used_++] = {start, ~(gone << (8 * (offset - start)))};
-    if (used_ == kMost) finish();
-  }
-
-  unsigned char* rows_;
-  std::int64_t count_;
-  std::int64_t row_wid_;
-  Word words_[kMost];
-  int used_ = 0;
-};
+}
 
 }  // namespace
 
@@ -125,17 +57,12 @@ void close_row_gap(TEVPF_TABLE& table, std::int32_t row) noexcept {
       static_cast<std::size_t>(table.num_rows - row - 1) * static_cast<std::size_t>(table.row_wid));
 }
 
-void clean_rows(const TEVPF_TABLE& table, unsigned char* rows, std::int64_t count) noexcept {
-  Eraser eraser(rows, count, table.row_wid);
-  // From the last byte of a string, or the end of a number, to the next value or the row's end.
-  std::int64_t zero_from = 0;
+void end_texts(const TEVPF_TABLE& table, unsigned char* rows, std::int64_t count) noexcept {
   for (std::int32_t i = 0; i < table.num_cols; ++i) {
     const TEVPF_COLUMN& column = table.col_array[i];
-    eraser.zero(zero_from, column.offset);
-    zero_from = column.offset + column_size(column) - (column.def.type == PF_TYPE_STRING ? 1 : 0);
+    if (column.def.type != PF_TYPE_STRING) continue;
+    end_texts(rows + column.offset, column_size(column), count, table.row_wid);
   }
-  eraser.zero(zero_from, table.row_wid);
-  eraser.finish();
 }
 
 void release_rows(TEVPF_TABLE& table) noexcept { adopt_rows(table, nullptr, 0); }
@@ -171,13 +98,12 @@ void copy_values(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
 void widen_rows(TEVPF_TABLE& table, std::int64_t new_wid, std::int64_t offset, const void* value,
                 std::int64_t size) noexcept {
   const auto old_wid = static_cast<std::size_t>(table.row_wid);
-  // The new value may start in the old row's trailing padding, never before it.
-  const std::int64_t tail = std::min<std::int64_t>(offset, table.row_wid);
+  const auto added = static_cast<std::size_t>(new_wid - table.row_wid);
   for (std::int64_t n = table.num_rows - std::int64_t{1}; n >= 0; --n) {
     unsigned char* row = table.row_data + n * new_wid;
     std::memmove(row, row_at(table, n), old_wid);
-    std::memset(row + tail, 0, static_cast<std::size_t>(new_wid - tail));
-    if (value != nullptr) std::memcpy(row + offset, value, static_cast<std::size_t>(size));
+    std::memset(row + old_wid, 0, added);
+    put_value(row + offset, value, static_cast<std::size_t>(size));
   }
 }
 
@@ -206,6 +132,12 @@ void compact_rows(unsigned char* rows, std::int64_t num_rows, std::int64_t old_w
       end = std::int64_t{run->to} + run->size;
     }
     std::memset(to + end, 0, static_cast<std::size_t>(new_wid - end));
+  }
+}
+
+void compact_row(unsigned char* row, const Run* runs, std::int32_t num_runs) noexcept {
+  for (const Run* run = runs; run != runs + num_runs; ++run) {
+    std::memmove(row + run->to, row + run->from, static_cast<std::size_t>(run->size));
   }
 }
 

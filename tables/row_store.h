@@ -2,12 +2,13 @@
 //
 // The block behind row_data holds row_room bytes, at least (num_rows + free_rows) * row_wid, and
 // grows geometrically; free_rows counts what the documented increments gave, and is the callers'
-// business, like num_rows. The block as a whole may exceed 31 bits. Padding bytes of rows are zero.
+// business, like num_rows. The block as a whole may exceed 31 bits. Rows are kept as they are handed in,
+// padding included.
 #pragma once
 
 #include <cstdint>
 
-#include "core/heap.h"
+#include "core/base/heap.h"
 #include "tables/table.h"
 
 namespace tevpf {
@@ -58,9 +59,9 @@ inline std::int64_t readable_bytes(const TEVPF_TABLE& table, const TEVPF_COLUMN&
 void open_row_gap(TEVPF_TABLE& table, std::int32_t row) noexcept;
 void close_row_gap(TEVPF_TABLE& table, std::int32_t row) noexcept;
 
-// Zeroes the padding of some rows of this table's layout and puts a terminator into the last byte
-// of each of their string values: for rows that callers or files hand in. They may lie anywhere.
-void clean_rows(const TEVPF_TABLE& table, unsigned char* rows, std::int64_t count) noexcept;
+// Gives every string value of `count` rows of this table's layout that has no terminator one in its
+// last byte: for rows that callers or files hand in. They may lie anywhere.
+void end_texts(const TEVPF_TABLE& table, unsigned char* rows, std::int64_t count) noexcept;
 
 // Give the row block back, or replace it by one of `room` bytes; num_rows and free_rows stay.
 void release_rows(TEVPF_TABLE& table) noexcept;
@@ -76,7 +77,7 @@ void copy_values(const TEVPF_TABLE& table, const TEVPF_COLUMN& column, unsigned 
 // ---- Changes of layout --------------------------------------------------------------------------
 
 // Widens all rows in place from row_wid to new_wid, which have room for it, and puts `value` (size
-// bytes) at `offset` of each, zeros where it is null. Other new bytes are zero.
+// bytes) at `offset` of each, zeros where it is null. Other bytes that are new are zero.
 void widen_rows(TEVPF_TABLE& table, std::int64_t new_wid, std::int64_t offset, const void* value,
                 std::int64_t size) noexcept;
 
@@ -95,6 +96,9 @@ std::int32_t add_run(Run* runs, std::int32_t count, Run value) noexcept;
 // Rows re-laid in place, where no value moves up and no row grows; runs in ascending order.
 void compact_rows(unsigned char* rows, std::int64_t num_rows, std::int64_t old_wid,
                   std::int64_t new_wid, const Run* runs, std::int32_t num_runs) noexcept;
+
+// The same for a single row, whose bytes between the values stay what they are.
+void compact_row(unsigned char* row, const Run* runs, std::int32_t num_runs) noexcept;
 
 // Rows re-laid into `target`, num_rows * new_wid zeroed bytes.
 void relay_rows(const unsigned char* rows, std::int64_t num_rows, std::int64_t old_wid,

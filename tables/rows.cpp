@@ -4,12 +4,13 @@
 #include <cstring>
 #include <limits>
 
-#include "core/directory.h"
-#include "core/heap.h"
+#include "core/base/heap.h"
+#include "core/base/status.h"
 #include "core/library.h"
-#include "core/status.h"
 #include "tables/column_index.h"
 #include "tables/cursor.h"
+#include "tables/default_row.h"
+#include "tables/directory.h"
 #include "tables/layout.h"
 #include "tables/row_store.h"
 #include "tables/search_keys.h"
@@ -42,7 +43,7 @@ class GivenRow {
     if (all_texts_end(table, row_)) return;
     copy_.reset(
         static_cast<unsigned char*>(heap_copy(row, static_cast<std::uint64_t>(table.row_wid))));
-    if (copy_) clean_rows(table, copy_.get(), 1);
+    if (copy_) end_texts(table, copy_.get(), 1);
     row_ = copy_.get();
   }
   const unsigned char* get() const noexcept { return row_; }  // null: memory ran out
@@ -57,9 +58,7 @@ void copy_row(const TEVPF_TABLE& table, const void* from, void* to) noexcept {
 }
 
 void store_row(TEVPF_TABLE& table, const void* row, std::int32_t row_number) noexcept {
-  unsigned char* const slot = row_at(table, row_number);
-  copy_row(table, row, slot);
-  clean_rows(table, slot, 1);
+  copy_row(table, row, row_at(table, row_number));
 }
 
 // ---- Insertion and removal ----------------------------------------------------------------------
@@ -113,7 +112,6 @@ TEVPF_STATUS insert_row(TEVPF_TABLE& table, const void* row, std::int32_t row_nu
 
 // Takes a row out; positions as remove_row_from_indexes has them.
 void erase_row(TEVPF_TABLE& table, std::int32_t row_number, std::int32_t* positions) noexcept {
-  drop_search_keys(table);
   remove_row_from_indexes(table, row_number, positions);
   close_row_gap(table, row_number);
   --table.num_rows;
@@ -145,6 +143,12 @@ TEVPF_STATUS move_row(TEVPF_TABLE& table, std::int32_t from, std::int32_t to) no
   return status;
 }
 
+TEVPF_STATUS find_with_default_row(const char* table_name, TEVPF_TABLE*& table) noexcept {
+  PF_TRY(find_table(table_name, table));
+  if (table->num_cols > 0 && !ensure_default_row(*table)) return fail_empty(PF_NOMEM);
+  return PF_NORMAL;
+}
+
 // ---- Replacement --------------------------------------------------------------------------------
 
 bool values_differ(const TEVPF_COLUMN& column, const unsigned char* stored_row,
@@ -154,7 +158,6 @@ bool values_differ(const TEVPF_COLUMN& column, const unsigned char* stored_row,
 }
 
 void replace_row(TEVPF_TABLE& table, std::int32_t row_number, const unsigned char* row) noexcept {
-  drop_search_keys(table);
   const unsigned char* const stored = row_at(table, row_number);
   for (std::int32_t i = 0; i < table.num_cols; ++i) {
     TEVPF_COLUMN& column = table.col_array[i];
@@ -193,14 +196,14 @@ TEVPF_STATUS TEV8R1_PF_add_row(const char* table_name, const void* row) noexcept
 TEVPF_STATUS TEV8R1_PF_add_row_by_pos(const char* table_name, const void* row,
                                       int32_t row_number) noexcept {
   TEVPF_TABLE* table;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_table(table_name, table));
   return insert_row(*table, row, row_number);
 }
 
 TEVPF_STATUS TEV8R1_PF_add_row_with_dft(const char* table_name, void* row,
                                         const int32_t* supplied) noexcept {
   TEVPF_TABLE* table;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_with_default_row(table_name, table));
   for (int32_t i = 0; i < table->num_cols; ++i) {
     if (supplied[i] != 0) continue;
     const TEVPF_COLUMN& column = table->col_array[i];
@@ -214,7 +217,7 @@ TEVPF_STATUS TEV8R1_PF_replace_row(const char* table_name, const void* row) noex
   TEVPF_TABLE* table;
   void* stored;
   int32_t row_number;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_table(table_name, table));
   PF_TRY(TEV8R1_get_cur_row_ptr(table, &stored, &row_number));
   const GivenRow given(*table, row);
   if (given.get() == nullptr) return fail_empty(PF_NOMEM);
@@ -228,7 +231,7 @@ TEVPF_STATUS TEV8R1_PF_delete_row(const char* table_name) noexcept {
   TEVPF_TABLE* table;
   void* stored;
   int32_t row_number;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_table(table_name, table));
   PF_TRY(TEV8R1_get_cur_row_ptr(table, &stored, &row_number));
   erase_row(*table, row_number, nullptr);
   table->cur_row = -1;
@@ -238,7 +241,7 @@ TEVPF_STATUS TEV8R1_PF_delete_row(const char* table_name) noexcept {
 
 TEVPF_STATUS TEV8R1_PF_move_row(const char* table_name, int32_t from, int32_t to) noexcept {
   TEVPF_TABLE* table;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_table(table_name, table));
   if (table->cur_col != nullptr) return PF_SEARCHSET;
   if (from < 0 || from >= table->num_rows || table->num_rows < 2) {
     return fail(PF_BADPOS, Text(from), Text(table->num_rows));
@@ -248,19 +251,18 @@ TEVPF_STATUS TEV8R1_PF_move_row(const char* table_name, int32_t from, int32_t to
 
 TEVPF_STATUS TEV8R1_PF_set_dft_row(const char* table_name, const void* row) noexcept {
   TEVPF_TABLE* table;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_with_default_row(table_name, table));
   const GivenRow given(*table, row);
   if (given.get() == nullptr) return fail_empty(PF_NOMEM);
   InsertionPoints points;
   if (library.interactive == 0) PF_TRY(check_row(*table, given.get(), kAnybody, points));
   copy_row(*table, given.get(), table->dft_row);
-  if (table->dft_row != nullptr) clean_rows(*table, table->dft_row, 1);
   return PF_NORMAL;
 }
 
 TEVPF_STATUS TEV8R1_PF_inq_dft_row(const char* table_name, void* row_out) noexcept {
   TEVPF_TABLE* table;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_with_default_row(table_name, table));
   copy_row(*table, table->dft_row, row_out);
   return PF_NORMAL;
 }

@@ -1,12 +1,13 @@
 // Rows found by value, and one column's values of all rows.
+#include <algorithm>
 #include <cstring>
 
-#include "core/directory.h"
-#include "core/fetch.h"
-#include "core/status.h"
+#include "core/base/fetch.h"
+#include "core/base/status.h"
 #include "tables/column_index.h"
 #include "tables/column_record.h"
 #include "tables/cursor.h"
+#include "tables/directory.h"
 #include "tables/layout.h"
 #include "tables/row_store.h"
 #include "tables/search_keys.h"
@@ -22,22 +23,21 @@ constexpr std::int8_t kExact = 0;
 constexpr std::int8_t kNearest = 1;
 
 // The first position from `first` on whose row has a value equal to the key, walking in storage
-// order (order null) or through an index; `count` when there is none. At the speed of memory: one
-// typed comparison a row.
+// order (order null) or through an index; `count` when there is none. At the speed of memory.
 template <class Key>
 std::int32_t walk(const Values& values, std::int32_t count, const std::int32_t* order,
                   std::int32_t first, const Key& key) noexcept {
-  std::int32_t at = first;
   if (order == nullptr) {
-    const unsigned char* value = values.of(at);
-    for (; at < count && !key.equals(value); ++at, value += values.stride) fetch_along(value);
-    return at;
+    return find_first(first, count, key, [&](std::int32_t at) {
+      const unsigned char* const value = values.of(at);
+      fetch_along(value);
+      return value;
+    });
   }
-  for (; at < count; ++at) {
-    if (count - at > kRowsAhead) __builtin_prefetch(values.of(order[at + kRowsAhead]));
-    if (key.equals(values.of(order[at]))) break;
-  }
-  return at;
+  return find_first(first, count, key, [&](std::int32_t at) {
+    __builtin_prefetch(values.of(order[std::min(at, count - 1 - kRowsAhead) + kRowsAhead]));
+    return values.of(order[at]);
+  });
 }
 
 std::int32_t walk_along_keys(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
@@ -93,7 +93,7 @@ TEVPF_STATUS find_position(const TEVPF_TABLE& table, TEVPF_COLUMN& column, std::
 TEVPF_STATUS TEV8R1_PF_define_table_search(const char* table_name,
                                            const char* column_name) noexcept {
   TEVPF_TABLE* table;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_table(table_name, table));
   TEVPF_COLUMN* column = nullptr;
   if (column_name != nullptr) {
     PF_TRY(TEV8R1_get_col_ptr(table, column_name, &column));
@@ -109,7 +109,7 @@ TEVPF_STATUS TEV8R1_PF_get_row_by_value(const char* table_name, int8_t mode,
   TEVPF_TABLE* table;
   TEVPF_COLUMN* column;
   int32_t position = 0;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_table(table_name, table));
   if (table->num_rows == 0) return fail_empty(PF_NOTFOUND);
   PF_TRY(TEV8R1_get_col_ptr(table, column_name, &column));
   PF_TRY(find_position(*table, *column, mode, key, table->next_row, position));
@@ -123,7 +123,7 @@ TEVPF_STATUS TEV8R1_PF_get_value(const char* table_name, const char* column_name
   TEVPF_TABLE* table;
   TEVPF_COLUMN* column;
   int32_t position = 0;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_table(table_name, table));
   if (table->num_cols == 0) return PF_NORMAL;
   if (table->num_rows == 0) return fail_empty(PF_NOTFOUND);
   PF_TRY(find_position(*table, table->col_array[0], kExact, key, 0, position));
@@ -137,7 +137,7 @@ TEVPF_STATUS TEV8R1_PF_get_col_values(const char* table_name, const char* column
                                       void* values_out) noexcept {
   TEVPF_TABLE* table;
   TEVPF_COLUMN* column;
-  PF_TRY(TEV8R1_get_table_ptr(table_name, &table));
+  PF_TRY(find_table(table_name, table));
   if (table->num_rows == 0) return PF_NOMORE;
   PF_TRY(TEV8R1_get_col_ptr(table, column_name, &column));
   copy_values(*table, *column, static_cast<unsigned char*>(values_out));

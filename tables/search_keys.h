@@ -5,7 +5,7 @@
 
 #include <cstdint>
 
-#include "core/heap.h"
+#include "core/base/heap.h"
 #include "tables/table.h"
 
 namespace tevpf {
@@ -20,8 +20,8 @@ inline constexpr std::int32_t kFenceStep = 16;
 constexpr std::int32_t fence_count(std::int32_t values) noexcept { return values / kFenceStep; }
 
 // The values, if they are there or it is time for them: as soon as searches since the last change have
-// cost about what gathering costs. Null else, when memory is short, and for integers whose index is not
-// in order. `index`: the column's, null when it has none.
+// cost about what gathering costs. Null else, and when memory is short. `index`: the column's, null when
+// it has none.
 [[nodiscard]] const unsigned char* search_keys(const TEVPF_TABLE& table, TEVPF_COLUMN& column,
                                                const std::int32_t* index) noexcept;
 

@@ -6,7 +6,8 @@
 // Invariants: the columns' offsets, row_wid, mod and extra_bytes are what laying them out one
 // behind the other into an empty row gives; each index lists every row number once, in ascending
 // order of value, with room for num_rows + free_rows; header.btf = 24 + the stored sizes of all
-// columns; padding bytes of rows are zero.
+// columns. Rows keep the padding bytes that callers and files hand in; those that the library adds are
+// zero.
 #pragma once
 
 #include <cstddef>
@@ -15,6 +16,8 @@
 #include "core/element.h"
 
 namespace tevpf {
+
+inline constexpr std::int32_t kTableHead = 24;  // stored body of a table without columns
 
 // The state of tables/search_keys.
 struct SearchKeys {

@@ -2,7 +2,7 @@
 #include <cstring>
 #include <utility>
 
-#include "core/heap.h"
+#include "core/base/heap.h"
 #include "tables/column_index.h"
 #include "tables/column_record.h"
 #include "tables/default_row.h"

@@ -4,8 +4,8 @@
 #include <limits>
 #include <utility>
 
-#include "core/heap.h"
-#include "core/status.h"
+#include "core/base/heap.h"
+#include "core/base/status.h"
 #include "tables/column_record.h"
 #include "values/value_type.h"
 

@@ -1,7 +1,7 @@
 #include "tables/validate.h"
 
+#include "core/base/status.h"
 #include "core/library.h"
-#include "core/status.h"
 #include "tables/column_index.h"
 #include "values/compare.h"
 #include "values/value_text.h"

@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <string_view>
 
-#include "core/error_context.h"
+#include "core/base/error_context.h"
 #include "text.h"
 
 namespace tool {

@@ -1,6 +1,6 @@
 #include "values/compare.h"
 
-#include "core/status.h"
+#include "core/base/status.h"
 
 using namespace tevpf;
 

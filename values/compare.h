@@ -9,7 +9,7 @@
 #include <cstddef>
 #include <cstdint>
 
-#include "core/text_word.h"
+#include "core/base/text_word.h"
 #include "values/text_compare.h"
 #include "values/value_type.h"
 
@@ -31,6 +31,8 @@ int compare_numbers(T a, T b, [[maybe_unused]] double tolerance) noexcept {
 template <class T>
 class NumberKey {
  public:
+  static constexpr bool kIsNumber = true;
+
   NumberKey(const void* key, double tolerance) noexcept
       : key_(load<T>(key)), tolerance_(tolerance) {}
 
@@ -51,58 +53,47 @@ class NumberKey {
     }
   }
 
-  // False when none of kBlock values side by side equals the key.
-#ifdef TEVPF_TEST_HOOKS
-  static constexpr int kBlock = 4;  // small tables too have blocks
-#else
-  static constexpr int kBlock = 64;
-#endif
-  bool may_equal_one_of(const unsigned char* block) const noexcept {
+  // False when none of kCount values, a multiple of 4, equals the key; place(i) is where value i is
+  // stored. Whether a real lies below or above the key is a coin toss that no processor predicts, so
+  // there is no branch on a single value.
+  template <std::int32_t kCount, class Place>
+  bool may_equal_one_of(const Place& place) const noexcept {
     if constexpr (kIsFloating<T>) {
-      return !(tolerance_ >= 0) || is_near_one_of(block);
+      return !(tolerance_ >= 0) || is_near_one_of<kCount>(place);
     } else {
       using Flag = std::make_unsigned_t<T>;  // as wide as a value: compilers make vectors of them
       Flag found = 0;
-      for (int i = 0; i < kBlock; ++i, block += sizeof(T)) {
-        found = static_cast<Flag>(found | Flag{equals(block)});
+      for (std::int32_t i = 0; i < kCount; ++i) {
+        found = static_cast<Flag>(found | Flag{equals(place(i))});
       }
       return found != 0;
     }
   }
 
  private:
-  // Counted in two doubles by turns: no branch, no move out of their registers, no long chain of sums.
-  bool is_near_one_of(const unsigned char* block) const noexcept {
-    const double y = key_, tolerance = tolerance_;
-    double near[2] = {0, 0};
-    for (std::size_t i = 0; i < kBlock; i += 2) {
-      for (std::size_t k = 0; k < 2; ++k) {
-        const double x = load<T>(block + (i + k) * sizeof(T));
-        const double not_above = x - tolerance > y ? 0 : 1;
-        near[k] += x + tolerance < y ? 0 : not_above;
-      }
+  // Counts in doubles, which every processor compares and selects two at a time, and in two sums by
+  // turns, so that an addition need not wait for the one before.
+  template <std::int32_t kCount, class Place>
+  bool is_near_one_of(const Place& place) const noexcept {
+    using Pair [[gnu::vector_size(2 * sizeof(double))]] = double;
+    constexpr Pair kNone = {0, 0}, kOne = {1, 1};
+    const auto near = [&](std::int32_t i) {
+      const Pair x = {load<T>(place(i)), load<T>(place(i + 1))};
+      const auto differs = (x - tolerance_ > double{key_}) | (x + tolerance_ < double{key_});
+      return differs ? kNone : kOne;
+    };
+    Pair even = kNone, odd = kNone;
+    for (std::int32_t i = 0; i < kCount; i += 4) {
+      even += near(i);
+      odd += near(i + 2);
     }
-    return near[0] + near[1] != 0;
+    const Pair sum = even + odd;
+    return sum[0] + sum[1] != 0;
   }
 
   T key_;
   double tolerance_;  // of no use to integers
 };
-
-// The position of the first of `count` values side by side, from `first` on, that equals the key;
-// `count` when there is none. Many at a time.
-template <class T>
-std::int32_t find_in_line(const void* values, std::int32_t count, std::int32_t first,
-                          const NumberKey<T>& key) noexcept {
-  constexpr std::int32_t kBlock = NumberKey<T>::kBlock;
-  const auto place = [&](std::int32_t at) {
-    return static_cast<const unsigned char*>(values) + at * std::ptrdiff_t{sizeof(T)};
-  };
-  std::int32_t at = first;
-  while (count - at >= kBlock && !key.may_equal_one_of(place(at))) at += kBlock;
-  while (at < count && !key.equals(place(at))) ++at;
-  return at;
-}
 
 inline constexpr std::size_t kHeadSize = 8;
 
@@ -130,6 +121,8 @@ constexpr bool holds_whole_text(std::uint64_t head) noexcept { return (head & 0x
 template <bool kWide>
 class TextKey {
  public:
+  static constexpr bool kIsNumber = false;
+
   explicit TextKey(const void* key) noexcept
       : pattern_(make_pattern(static_cast<const char*>(key))) {
     // Of a prefix only its own bytes are compared, of a text the terminator too.
@@ -168,6 +161,45 @@ class TextKey {
   std::uint64_t head_;
   std::uint64_t head_mask_ = ~std::uint64_t{0};
 };
+
+// Steps from `first` over blocks of kCount values while none of a block can equal the key.
+template <std::int32_t kCount, class T, class Place>
+std::int32_t skip_blocks(std::int32_t first, std::int32_t count, const NumberKey<T>& key,
+                         const Place& place) noexcept {
+  std::int32_t at = first;
+  const auto in_block = [&](std::int32_t i) { return place(at + i); };
+  while (count - at >= kCount && !key.template may_equal_one_of<kCount>(in_block)) at += kCount;
+  return at;
+}
+
+// The first position from `first` on whose value equals the key, `count` when there is none; place(at)
+// is where the value at a position is stored. Numbers are compared a long block at a time, then a short
+// one.
+template <class Key, class Place>
+std::int32_t find_first(std::int32_t first, std::int32_t count, const Key& key,
+                        const Place& place) noexcept {
+#ifdef TEVPF_TEST_HOOKS
+  constexpr std::int32_t kLong = 8;  // small tables too have blocks
+#else
+  constexpr std::int32_t kLong = 64;
+#endif
+  std::int32_t at = first;
+  if constexpr (Key::kIsNumber) {
+    at = skip_blocks<kLong>(at, count, key, place);
+    at = skip_blocks<4>(at, count, key, place);
+  }
+  while (at < count && !key.equals(place(at))) ++at;
+  return at;
+}
+
+// The same for values side by side.
+template <class T>
+std::int32_t find_in_line(const void* values, std::int32_t count, std::int32_t first,
+                          const NumberKey<T>& key) noexcept {
+  return find_first(first, count, key, [&](std::int32_t at) {
+    return static_cast<const unsigned char*>(values) + at * std::ptrdiff_t{sizeof(T)};
+  });
+}
 
 // Calls f with the prepared key of a valid type. `readable` is how many bytes can be read from the
 // start of every stored value, or 0 when that is not known.

@@ -10,8 +10,8 @@
 #include <limits>
 #include <system_error>
 
-#include "core/number_text.h"
-#include "core/status.h"
+#include "core/base/number_text.h"
+#include "core/base/status.h"
 #include "include/tevpf.h"
 #include "values/value_type.h"
 

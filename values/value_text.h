@@ -1,7 +1,7 @@
 // A value as the error context shows it: numbers as "%d" or "%g", texts as they are.
 #pragma once
 
-#include "core/status.h"
+#include "core/base/status.h"
 #include "values/value_type.h"
 
 namespace tevpf {

@@ -114,9 +114,11 @@ class Model {
       EXPECT_EQ(found, elements_[k]);
     }
     EXPECT_EQ(broken_rules(), "");
-    EXPECT_EQ(file().free_lists, free_slots_[0]);
-    EXPECT_EQ(file().free_tables, free_slots_[1]);
-    EXPECT_LE(file().num_lists + file().free_lists, file().list_room);
+    for (int k = 0; k < 2; ++k) {
+      const tevpf::Directory& directory = file().directories[k];
+      EXPECT_EQ(directory.free_slots, free_slots_[k]);
+      EXPECT_LE(directory.count + directory.free_slots, directory.room);
+    }
   }
 
   void reopened() {
@@ -151,7 +153,7 @@ TEST_F(DirectoryTest, AgreesWithAPlainModel) {
     model.reopened();
     model.compare();
   }
-  EXPECT_GT(file().num_lists, 16);  // names were hashed
+  EXPECT_GT(file().directories[0].count, 16);  // names were hashed
 }
 
 TEST_F(DirectoryTest, NamesAreCutAndComparedAsTheyAreKept) {
@@ -173,10 +175,10 @@ TEST_F(DirectoryTest, NamesAreCutAndComparedAsTheyAreKept) {
     EXPECT_EQ(kind.create(""), PF_NORMAL);
     EXPECT_EQ(kind.find(""), 1);
   }
-  EXPECT_EQ(file().list_ptr[0]->header.elem_desc, std::string(79, 'd'));
+  EXPECT_EQ(file().directories[0].entries[0]->elem_desc, std::string(79, 'd'));
   // What stands behind a terminator is zero.
   EXPECT_EQ(TEV8R1_modify_elem_name(PF_ELEM_LIST, kept.c_str(), "x"), PF_NORMAL);
-  const char* name = file().list_ptr[0]->header.elem_name;
+  const char* name = file().directories[0].entries[0]->elem_name;
   EXPECT_EQ(std::string(name, TEVPF_NAME_SIZE), "x" + std::string(19, '\0'));
 }
 

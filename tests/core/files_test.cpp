@@ -6,11 +6,23 @@
 #include <sys/wait.h>
 #include <unistd.h>
 
+#include <cerrno>
 #include <cstdlib>
 #include <filesystem>
 #include <functional>
 
 #include "support/temp_file.h"
+
+namespace {
+int syncs_before_failure = -1;
+}
+
+// In the place of the system's, for the whole program: reports a disk that fails.
+extern "C" int fsync(int) {
+  if (syncs_before_failure-- != 0) return 0;
+  errno = EIO;
+  return -1;
+}
 
 namespace {
 
@@ -101,7 +113,41 @@ TEST_F(FilesTest, AnOpenFileIsNotOpenedAgain) {
   expect_answer(open(at("text")), PF_BADFILE, {at("text"), ""});
   EXPECT_EQ(current(), "b");
   EXPECT_EQ(read_file(at("text")), "Dear reader");
-  expect_answer(open(dir_.path()), PF_OPENFAIL, {dir_.path(), ""});
+}
+
+// Neither waited for nor made nor emptied: a folder, a pipe without a writer, a device, and a link that
+// leads nowhere.
+TEST_F(FilesTest, OnlyRegularFilesAreOpened) {
+  ASSERT_EQ(mkfifo(at("pipe").c_str(), 0666), 0);
+  fs::create_symlink("nowhere", at("link"));
+  for (const std::string& path : {dir_.path(), at("pipe"), at("link"), std::string("/dev/null")}) {
+    expect_answer(open(path), PF_OPENFAIL, {path, ""});
+  }
+  EXPECT_EQ(dir_.entries(), (std::set<std::string>{"link", "pipe"}));
+}
+
+// Somebody else's file under the name of a new one that was never saved.
+TEST_F(FilesTest, ANewFileThatWasReplacedIsNotRemoved) {
+  ASSERT_EQ(open(at("a")), PF_NEWFILE);
+  fs::remove(at("a"));
+  write_file(at("a"), "Dear reader");
+  EXPECT_EQ(TEV8R1_PF_close(0), PF_NORMAL);
+  EXPECT_EQ(read_file(at("a")), "Dear reader");
+}
+
+// Once the file cannot be flushed and stays the old one, once its folder, when it is the new one.
+TEST_F(FilesTest, AFailedFlushIsAFailedSave) {
+  make(at("a"));
+  ASSERT_EQ(open(at("a")), PF_NORMAL);
+  ASSERT_EQ(add_list("L2"), PF_NORMAL);
+  for (const int syncs : {0, 1}) {
+    syncs_before_failure = syncs;
+    expect_answer(TEV8R1_PF_save(nullptr), PF_OPENFAIL, {at("a"), ""});
+    EXPECT_EQ(read_file(at("a")).size(), syncs == 0 ? 120u : 240u);
+  }
+  ASSERT_EQ(add_list("L3"), PF_NORMAL);
+  expect_saved(at("a"), 3);
+  EXPECT_EQ(dir_.entries(), std::set<std::string>{"a"});
 }
 
 TEST_F(FilesTest, NamesAreLookedUpAndHaveUpTo257Characters) {
@@ -256,21 +302,25 @@ TEST_F(FilesTest, AFullDiskKeepsTheOldFile) {
     make(at("disk/a"));
     const std::string old = read_file(at("disk/a"));
     ASSERT_EQ(open(at("disk/a")), PF_NORMAL);
+    ASSERT_EQ(save(at("disk/copy")), PF_NORMAL);
     for (int i = 0; i < 1000; ++i) {
       ASSERT_EQ(TEV8R1_PF_create_elem(std::to_string(i).c_str(), "", PF_ELEM_TABLE), PF_NORMAL);
     }
     for (int i = 0; i < 2; ++i) {
       expect_answer(TEV8R1_PF_save(nullptr), PF_OPENFAIL, {at("disk/a"), ""});
       EXPECT_EQ(read_file(at("disk/a")), old);
-      EXPECT_EQ(std::distance(fs::directory_iterator(at("disk")), {}), 1);
+      for (const std::string& path : {at("disk/copy"), at("disk/new")}) {
+        expect_answer(save(path), PF_OPENFAIL, {path, ""});
+      }
+      EXPECT_EQ(read_file(at("disk/copy")), old);
+      EXPECT_EQ(std::distance(fs::directory_iterator(at("disk")), {}), 2);
     }
-    EXPECT_EQ(save(at("disk/copy")), PF_OPENFAIL);
     EXPECT_EQ(save(at("copy")), PF_NORMAL);
     EXPECT_EQ(read_file(at("copy")).size(), 120u + 1000 * 132);
     EXPECT_EQ(TEV8R1_PF_close(1), PF_OPENFAIL);
     EXPECT_EQ(read_file(at("disk/a")), old);
   };
-  for (const char* size : {"size=64k", "size=1m,nr_inodes=2"}) {
+  for (const char* size : {"size=64k", "size=1m,nr_inodes=3"}) {
     SCOPED_TRACE(size);
     const int status = in_child([&] { body(size); }, false);
     if (WIFEXITED(status) && WEXITSTATUS(status) == kNotAllowed) GTEST_SKIP() << "no mounting";

@@ -4,8 +4,10 @@
 #include <optional>
 #include <random>
 
-#include "core/heap.h"
+#include "core/base/heap.h"
 #include "core/reader.h"
+#include "lists/list_builder.h"
+#include "support/definitions.h"
 #include "support/drive.h"
 #include "support/param_def.h"
 #include "support/temp_file.h"
@@ -155,7 +157,9 @@ constexpr Patch kPatches[] = {
     {"description elsewhere", 0x7f, "2f", PF_BADFILE},
     {"description of a string not there", 0xbd, "05", PF_BADFILE},
     {"unknown parameter type", 0xbe, "10", PF_BADTYPE, "parameter", "16"},
-    {"name without terminator", 0xc2 + 19, "41", PF_NORMAL, "00"},
+    {"bytes behind a name's terminator", 0xc2 + 18, "41 42", PF_NORMAL},
+    {"name without terminator", 0xc2, "41 41 41 41 41 41 41 41 41 41 41 41 41 41 41 41 41 41 41 41",
+     PF_NORMAL, "41 41 41 41 41 41 41 41 41 41 41 41 41 41 41 41 41 41 41 00"},
     {"two parameters of one name", 0xc2, "53 50 45 45 44", PF_NORMAL},
     {"string length negative", 0xe2, "ff ff ff ff", PF_BADFILE},
     {"string length beyond all", 0xe2, "ff ff ff 7f", PF_BADFILE},
@@ -181,6 +185,7 @@ constexpr Patch kPatches[] = {
     {"column index twice the same", 0x1e1, "00 00 00 00 00 00 00 00", PF_NORMAL,
      "02 00 00 00 00 00 00 00"},
     {"column index in another order", 0x1e1, "00 00 00 00 02 00 00 00", PF_NORMAL},
+    {"byte behind the text in a row", 0x1fc, "21", PF_NORMAL},
     {"text in a row without terminator", 0x1f4, "21", PF_NORMAL, "00"},
     {"bytes behind the last element", 517, "78", PF_BADFORMAT, ""},
 };
@@ -209,6 +214,48 @@ TEST_F(FormatTest, LiesAreRefusedOrMended) {
   mended[0xe2] = 1;
   mended[104] = 127 - 3;
   expect_opened(bytes, PF_NORMAL, kUntouched, mended);
+}
+
+// The default row may be larger than any memory: every other failure of the table comes first.
+TEST_F(FormatTest, ADefaultRowThatCannotBeHadIsTheLastFailure) {
+  ASSERT_EQ(TEV8R1_PF_open(path_.c_str()), PF_NEWFILE);
+  ASSERT_EQ(TEV8R1_PF_create_elem("t", "", PF_ELEM_TABLE), PF_NORMAL);
+  for (const TEVPF_COL_DEF& def :
+       {tevpf::col("huge", tevpf::kText, 1 << 26), tevpf::col("n", tevpf::kInt)})
+    ASSERT_EQ(TEV8R1_PF_def_column("t", def), PF_NORMAL);
+  const std::string bytes = saved_bytes();
+  std::string unknown = bytes, cut = bytes;
+  unknown[bytes.size() - 48] = 99;  // type of the last column
+  cut[112] = 1;                     // num_rows
+  tevpf::heap_fail_above(1 << 20);
+  expect_answer(open_bytes(unknown), PF_BADTYPE, {"column", "99"});
+  expect_answer(open_bytes(cut), PF_BADFORMAT, {"table data", ""});
+  expect_answer(open_bytes(bytes), PF_NOMEM, kEmpty);
+  tevpf::heap_fail_above(UINT64_MAX);
+}
+
+// A disk that fails to read on, at whatever byte, is no shorter file: it is not opened.
+TEST_F(FormatTest, AReadErrorIsNoEndOfTheFile) {
+  struct Disk {
+    const std::string& bytes;
+    std::size_t broken_from, place;
+  };
+  cookie_io_functions_t functions{};
+  functions.read = [](void* cookie, char* to, std::size_t count) -> ssize_t {
+    Disk& disk = *static_cast<Disk*>(cookie);
+    count = std::min({count, std::size_t{7}, disk.broken_from - disk.place});
+    std::copy_n(disk.bytes.data() + disk.place, count, to);
+    disk.place += count;
+    if (count != 0) return static_cast<ssize_t>(count);
+    errno = EIO;
+    return -1;
+  };
+  for (std::size_t from = 0; from <= example_.size(); ++from) {
+    Disk disk{example_, from, 0};
+    ASSERT_EQ(TEV8R1_add_file(fopencookie(&disk, "rb", functions), "name", 0), PF_NORMAL);
+    expect_answer(tevpf::load_file(*tevpf::library.current_file), PF_OPENFAIL, {"name", ""});
+    ASSERT_EQ(current(), nullptr) << from;
+  }
 }
 
 // What was loaded before memory ran out stays, and can be worked with.

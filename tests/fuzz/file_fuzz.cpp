@@ -5,7 +5,7 @@
 #include <filesystem>
 #include <fstream>
 
-#include "core/heap.h"
+#include "core/base/heap.h"
 #include "include/tevpf.h"
 #include "support/drive.h"
 

@@ -3,7 +3,7 @@
 
 #include <climits>
 
-#include "core/heap.h"
+#include "core/base/heap.h"
 #include "lists/param_record.h"
 #include "support/param_def.h"
 #include "support/temp_file.h"

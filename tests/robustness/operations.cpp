@@ -1,16 +1,17 @@
 #include "robustness/operations.h"
 
-#include "core/directory.h"
 #include "core/file.h"
 #include "core/library.h"
 #include "core/reader.h"
 #include "core/writer.h"
+#include "lists/directory.h"
+#include "lists/list_builder.h"
+#include "lists/list_writer.h"
 #include "lists/name_index.h"
 #include "lists/param_check.h"
 #include "lists/param_record.h"
 #include "reports/definition_text.h"
 #include "reports/display.h"
-#include "reports/formats.h"
 #include "reports/list_dump.h"
 #include "reports/row_text.h"
 #include "reports/table_dump.h"
@@ -21,8 +22,12 @@
 #include "tables/columns.h"
 #include "tables/cursor.h"
 #include "tables/default_row.h"
+#include "tables/directory.h"
+#include "tables/formats.h"
 #include "tables/layout.h"
 #include "tables/rows.h"
+#include "tables/table_builder.h"
+#include "tables/table_writer.h"
 #include "tables/templates.h"
 #include "tables/validate.h"
 
@@ -134,7 +139,7 @@ std::FILE* nowhere() {
 // The stored form of an element of the current file: a body as long as asked, and what follows it.
 struct Stored {
   template <class Store, class Element>
-  Stored(Store store, const Element* element, std::int32_t body_bytes) {
+  Stored(Store store, Element* element, std::int32_t body_bytes) {
     store(stream, element);
     std::rewind(stream);
     EXPECT_EQ(std::fread(&header, sizeof header, 1, stream), 1u);

@@ -4,7 +4,7 @@
 
 #include <fstream>
 
-#include "core/heap.h"
+#include "core/base/heap.h"
 #include "core/library.h"
 #include "support/drive.h"
 

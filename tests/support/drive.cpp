@@ -26,14 +26,17 @@ namespace {
 
 constexpr std::int32_t kMostElements = 6, kMostEntries = 12;  // of those that a file holds
 
-auto lists() {
-  const TEVPF_FILE& file = *tevpf::library.current_file;
-  return std::span(file.list_ptr, std::min(file.num_lists, kMostElements));
+template <class Record>
+std::vector<Record*> elements(std::int32_t type) {
+  const tevpf::Directory& directory = tevpf::directory_of(*tevpf::library.current_file, type);
+  std::vector<Record*> all;
+  for (std::int32_t i = 0; i < std::min(directory.count, kMostElements); ++i) {
+    all.push_back(reinterpret_cast<Record*>(directory.entries[i]));
+  }
+  return all;
 }
-auto tables() {
-  const TEVPF_FILE& file = *tevpf::library.current_file;
-  return std::span(file.table_ptr, std::min(file.num_tables, kMostElements));
-}
+auto lists() { return elements<TEVPF_LIST>(PF_ELEM_LIST); }
+auto tables() { return elements<TEVPF_TABLE>(PF_ELEM_TABLE); }
 
 void read_list(const char* list) {
   std::int32_t type, value_size, desc_size, position;

@@ -7,7 +7,7 @@
 #include <source_location>
 #include <string>
 
-#include "core/error_context.h"
+#include "core/base/error_context.h"
 #include "include/tevpf.h"
 
 struct ErrorTexts {

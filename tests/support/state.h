@@ -11,9 +11,11 @@
 #include "core/file.h"
 #include "core/library.h"
 #include "core/writer.h"
+#include "lists/directory.h"
 #include "support/list_check.h"
 #include "support/param_def.h"
 #include "support/table_check.h"
+#include "tables/directory.h"
 
 template <class... T>
 void put(std::string& all, const T&... values) {
@@ -54,14 +56,16 @@ inline std::string snapshot(bool with_spare_slots) {
     all += f->file_name;
     put(all, f->read_only);
     put_stored(all, *f);
-    for (const TEVPF_LIST* list : std::span(f->list_ptr, f->num_lists)) {
+    for (int n = 0; n < tevpf::directory_of(*f, PF_ELEM_LIST).count; ++n) {
+      const TEVPF_LIST* list = &tevpf::list_at(*f, n);
       put(all, list->cur_param);
       for (int i = 0; list->dft_ptr != nullptr && i < tevpf::kValueTypeCount; ++i) {
         all += text_of(list->dft_ptr[i]);
       }
       if (with_spare_slots) put(all, list->free_params);
     }
-    for (const TEVPF_TABLE* table : std::span(f->table_ptr, f->num_tables)) {
+    for (int n = 0; n < tevpf::directory_of(*f, PF_ELEM_TABLE).count; ++n) {
+      const TEVPF_TABLE* table = &tevpf::table_at(*f, n);
       put_table(all, *table);
       if (with_spare_slots) put(all, table->free_rows, table->free_cols);
     }
@@ -76,9 +80,10 @@ inline std::string broken_rules() {
     all += rule == nullptr ? "" : rule + std::string("; ");
   };
   for (const TEVPF_FILE* f = tevpf::library.first_file; f != nullptr; f = f->next_file) {
-    for (const TEVPF_LIST* list : std::span(f->list_ptr, f->num_lists)) note(broken_rule(*list));
-    for (const TEVPF_TABLE* table : std::span(f->table_ptr, f->num_tables))
-      note(tevpf_test::broken_rule(*table));
+    for (int n = 0; n < tevpf::directory_of(*f, PF_ELEM_LIST).count; ++n)
+      note(broken_rule(tevpf::list_at(*f, n)));
+    for (int n = 0; n < tevpf::directory_of(*f, PF_ELEM_TABLE).count; ++n)
+      note(tevpf_test::broken_rule(tevpf::table_at(*f, n)));
   }
   return all;
 }

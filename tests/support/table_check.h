@@ -24,17 +24,12 @@ inline const char* broken_layout(const TEVPF_TABLE& table) {
 }
 
 inline const char* broken_row(const TEVPF_TABLE& table, const unsigned char* row) {
-  std::int64_t end = 0;
-  const auto only_zeros_to = [&](std::int64_t next) {
-    return std::all_of(row + end, row + next, [](unsigned char byte) { return byte == 0; });
-  };
   for (const TEVPF_COLUMN& column : std::span(table.col_array, table.num_cols)) {
-    if (!only_zeros_to(column.offset)) return "padding is not zero";
-    end = column.offset + tevpf::column_size(column);
     if (column.def.type != PF_TYPE_STRING) continue;
-    if (std::count(row + column.offset, row + end, 0) == 0) return "text without terminator";
+    const unsigned char* const text = row + column.offset;
+    if (std::count(text, text + tevpf::column_size(column), 0) == 0) return "text without end";
   }
-  return only_zeros_to(table.row_wid) ? nullptr : "padding is not zero";
+  return nullptr;
 }
 
 // In the order of the index, or without one of the rows; integers with an index have fences behind.
@@ -85,8 +80,8 @@ inline const char* broken_rule(const TEVPF_TABLE& table) {
   for (int i = 0; i < table.num_rows; ++i) {
     if (const char* rule = broken_row(table, tevpf::row_at(table, i))) return rule;
   }
-  if (table.num_cols > 0 && table.dft_row == nullptr) return "no default row";
-  if (const char* rule = broken_row(table, table.dft_row)) return rule;
+  // There is none yet where loading has failed.
+  if (const char* rule = table.dft_row ? broken_row(table, table.dft_row) : nullptr) return rule;
   for (const TEVPF_COLUMN& column : std::span(table.col_array, table.num_cols)) {
     if (const char* rule = broken_index(table, column)) return rule;
     if (!are_search_keys_true(table, column)) return "search keys are not the values";

@@ -10,9 +10,10 @@
 #include <set>
 #include <string>
 
-#include "core/directory.h"
+#include "lists/directory.h"
 #include "support/error_texts.h"
 #include "support/state.h"
+#include "tables/directory.h"
 
 // A folder that goes away with the test.
 class TempDir {

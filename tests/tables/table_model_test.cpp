@@ -15,7 +15,10 @@ namespace {
 
 // A number's bytes as rows hold them, or a text without its terminator.
 using Value = std::string;
-using Row = std::vector<Value>;
+// The values of a row, and all its bytes where they are known: padding and what stands behind texts.
+struct Row : std::vector<Value> {
+  std::string bytes{};
+};
 using Index = std::vector<int>;
 
 Value value_of(int type, double x) {
@@ -92,6 +95,7 @@ struct Model {
 
   void reset_defaults() {
     for (size_t i = 0; i < columns.size(); ++i) defaults[i] = columns[i].least();
+    defaults.bytes.clear();
   }
 
   // The documented probes.
@@ -378,7 +382,8 @@ class TableModelTest : public TableTest, public testing::WithParamInterface<unsi
     EXPECT_EQ(t.next_row, model_.next);
     EXPECT_EQ(t.cur_col == nullptr ? "" : t.cur_col->def.name, model_.search);
     for (int i = 0; i < t.num_rows; ++i) {
-      ASSERT_EQ(decode(t, tevpf::row_at(t, i)), model_.rows[i]) << "row " << i;
+      SCOPED_TRACE(testing::Message() << "row " << i);
+      compare_bytes(tevpf::row_at(t, i), model_.rows[i]);
     }
     for (int i = 0; i < t.num_cols; ++i) {
       const Column& expected = model_.columns[i];
@@ -411,8 +416,24 @@ class TableModelTest : public TableTest, public testing::WithParamInterface<unsi
   }
   void compare_row() {
     const int row = model_.row_at(model_.cur);
-    EXPECT_EQ(decode(table(), out_.data()), model_.rows[row]);
+    compare_bytes(out_.data(), model_.rows[row]);
     EXPECT_EQ(TEV8R1_convert_row("t", model_.cur), row);
+  }
+
+  static void compare_bytes(const void* bytes, const Row& expected) {
+    const TEVPF_TABLE& t = table();
+    ASSERT_EQ(decode(t, bytes), expected);
+    if (expected.bytes.empty()) return;
+    ASSERT_EQ(std::string(static_cast<const char*>(bytes), t.row_wid), expected.bytes);
+  }
+  // The bytes that are kept of a row that is handed in: all of them, but for a missing terminator.
+  static std::string kept(std::string bytes) {
+    for (const TEVPF_COLUMN& c : std::span(table().col_array, table().num_cols)) {
+      char* const text = &bytes[c.offset];
+      const int last = c.def.type == kText ? c.def.width : -1;
+      if (last >= 0 && std::memchr(text, 0, last + 1) == nullptr) text[last] = 0;
+    }
+    return bytes;
   }
 
   // A row as a careless caller hands it in: rubbish in the padding and behind texts, and no
@@ -461,8 +482,10 @@ class TableModelTest : public TableTest, public testing::WithParamInterface<unsi
 
   void add_row() {
     const int place = chance(70) ? PF_END_POS : below(model_.count() + 4) - 2;
-    const Row row = random_row();
-    BOTH(model_.add(row, place), TEV8R1_PF_add_row_by_pos("t", image(row).data(), place));
+    Row row = random_row();
+    const std::string bytes = image(row);
+    row.bytes = kept(bytes);
+    BOTH(model_.add(row, place), TEV8R1_PF_add_row_by_pos("t", bytes.data(), place));
   }
   void add_with_defaults() {
     Row row = random_row();
@@ -470,14 +493,17 @@ class TableModelTest : public TableTest, public testing::WithParamInterface<unsi
     std::vector<std::int32_t> supplied;
     for (size_t i = 0; i < row.size(); ++i) {
       supplied.push_back(below(2));
-      if (supplied[i] == 0) row[i] = model_.defaults[i];
+      if (supplied[i] != 0) continue;
+      row[i] = model_.defaults[i];
+      const TEVPF_COLUMN& c = table().col_array[i];
+      std::memcpy(&bytes[c.offset], table().dft_row + c.offset, column_size(c));
     }
+    row.bytes = kept(bytes);
+    const std::string completed = bytes;
+    for (size_t i = 0; i < row.size(); ++i) bytes[table().col_array[i].offset] ^= supplied[i] == 0;
     BOTH(model_.add(row, PF_END_POS),
          TEV8R1_PF_add_row_with_dft("t", bytes.data(), supplied.data()));
-    const Row completed = decode(table(), bytes.c_str());
-    for (size_t i = 0; i < row.size(); ++i) {
-      EXPECT_TRUE(supplied[i] != 0 || completed[i] == row[i]);
-    }
+    EXPECT_EQ(bytes, completed);
   }
   void replace_row() {
     Row row = random_row();
@@ -487,7 +513,9 @@ class TableModelTest : public TableTest, public testing::WithParamInterface<unsi
       old[changed] = row[changed];
       row = old;
     }
-    BOTH(model_.replace(row), TEV8R1_PF_replace_row("t", image(row).data()));
+    const std::string bytes = image(row);
+    row.bytes = kept(bytes);
+    BOTH(model_.replace(row), TEV8R1_PF_replace_row("t", bytes.data()));
   }
   void delete_row() { BOTH(model_.delete_row(), TEV8R1_PF_delete_row("t")); }
   // What was reserved for rows stays, while columns without rows may become any others.
@@ -552,11 +580,13 @@ class TableModelTest : public TableTest, public testing::WithParamInterface<unsi
     if (BOTH(expected, TEV8R1_PF_define_table_search("t", def.name))) model_.search = def.name;
   }
   void set_defaults() {
-    const Row row = random_row();
+    Row row = random_row();
+    const std::string bytes = image(row);
+    row.bytes = kept(bytes);
     const Result expected = model_.interactive ? Result{} : model_.check_row(row, -2);
-    if (BOTH(expected, TEV8R1_PF_set_dft_row("t", image(row).data()))) model_.defaults = row;
+    if (BOTH(expected, TEV8R1_PF_set_dft_row("t", bytes.data()))) model_.defaults = row;
     TEV8R1_PF_inq_dft_row("t", out());
-    EXPECT_EQ(decode(table(), out_.data()), model_.defaults);
+    compare_bytes(out_.data(), model_.defaults);
   }
   void interactive() {
     model_.interactive = !model_.interactive && chance(30);
@@ -584,7 +614,22 @@ class TableModelTest : public TableTest, public testing::WithParamInterface<unsi
   void define_column() {
     if (model_.columns.size() > 6) return;
     const Column c = random_column(random_type(), random_bounds());
-    BOTH(model_.define(c), TEV8R1_PF_def_column("t", c.def));
+    if (!BOTH(model_.define(c), TEV8R1_PF_def_column("t", c.def))) return;
+    const int offset = table().col_array[table().num_cols - 1].offset;
+    const Value value = c.is_text() ? Value(c.def.width + 1, 0) : c.least();
+    for (Row& row : model_.rows) {  // old bytes stay where they are, new ones are zero
+      if (row.bytes.empty()) continue;
+      row.bytes.resize(table().row_wid);
+      row.bytes.replace(offset, value.size(), value);
+    }
+    if (model_.defaults.bytes.empty()) return;
+    model_.defaults.bytes.resize(table().row_wid);
+    model_.defaults.bytes.replace(offset, c.is_text() ? 1 : value.size(), value, 0,
+                                  c.is_text() ? 1 : value.size());
+  }
+  void forget_bytes() {
+    for (Row& row : model_.rows) row.bytes.clear();
+    model_.defaults.bytes.clear();
   }
   void redefine_column() {
     if (model_.columns.empty()) return;
@@ -605,6 +650,7 @@ class TableModelTest : public TableTest, public testing::WithParamInterface<unsi
     const int place = any_column();
     const std::string name = model_.columns[place].def.name;
     model_.remove_column(place);
+    forget_bytes();
     BOTH({}, TEV8R1_PF_delete_col("t", name.c_str()));
   }
   void move_column() {
@@ -612,6 +658,7 @@ class TableModelTest : public TableTest, public testing::WithParamInterface<unsi
     const std::string name = model_.columns[from].def.name;
     const std::string other = before < 0 ? "" : model_.columns[before].def.name;
     model_.move_column(from, before);
+    forget_bytes();
     BOTH({}, TEV8R1_PF_move_col("t", name.c_str(), before < 0 ? nullptr : other.c_str()));
   }
 

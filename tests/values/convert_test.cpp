@@ -12,7 +12,7 @@
 #include <utility>
 #include <vector>
 
-#include "core/number_text.h"
+#include "core/base/number_text.h"
 #include "support/error_texts.h"
 #include "values/value_type.h"
 

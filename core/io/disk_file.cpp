@@ -1,0 +1,94 @@
+#include "core/io/disk_file.h"
+
+#include <fcntl.h>
+#include <sys/stat.h>
+
+#include <cerrno>
+
+#ifdef _WIN32
+#include <io.h>
+#else
+#include <unistd.h>
+#endif
+
+namespace tevpf {
+namespace {
+
+#ifdef _WIN32
+constexpr int kNoWait = _O_BINARY;
+
+int open_descriptor(const char* name, int flags) noexcept {
+  return _open(name, flags | _O_BINARY, _S_IREAD | _S_IWRITE);
+}
+bool is_regular(int file) noexcept {
+  struct _stat64 facts;
+  return _fstat64(file, &facts) == 0 && (facts.st_mode & _S_IFMT) == _S_IFREG;
+}
+std::FILE* stream_of(int file, const char* mode) noexcept { return _fdopen(file, mode); }
+void close_descriptor(int file) noexcept { _close(file); }
+#else
+constexpr int kNoWait = O_NONBLOCK;  // opening a pipe would wait for its other end
+
+int open_descriptor(const char* name, int flags) noexcept {
+  constexpr mode_t kMode = 0666;
+  return open(name, flags | O_CLOEXEC, kMode);
+}
+bool is_regular(int file) noexcept {
+  struct stat facts;
+  return fstat(file, &facts) == 0 && S_ISREG(facts.st_mode);
+}
+std::FILE* stream_of(int file, const char* mode) noexcept { return fdopen(file, mode); }
+void close_descriptor(int file) noexcept { close(file); }
+#endif
+
+// A stream for a descriptor, which is closed when there is none to be had.
+std::FILE* adopt(int file, const char* mode) noexcept {
+  std::FILE* const stream = stream_of(file, mode);
+  if (stream == nullptr) close_descriptor(file);
+  return stream;
+}
+
+}  // namespace
+
+std::FILE* open_regular(const char* name, Access access) noexcept {
+  constexpr int kFlags[] = {O_RDONLY, O_RDWR, O_WRONLY};
+  constexpr const char* kModes[] = {"rb", "r+b", "wb"};
+  const auto which = static_cast<int>(access);
+  const int file = open_descriptor(name, kFlags[which] | kNoWait);
+  if (file < 0) return nullptr;
+  if (is_regular(file)) return adopt(file, kModes[which]);
+  close_descriptor(file);
+  errno = EINVAL;
+  return nullptr;
+}
+
+std::FILE* create_file(const char* name) noexcept {
+  const int file = open_descriptor(name, O_WRONLY | O_CREAT | O_EXCL);
+  return file < 0 ? nullptr : adopt(file, "wb");
+}
+
+#ifdef _WIN32
+
+bool empty_file(std::FILE* stream) noexcept { return _chsize_s(_fileno(stream), 0) == 0; }
+
+// An open file is nobody else's to remove or replace there.
+void remove_own_file(const char* name, std::FILE* stream) noexcept {
+  std::fclose(stream);
+  std::remove(name);
+}
+
+#else
+
+bool empty_file(std::FILE* stream) noexcept { return ftruncate(fileno(stream), 0) == 0; }
+
+void remove_own_file(const char* name, std::FILE* stream) noexcept {
+  struct stat own, named;
+  const bool is_own = fstat(fileno(stream), &own) == 0 && lstat(name, &named) == 0 &&
+                      own.st_dev == named.st_dev && own.st_ino == named.st_ino;
+  std::fclose(stream);
+  if (is_own) unlink(name);
+}
+
+#endif
+
+}  // namespace tevpf
