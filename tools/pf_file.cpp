@@ -11,7 +11,6 @@
 #include "failure.h"
 #include "messages.h"
 #include "platform.h"
-#include "temp_file.h"
 #include "text.h"
 
 namespace fs = std::filesystem;
@@ -31,10 +30,16 @@ std::string library_name(const std::string& path) {
   return path.starts_with('$') ? "./" + path : path;
 }
 
-struct CloseStream {
-  void operator()(std::FILE* stream) const { std::fclose(stream); }
-};
-using Stream = std::unique_ptr<std::FILE, CloseStream>;
+void check_length(const std::string& path) {
+  if (library_name(path).size() < TEVPF_FILE_NAME_SIZE) return;
+  throw Failure(kRefused, visible(path) + ": the path has more than " +
+                              std::to_string(TEVPF_FILE_NAME_SIZE - 1) +
+                              " characters; go to its folder and use the short name");
+}
+
+[[noreturn]] void no_such_file(const std::string& path) {
+  throw Failure(kUnreadable, visible(path) + ": there is no such file; 'tevpf new' makes one");
+}
 
 [[noreturn]] void cannot_read(const std::string& path, const std::error_code& error) {
   throw Failure(kUnreadable, visible(path) + ": it cannot be read: " + error.message());
@@ -42,32 +47,17 @@ using Stream = std::unique_ptr<std::FILE, CloseStream>;
 
 // Opening with the library creates a file that is not there, and empties one that it may write but
 // not read. Neither may happen by looking at it.
-Stream open_readable(const std::string& path) {
+void require_readable(const std::string& path) {
   std::error_code error;
   const fs::file_status status = fs::status(path, error);
-  if (status.type() == fs::file_type::not_found) {
-    throw Failure(kUnreadable, visible(path) + ": there is no such file; 'tevpf new' makes one");
-  }
+  if (status.type() == fs::file_type::not_found) no_such_file(path);
   if (error) cannot_read(path, error);
   if (status.type() != fs::file_type::regular) {
     throw Failure(kUnreadable, visible(path) + ": it is not a regular file; name a parameter file");
   }
-  Stream stream(std::fopen(path.c_str(), "rb"));
-  if (!stream) cannot_read(path, last_error());
-  return stream;
-}
-
-void read_to_the_end(const std::string& path) {
-  const Stream stream = open_readable(path);
-  std::vector<char> block(std::size_t{1} << 20U);
-  while (std::fread(block.data(), 1, block.size(), stream.get()) == block.size()) {
-  }
-  if (std::ferror(stream.get()) != 0) cannot_read(path, last_error());
-}
-
-bool means_damage(TEVPF_STATUS status) {
-  return status == PF_BADFORMAT || status == PF_BADTYPE || status == PF_DUPLICATE ||
-         status == PF_BADFILE;
+  std::FILE* readable = std::fopen(path.c_str(), "rb");
+  if (readable == nullptr) cannot_read(path, last_error());
+  std::fclose(readable);
 }
 
 // What tells whether a file on the disk has been touched.
@@ -82,31 +72,9 @@ struct Stamp {
   bool operator==(const Stamp&) const = default;
 };
 
-void check_length(const std::string& path) {
-  if (library_name(path).size() < TEVPF_FILE_NAME_SIZE) return;
-  throw Failure(kRefused, visible(path) + ": the path has more than " +
-                              std::to_string(TEVPF_FILE_NAME_SIZE - 1) +
-                              " characters; go to its folder and use the short name");
-}
-
 void append(std::vector<Element>& elements, Kind kind, std::int32_t count,
             const char (*names)[TEVPF_NAME_SIZE], const char (*descriptions)[TEVPF_DESC_SIZE]) {
   for (std::int32_t i = 0; i < count; ++i) elements.push_back({kind, names[i], descriptions[i]});
-}
-
-// Gives what stood in the way, or nothing.
-std::string save_in_place() {
-  const TEVPF_STATUS status = TEV8R1_PF_save(nullptr);
-  if (status == PF_OPENFAIL) return "its new content could not be written; make room";
-  return status == PF_NORMAL ? "" : reason(status);
-}
-
-std::string save_as_new(const std::string& path) {
-  TempFile file(path);
-  const TEVPF_STATUS status = TEV8R1_PF_save(file.path_for_library().c_str());
-  if (status != PF_NORMAL) return "it could not be written; make room";
-  const std::error_code error = file.become_target();
-  return error ? error.message() : "";
 }
 
 }  // namespace
@@ -115,39 +83,59 @@ const char* kind_word(Kind kind) {
   return kind == Kind::kList ? "list" : kind == Kind::kTable ? "table" : "list or table";
 }
 
-PfFile::PfFile(std::string path, Use use) : path_(std::move(path)), new_(use == Use::kCreate) {
+PfFile::PfFile(std::string path) : path_(std::move(path)) {
   check_length(path_);
   TEV8R1_PF_init();
-  // The library would make a new file at once and leave it there, empty, if it were killed.
-  const std::string name = new_ ? empty_device() : library_name(path_);
-  TEVPF_STATUS status = load(name);
-  if (means_damage(status)) {
-    // A failed read looks like the end of the file to it: damage is what stays when all can be read.
-    close();
-    read_to_the_end(path_);
-    status = load(name);
-  }
-  if (status == PF_BADFILE) throw Failure(kUnreadable, visible(path_) + ": " + reason(status));
-  if (means_damage(status)) {
-    damage_ = find_damage(status);
-  } else if (status != PF_NORMAL) {
-    close();
-    throw library_failure(status, path_, "open it");
-  }
-  if (use != Use::kChange) return;
-  try {
-    refuse_changes();
-  } catch (...) {
-    close();
-    throw;
-  }
 }
 
-TEVPF_STATUS PfFile::load(const std::string& name) {
-  const TEVPF_STATUS status = TEV8R1_PF_open(name.c_str());
+// The object exists from the start, so its destructor closes what this leaves open by throwing.
+PfFile::PfFile(std::string path, Use use) : PfFile(std::move(path)) {
+  if (use == Use::kCreate) {
+    create_beside();
+  } else {
+    load();
+  }
+  if (use == Use::kChange) refuse_changes();
+}
+
+TEVPF_STATUS PfFile::open(const std::string& path) {
+  const TEVPF_STATUS status = TEV8R1_PF_open(library_name(path).c_str());
   // A file that could not be loaded whole is open with a part of it; closing none does no harm.
   open_ = status != PF_BADFILE && status != PF_OPENFAIL;
   return status;
+}
+
+void PfFile::load() {
+  const TEVPF_STATUS status = open(path_);
+  switch (status) {
+    case PF_NORMAL:
+      return;
+    case PF_NEWFILE:  // it has just gone; closing removes the one that opening has created
+      no_such_file(path_);
+    case PF_OPENFAIL:
+      throw Failure(kUnreadable,
+                    visible(path_) + ": it cannot be opened or read to its end; check its disk");
+    case PF_BADFILE:
+      throw Failure(kUnreadable, visible(path_) + ": " + reason(status));
+    case PF_BADFORMAT:
+    case PF_BADTYPE:
+    case PF_DUPLICATE:
+      damage_ = find_damage(status);
+      return;
+    default:
+      throw library_failure(status, path_, "open it");
+  }
+}
+
+// The library creates a file when it opens it; an empty one must not be seen under its final name.
+void PfFile::create_beside() {
+  const HoldInterrupts hold;  // until the file is known as one to remove
+  const std::string path = unused_path_beside(path_);
+  if (open(path) != PF_NEWFILE) {
+    throw Failure(kCannotWrite,
+                  visible(path_) + ": it cannot be created; make room or choose another folder");
+  }
+  temp_.emplace(path);
 }
 
 std::string PfFile::find_damage(TEVPF_STATUS status) const {
@@ -181,12 +169,12 @@ void PfFile::close() {
 }
 
 PfFile PfFile::open_to_read(const std::string& path) {
-  open_readable(path);
+  require_readable(path);
   return {path, Use::kRead};
 }
 
 PfFile PfFile::open_to_change(const std::string& path) {
-  open_readable(path);
+  require_readable(path);
   return {path, Use::kChange};
 }
 
@@ -262,15 +250,20 @@ Element PfFile::find(const std::string& name, Kind kind) const {
 void PfFile::save() {
   const HoldInterrupts hold;
   const Stamp before(path_);
-  const std::string obstacle = new_ ? save_as_new(path_) : save_in_place();
-  if (!obstacle.empty()) {
+  const auto fail = [&](const std::string& obstacle) {
     // A file that cannot be replaced in one step was written over.
-    const bool touched = Stamp(path_) != before;
+    const bool touched = !temp_ && Stamp(path_) != before;
     throw Failure(kCannotWrite, visible(path_) + ": it cannot be saved: " + obstacle +
-                                    (touched ? "; only a part of it is on the disk"
+                                    (touched ? "; it may hold only a part of its new content"
                                              : "; it is as it was before"));
-  }
+  };
+  const TEVPF_STATUS status = TEV8R1_PF_save(nullptr);
+  if (status == PF_OPENFAIL) fail("its new content could not be written; make room");
+  if (status != PF_NORMAL) fail(reason(status));
   close();
+  if (!temp_) return;
+  if (!rename_to_new(temp_->path(), path_)) fail(last_error().message());
+  temp_->forget();
 }
 
 void check_new_name(const std::string& name, const std::string& what) {

@@ -3,9 +3,11 @@
 #pragma once
 
 #include <cstdint>
+#include <optional>
 #include <string>
 #include <vector>
 
+#include "temp_file.h"
 #include "tevpf.h"
 
 namespace tool {
@@ -25,7 +27,7 @@ class PfFile {
   static PfFile open_to_read(const std::string& path);
   // To change: a damaged file is refused, because saving it would drop what could not be read.
   static PfFile open_to_change(const std::string& path);
-  // A new one, which is there when it is saved; refuses an existing file.
+  // A new one, under its name only when it is saved; refuses an existing file.
   static PfFile create(const std::string& path);
   static PfFile open_or_create(const std::string& path);
 
@@ -47,14 +49,18 @@ class PfFile {
 
  private:
   enum class Use { kRead, kChange, kCreate };
+  explicit PfFile(std::string path);  // not open yet
   PfFile(std::string path, Use use);
-  TEVPF_STATUS load(const std::string& name);
+  TEVPF_STATUS open(const std::string& path);
+  void load();
+  void create_beside();
   std::string find_damage(TEVPF_STATUS status) const;
   void refuse_changes() const;  // throws when it may not be written, or is damaged
   void close();
 
   std::string path_, damage_;
-  bool open_ = false, new_ = false;
+  std::optional<TempName> temp_;  // of a new file until it is saved
+  bool open_ = false;
 };
 
 // Refuses a name that the library would cut or refuse; `what`: "the new name".

@@ -10,6 +10,7 @@
 #include <cstdlib>
 #include <cstring>
 #include <memory>
+#include <random>
 #include <string>
 
 #ifdef _WIN32
@@ -62,6 +63,16 @@ void remove_on_interrupt(const fs::path& file) {
   }
 }
 
+std::string unused_path_beside(const fs::path& target) {
+  static constexpr std::string_view kLetters = "abcdefghijklmnopqrstuvwxyz0123456789";
+  static constexpr int kLength = 8;
+  std::random_device random;
+  std::uniform_int_distribution<std::size_t> letter(0, kLetters.size() - 1);
+  std::string path = (target.parent_path() / ".tevpf-").string();
+  for (int i = 0; i < kLength; ++i) path += kLetters[letter(random)];
+  return path;
+}
+
 // ---- Windows ----
 
 #ifdef _WIN32
@@ -79,13 +90,11 @@ bool stdout_is(const fs::path&) { return false; }  // an open file has no cheap 
 HoldInterrupts::HoldInterrupts() = default;
 HoldInterrupts::~HoldInterrupts() = default;
 
-std::FILE* make_unique_file(std::string& name) {
-  if (_mktemp_s(name.data(), name.size() + 1) != 0) return nullptr;
-  const int file = _open(name.c_str(), _O_CREAT | _O_EXCL | _O_RDWR | _O_BINARY, 0600);
+std::FILE* create_private_file(const fs::path& name) {
+  constexpr int kFlags = _O_CREAT | _O_EXCL | _O_RDWR | _O_BINARY;
+  const int file = _wopen(name.c_str(), kFlags, _S_IREAD | _S_IWRITE);
   return file < 0 ? nullptr : _fdopen(file, "w+b");
 }
-
-std::string path_of(std::FILE*, const fs::path& name) { return name.string(); }
 
 bool copy_rights(std::FILE*, const fs::path&) { return true; }
 
@@ -97,14 +106,12 @@ bool rename_to_new(const fs::path& from, const fs::path& to) {
   return std::rename(from.string().c_str(), to.string().c_str()) == 0;
 }
 
-const char* empty_device() { return "NUL"; }
-
 // By way of a file in the user's own folder for temporary files.
 void collect(const std::function<void(const std::string& path)>& make,
              const std::function<void(std::string_view)>& take) {
   struct Removed {
-    std::string name = (fs::temp_directory_path() / "tevpf-XXXXXX").string();
-    std::FILE* stream = make_unique_file(name);
+    std::string name = unused_path_beside(fs::temp_directory_path() / "dump");
+    std::FILE* stream = create_private_file(name);
     ~Removed() {
       if (stream == nullptr) return;
       std::fclose(stream);
@@ -136,8 +143,6 @@ class Descriptor {
  private:
   int fd_;
 };
-
-std::string path_of(int fd) { return "/dev/fd/" + std::to_string(fd); }
 
 // Of nested holders, the outermost one lets interrupts in again.
 int holders = 0;
@@ -190,12 +195,10 @@ HoldInterrupts::~HoldInterrupts() {
   if (--holders == 0) pthread_sigmask(SIG_SETMASK, &mask_before, nullptr);
 }
 
-std::FILE* make_unique_file(std::string& name) {
-  const int file = mkostemp(name.data(), O_CLOEXEC);
+std::FILE* create_private_file(const fs::path& name) {
+  const int file = open(name.c_str(), O_RDWR | O_CREAT | O_EXCL | O_CLOEXEC, 0600);
   return file < 0 ? nullptr : fdopen(file, "w+b");
 }
-
-std::string path_of(std::FILE* stream, const fs::path&) { return path_of(fileno(stream)); }
 
 bool copy_rights(std::FILE* stream, const fs::path& like) {
   const int file = fileno(stream);
@@ -220,11 +223,10 @@ bool flush_to_disk(std::FILE* stream) {
 
 bool rename_to_new(const fs::path& from, const fs::path& to) {
   if (renameat2(AT_FDCWD, from.c_str(), AT_FDCWD, to.c_str(), RENAME_NOREPLACE) == 0) return true;
-  // Not every file system knows the flag.
-  return (errno == EINVAL || errno == ENOSYS) && std::rename(from.c_str(), to.c_str()) == 0;
+  if (errno != EINVAL && errno != ENOSYS) return false;
+  // Not every file system knows the flag. A link never replaces a file either.
+  return link(from.c_str(), to.c_str()) == 0 && unlink(from.c_str()) == 0;
 }
-
-const char* empty_device() { return "/dev/null"; }
 
 // By way of a pipe: writing into it cannot fail, and what `take` throws ends the writing.
 void collect(const std::function<void(const std::string& path)>& make,
@@ -233,7 +235,7 @@ void collect(const std::function<void(const std::string& path)>& make,
   if (pipe2(ends, O_CLOEXEC) != 0) throw std::system_error(last_error(), "pipe");
   std::future<void> made = std::async(std::launch::async, [&make, end = ends[1]] {
     const Descriptor closed_afterwards(end);
-    make(path_of(end));
+    make("/dev/fd/" + std::to_string(end));
   });
   const Descriptor closed_first(ends[0]);
   std::array<char, 65536> block;

@@ -36,13 +36,12 @@ class HoldInterrupts {
   HoldInterrupts& operator=(const HoldInterrupts&) = delete;
 };
 
-// Makes a file that was not there, readable by this user alone, opens it for reading and writing,
-// and completes its name, which ends in XXXXXX. Null: errno says why.
-std::FILE* make_unique_file(std::string& name);
+// A path for a temporary file in the folder of `target`: random, so that it is free in practice.
+std::string unused_path_beside(const std::filesystem::path& target);
 
-// A path by which the library opens that very file, even when its name stands for another one by
-// now.
-std::string path_of(std::FILE* stream, const std::filesystem::path& name);
+// Creates a file that was not there, readable by this user alone, and opens it for reading and
+// writing. Null: errno says why.
+std::FILE* create_private_file(const std::filesystem::path& name);
 
 // Gives an open file the owner and the mode of the file `like`, as far as this user may, or the
 // mode of a new file when there is none.
@@ -53,9 +52,6 @@ bool flush_to_disk(std::FILE* stream);
 
 // Renames a file to a name that must be free. False: errno says why.
 bool rename_to_new(const std::filesystem::path& from, const std::filesystem::path& to);
-
-// A file that reads as empty and can be opened for writing.
-const char* empty_device();
 
 // Calls `make` with a path to write to, and `take` with all that is written there, as it comes.
 void collect(const std::function<void(const std::string& path)>& make,

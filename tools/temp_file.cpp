@@ -10,44 +10,48 @@ namespace fs = std::filesystem;
 
 namespace tool {
 
+TempName::TempName(std::string path) : path_(std::move(path)) { remove_on_interrupt(path_); }
+
+TempName::~TempName() {
+  if (path_.empty()) return;
+  std::error_code ignored;
+  fs::remove(path_, ignored);
+  forget();
+}
+
+void TempName::forget() {
+  path_.clear();
+  remove_on_interrupt({});
+}
+
 TempFile::TempFile(fs::path target) : target_(std::move(target)) {
   const HoldInterrupts hold;  // until the file is known as one to remove
-  const fs::path folder = target_.parent_path();
-  std::string name = (folder / ".tevpf-XXXXXX").string();
-  stream_ = make_unique_file(name);
+  std::string path = unused_path_beside(target_);
+  stream_ = create_private_file(path);
   if (stream_ == nullptr) {
-    throw Failure(kCannotWrite,
-                  "cannot create a file in " + in_quotes(folder.empty() ? "." : folder.string()) +
-                      ": " + last_error().message() + "; make room or choose another folder");
+    const std::error_code error = last_error();
+    const fs::path folder = target_.parent_path();
+    throw Failure(kCannotWrite, "cannot create a file in " +
+                                    in_quotes(folder.empty() ? "." : folder.string()) + ": " +
+                                    error.message() + "; make room or choose another folder");
   }
-  name_ = std::move(name);
-  remove_on_interrupt(name_);
+  name_.emplace(std::move(path));
 }
 
 TempFile::~TempFile() {
   if (stream_ != nullptr) std::fclose(stream_);
-  if (name_.empty()) return;
-  std::error_code ignored;
-  fs::remove(name_, ignored);
-  remove_on_interrupt({});
 }
 
-std::string TempFile::path_for_library() const { return path_of(stream_, name_); }
-
-std::error_code TempFile::commit(bool replace) {
+std::error_code TempFile::replace_target() {
   std::error_code error;
   const auto require = [&](bool done) {
     if (!done && !error) error = last_error();
   };
-  require(copy_rights(stream_, replace ? target_ : fs::path()));
+  require(copy_rights(stream_, target_));
   require(flush_to_disk(stream_));
   require(std::fclose(std::exchange(stream_, nullptr)) == 0);
-  if (!error && replace) fs::rename(name_, target_, error);
-  if (!error && !replace) require(rename_to_new(name_, target_));
-  if (!error) {
-    name_.clear();
-    remove_on_interrupt({});
-  }
+  if (!error) fs::rename(name_->path(), target_, error);
+  if (!error) name_->forget();
   return error;
 }
 

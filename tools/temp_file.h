@@ -1,15 +1,32 @@
-// A file under construction: this user's alone until it takes its final name, which it does only
-// when it is whole; removed otherwise. It is opened once: whatever happens to its name, nothing
-// else is written.
+// Files under construction, which get their final names only when they are whole, and are removed
+// otherwise: by an interrupt, too.
 #pragma once
 
 #include <cstdio>
 #include <filesystem>
+#include <optional>
 #include <string>
 #include <system_error>
 
 namespace tool {
 
+// The name of a file that this program has made, and removes again.
+class TempName {
+ public:
+  explicit TempName(std::string path);
+  TempName(const TempName&) = delete;
+  TempName& operator=(const TempName&) = delete;
+  ~TempName();
+
+  const std::string& path() const { return path_; }
+  void forget();  // it stands for the file no longer
+
+ private:
+  std::string path_;  // empty: forgotten
+};
+
+// A file that takes the place of another one. This user's alone until then, and opened once:
+// whatever happens to its name, nothing else is written.
 class TempFile {
  public:
   // An empty new file beside `target`, which will be its final name.
@@ -19,19 +36,14 @@ class TempFile {
   ~TempFile();
 
   std::FILE* stream() const { return stream_; }
-  std::string path_for_library() const;
 
   // It is whole, and takes the place of the target, with the permissions and the owner of what
   // stood there. After an error, that is as it was.
-  [[nodiscard]] std::error_code replace_target() { return commit(true); }
-  // The same, but a file that has come to stand there stays, and this is an error.
-  [[nodiscard]] std::error_code become_target() { return commit(false); }
+  [[nodiscard]] std::error_code replace_target();
 
  private:
-  std::error_code commit(bool replace);
-
   std::filesystem::path target_;
-  std::string name_;  // empty: not, or no longer, a temporary file
+  std::optional<TempName> name_;
   std::FILE* stream_ = nullptr;
 };
 
