@@ -16,7 +16,7 @@ struct Arguments {
   std::string file, element, parameter, value, new_name, csv, output, sort;
   std::vector<std::string> columns;
   std::size_t from = 0, to = 0;  // 0: not given
-  bool json = false, names = false, list = false, table = false;
+  bool json = false, names = false, list = false, table = false, force = false;
 
   Kind kind() const { return list ? Kind::kList : table ? Kind::kTable : Kind::kAny; }
 };

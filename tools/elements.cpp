@@ -162,7 +162,6 @@ Table::Table(const PfFile& file, const std::string& name) : file_(file.path()), 
   }
   row_count_ = static_cast<std::size_t>(std::max(num_rows, 0));
   row_size_ = static_cast<std::size_t>(std::max(row_wid, 0));
-  row_.resize(row_size_ + 1);
 }
 
 std::size_t Table::column_position(const std::string& name) const {
@@ -177,6 +176,7 @@ std::size_t Table::column_position(const std::string& name) const {
 }
 
 void Table::read_row(std::size_t number) {
+  row_.resize(row_size_ + 1);
   require(TEV8R1_PF_get_row_by_pos(name_.c_str(), static_cast<std::int32_t>(number), row_.data()),
           file_, "read a row");
 }

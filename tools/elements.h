@@ -58,7 +58,7 @@ class Table {
   std::string file_, name_;
   std::vector<Column> columns_;
   std::size_t row_count_ = 0, row_size_ = 0;
-  std::vector<char> row_;
+  std::vector<char> row_;  // empty until a row is read: a table without rows can be of any width
 };
 
 // "from 0 to 3000 rpm"; empty when the bounds only say what the type can hold.

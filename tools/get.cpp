@@ -13,7 +13,7 @@ ExitStatus run_get(const Arguments& arguments) {
   const std::string value =
       exact_text(find_parameter(file, element.name, arguments.parameter).value);
   // A script gets the very bytes; a terminal must not act upon them.
-  print((stdout_is_terminal() ? visible(value) : value) + "\n");
+  print((is_terminal(stdout) ? visible(value) : value) + "\n");
   return finish_reading(file);
 }
 

@@ -1,11 +1,11 @@
 // tevpf import: the rows of a CSV file into a table, all of them or none.
-#include <cerrno>
+#include <array>
 #include <cstdio>
-#include <cstring>
 #include <memory>
 
 #include "commands.h"
 #include "output.h"
+#include "platform.h"
 #include "table_import.h"
 #include "text.h"
 
@@ -22,20 +22,15 @@ std::string read_whole(const std::string& path) {
   const std::unique_ptr<std::FILE, CloseFile> stream{path == "-" ? stdin
                                                                  : std::fopen(path.c_str(), "rb")};
   std::string text;
-  std::size_t size = 0;
+  std::array<char, 65536> block;
   while (stream) {
-    text.resize(size + 65536);
-    const std::size_t count = std::fread(text.data() + size, 1, 65536, stream.get());
-    size += count;
-    if (count == 0) break;
-    if (text.capacity() < size + 65536) text.reserve(size * 2);
+    const std::size_t count = std::fread(block.data(), 1, block.size(), stream.get());
+    if (std::ferror(stream.get()) != 0) break;
+    text.append(block.data(), count);
+    if (count < block.size()) return text;
   }
-  if (!stream || std::ferror(stream.get()) != 0) {
-    throw Failure(kUnreadable, visible(path) + ": it cannot be read: " + std::strerror(errno) +
-                                   "; name a CSV file, or - for standard input");
-  }
-  text.resize(size);
-  return text;
+  throw Failure(kUnreadable, visible(path) + ": it cannot be read: " + last_error().message() +
+                                 "; name a CSV file, or - for standard input");
 }
 
 }  // namespace
@@ -51,7 +46,13 @@ ExitStatus run_import(const Arguments& arguments) {
   }
   const std::size_t rows = import_csv(file, arguments.element, {text, name});
   file.save();
-  print(counted(rows, "row") + " added to table " + in_quotes(arguments.element) + "\n");
+  const std::string done = counted(rows, "row") + " added to table " + in_quotes(arguments.element);
+  try {
+    print(done + "\n");
+  } catch (const Failure& failure) {
+    throw Failure(failure.status(),
+                  visible(file.path()) + " is changed: " + done + "; but " + failure.what());
+  }
   return kDone;
 }
 

@@ -1,6 +1,4 @@
 // tevpf info: what FILE holds, one line an element.
-#include <filesystem>
-
 #include "commands.h"
 #include "elements.h"
 #include "json.h"
@@ -29,12 +27,6 @@ Sizes sizes_of(const PfFile& file, const Element& element) {
   return sizes;
 }
 
-std::uintmax_t file_bytes(const PfFile& file) {
-  std::error_code error;
-  const std::uintmax_t bytes = std::filesystem::file_size(file.path(), error);
-  return error ? 0 : bytes;
-}
-
 void write_json(Output& output, const PfFile& file, const std::vector<Element>& elements) {
   Json lists = Json::array(), tables = Json::array();
   for (const Element& element : elements) {
@@ -51,7 +43,7 @@ void write_json(Output& output, const PfFile& file, const std::vector<Element>& 
     }
   }
   const Json all = {
-      {"file", file.path()}, {"bytes", file_bytes(file)}, {"lists", lists}, {"tables", tables}};
+      {"file", file.path()}, {"bytes", file.size()}, {"lists", lists}, {"tables", tables}};
   output.write(json_text(all, 2) + "\n");
 }
 

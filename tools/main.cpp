@@ -66,7 +66,7 @@ int run(int argc, char** argv) {
 
 int main(int argc, char** argv) {
   try {
-    tool::prepare_standard_output();
+    tool::prepare_process();
     return run(argc, argv);
   } catch (const tool::ClosedPipe&) {
     return tool::kDone;

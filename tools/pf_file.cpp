@@ -1,17 +1,16 @@
 #include "pf_file.h"
 
 #include <algorithm>
-#include <cerrno>
 #include <cstdio>
 #include <cstdlib>
-#include <cstring>
+#include <filesystem>
 #include <memory>
 #include <system_error>
 #include <utility>
 
 #include "failure.h"
 #include "messages.h"
-#include "temp_file.h"
+#include "platform.h"
 #include "text.h"
 
 namespace fs = std::filesystem;
@@ -31,32 +30,47 @@ std::string library_name(const std::string& path) {
   return path.starts_with('$') ? "./" + path : path;
 }
 
-// Opening with the library creates a file that is not there, and empties one that it may write but
-// not read. Neither may happen by looking at it.
-void check_readable(const std::string& path) {
-  std::error_code error;
-  const fs::file_status status = fs::status(path, error);
-  if (status.type() == fs::file_type::not_found) {
-    throw Failure(kUnreadable, visible(path) + ": there is no such file; 'tevpf new' makes one");
-  }
-  if (!error && status.type() != fs::file_type::regular) {
-    throw Failure(kUnreadable, visible(path) + ": it is not a regular file; name a parameter file");
-  }
-  std::FILE* stream = error ? nullptr : std::fopen(path.c_str(), "rb");
-  if (stream == nullptr) {
-    throw Failure(kUnreadable, visible(path) + ": it cannot be read: " +
-                                   (error ? error.message() : std::strerror(errno)) +
-                                   "; check its permissions");
-  }
-  std::fclose(stream);
-}
-
 void check_length(const std::string& path) {
   if (library_name(path).size() < TEVPF_FILE_NAME_SIZE) return;
   throw Failure(kRefused, visible(path) + ": the path has more than " +
                               std::to_string(TEVPF_FILE_NAME_SIZE - 1) +
                               " characters; go to its folder and use the short name");
 }
+
+[[noreturn]] void no_such_file(const std::string& path) {
+  throw Failure(kUnreadable, visible(path) + ": there is no such file; 'tevpf new' makes one");
+}
+
+[[noreturn]] void cannot_read(const std::string& path, const std::error_code& error) {
+  throw Failure(kUnreadable, visible(path) + ": it cannot be read: " + error.message());
+}
+
+// Opening with the library creates a file that is not there, and empties one that it may write but
+// not read. Neither may happen by looking at it.
+void require_readable(const std::string& path) {
+  std::error_code error;
+  const fs::file_status status = fs::status(path, error);
+  if (status.type() == fs::file_type::not_found) no_such_file(path);
+  if (error) cannot_read(path, error);
+  if (status.type() != fs::file_type::regular) {
+    throw Failure(kUnreadable, visible(path) + ": it is not a regular file; name a parameter file");
+  }
+  std::FILE* readable = std::fopen(path.c_str(), "rb");
+  if (readable == nullptr) cannot_read(path, last_error());
+  std::fclose(readable);
+}
+
+// What tells whether a file on the disk has been touched.
+struct Stamp {
+  std::uintmax_t size;
+  fs::file_time_type written;
+  explicit Stamp(const std::string& path) {
+    std::error_code ignored;
+    size = fs::file_size(path, ignored);
+    written = fs::last_write_time(path, ignored);
+  }
+  bool operator==(const Stamp&) const = default;
+};
 
 void append(std::vector<Element>& elements, Kind kind, std::int32_t count,
             const char (*names)[TEVPF_NAME_SIZE], const char (*descriptions)[TEVPF_DESC_SIZE]) {
@@ -69,33 +83,59 @@ const char* kind_word(Kind kind) {
   return kind == Kind::kList ? "list" : kind == Kind::kTable ? "table" : "list or table";
 }
 
-PfFile::PfFile(std::string path, Use use) : path_(std::move(path)) {
+PfFile::PfFile(std::string path) : path_(std::move(path)) {
   check_length(path_);
   TEV8R1_PF_init();
-  const TEVPF_STATUS status = TEV8R1_PF_open(library_name(path_).c_str());
+}
+
+// The object exists from the start, so its destructor closes what this leaves open by throwing.
+PfFile::PfFile(std::string path, Use use) : PfFile(std::move(path)) {
+  if (use == Use::kCreate) {
+    create_beside();
+  } else {
+    load();
+  }
+  if (use == Use::kChange) refuse_changes();
+}
+
+TEVPF_STATUS PfFile::open(const std::string& path) {
+  const TEVPF_STATUS status = TEV8R1_PF_open(library_name(path).c_str());
+  // A file that could not be loaded whole is open with a part of it; closing none does no harm.
+  open_ = status != PF_BADFILE && status != PF_OPENFAIL;
+  return status;
+}
+
+void PfFile::load() {
+  const TEVPF_STATUS status = open(path_);
   switch (status) {
-    case PF_NEWFILE:
     case PF_NORMAL:
-      break;
+      return;
+    case PF_NEWFILE:  // it has just gone; closing removes the one that opening has created
+      no_such_file(path_);
+    case PF_OPENFAIL:
+      throw Failure(kUnreadable,
+                    visible(path_) + ": it cannot be opened or read to its end; check its disk");
+    case PF_BADFILE:
+      throw Failure(kUnreadable, visible(path_) + ": " + reason(status));
     case PF_BADFORMAT:
     case PF_BADTYPE:
     case PF_DUPLICATE:
       damage_ = find_damage(status);
-      break;
-    case PF_BADFILE:
-      throw Failure(kUnreadable, visible(path_) + ": " + reason(status));
+      return;
     default:
-      if (status == PF_NOMEM) TEV8R1_PF_close(0);  // it may be open with what was loaded
       throw library_failure(status, path_, "open it");
   }
-  open_ = true;
-  if (use == Use::kRead) return;
-  try {
-    refuse_changes();
-  } catch (...) {
-    close();
-    throw;
+}
+
+// The library creates a file when it opens it; an empty one must not be seen under its final name.
+void PfFile::create_beside() {
+  const HoldInterrupts hold;  // until the file is known as one to remove
+  const std::string path = unused_path_beside(path_);
+  if (open(path) != PF_NEWFILE) {
+    throw Failure(kCannotWrite,
+                  visible(path_) + ": it cannot be created; make room or choose another folder");
   }
+  temp_.emplace(path);
 }
 
 std::string PfFile::find_damage(TEVPF_STATUS status) const {
@@ -129,12 +169,12 @@ void PfFile::close() {
 }
 
 PfFile PfFile::open_to_read(const std::string& path) {
-  check_readable(path);
+  require_readable(path);
   return {path, Use::kRead};
 }
 
 PfFile PfFile::open_to_change(const std::string& path) {
-  check_readable(path);
+  require_readable(path);
   return {path, Use::kChange};
 }
 
@@ -146,13 +186,19 @@ PfFile PfFile::create(const std::string& path) {
                                 (error ? "cannot be looked at: " + error.message()
                                        : "exists already; choose another name or remove it first"));
   }
-  return {path, Use::kChange};
+  return {path, Use::kCreate};
 }
 
 PfFile PfFile::open_or_create(const std::string& path) {
   std::error_code ignored;
   const bool is_there = fs::symlink_status(path, ignored).type() != fs::file_type::not_found;
   return is_there ? open_to_change(path) : create(path);
+}
+
+std::uintmax_t PfFile::size() const {
+  std::error_code error;
+  const std::uintmax_t bytes = fs::file_size(path_, error);
+  return error ? 0 : bytes;
 }
 
 std::vector<Element> PfFile::elements() const {
@@ -202,20 +248,22 @@ Element PfFile::find(const std::string& name, Kind kind) const {
 }
 
 void PfFile::save() {
-  std::error_code error;
-  const fs::path resolved = fs::canonical(path_, error);  // a link stays a link
-  const fs::path target = error ? fs::path(path_) : resolved;
-  TempFile whole = TempFile::beside(target);
-  const TEVPF_STATUS status = TEV8R1_PF_save(whole.path().string().c_str());
-  if (status != PF_NORMAL) {
-    throw Failure(kCannotWrite,
-                  visible(path_) + ": it cannot be saved: " +
-                      (status == PF_OPENFAIL ? "its new content found no room beside it; make room"
-                                             : reason(status)) +
-                      "; the file is as it was before");
-  }
+  const HoldInterrupts hold;
+  const Stamp before(path_);
+  const auto fail = [&](const std::string& obstacle) {
+    // A file that cannot be replaced in one step was written over.
+    const bool touched = !temp_ && Stamp(path_) != before;
+    throw Failure(kCannotWrite, visible(path_) + ": it cannot be saved: " + obstacle +
+                                    (touched ? "; it may hold only a part of its new content"
+                                             : "; it is as it was before"));
+  };
+  const TEVPF_STATUS status = TEV8R1_PF_save(nullptr);
+  if (status == PF_OPENFAIL) fail("its new content could not be written; make room");
+  if (status != PF_NORMAL) fail(reason(status));
   close();
-  whole.replace(target);
+  if (!temp_) return;
+  if (!rename_to_new(temp_->path(), path_)) fail(last_error().message());
+  temp_->forget();
 }
 
 void check_new_name(const std::string& name, const std::string& what) {

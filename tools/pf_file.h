@@ -1,10 +1,13 @@
-// FILE, opened with the library: never created or emptied by reading, replaced whole by saving.
+// FILE, opened with the library: never created or emptied by reading, and on the disk either as it
+// was or whole.
 #pragma once
 
-#include <filesystem>
+#include <cstdint>
+#include <optional>
 #include <string>
 #include <vector>
 
+#include "temp_file.h"
 #include "tevpf.h"
 
 namespace tool {
@@ -24,32 +27,39 @@ class PfFile {
   static PfFile open_to_read(const std::string& path);
   // To change: a damaged file is refused, because saving it would drop what could not be read.
   static PfFile open_to_change(const std::string& path);
-  static PfFile create(const std::string& path);  // refuses an existing file
+  // A new one, under its name only when it is saved; refuses an existing file.
+  static PfFile create(const std::string& path);
   static PfFile open_or_create(const std::string& path);
 
   PfFile(const PfFile&) = delete;
   PfFile& operator=(const PfFile&) = delete;
-  ~PfFile();  // changes that were not saved are dropped, and so is a created file
+  ~PfFile();  // changes that were not saved are dropped
 
   const std::string& path() const { return path_; }
   const std::string& damage() const { return damage_; }  // empty: none
+  std::uintmax_t size() const;                           // on the disk
 
   std::vector<Element> elements() const;  // lists first, each kind in directory order
   bool has(Kind kind, const std::string& name) const;
   // The element of that name, or a Failure that says what to do: none, or both kinds.
   Element find(const std::string& name, Kind kind) const;
 
-  // Writes a new file beside it and puts that in its place; closes.
+  // Writes it to the disk as the library does, interrupts waiting meanwhile; closes.
   void save();
 
  private:
-  enum class Use { kRead, kChange };
+  enum class Use { kRead, kChange, kCreate };
+  explicit PfFile(std::string path);  // not open yet
   PfFile(std::string path, Use use);
+  TEVPF_STATUS open(const std::string& path);
+  void load();
+  void create_beside();
   std::string find_damage(TEVPF_STATUS status) const;
   void refuse_changes() const;  // throws when it may not be written, or is damaged
   void close();
 
   std::string path_, damage_;
+  std::optional<TempName> temp_;  // of a new file until it is saved
   bool open_ = false;
 };
 
