@@ -31,7 +31,9 @@ TEVPF_API const char* tevpf_status_name(TEVPF_STATUS status) TEVPF_NOEXCEPT;
  * size. */
 TEVPF_API size_t tevpf_message(TEVPF_STATUS status, char* buffer, size_t size) TEVPF_NOEXCEPT;
 
-/* The same sentence from two texts that were kept from an earlier failure.
+/* The same sentence from two texts that were kept from an earlier failure. For PF_BADFORMAT, a caller
+ * that knows the table or list that was being loaded may name it in `value`, which the library leaves
+ * empty: "the file ends inside the rows of table 'parts', or is damaged there".
  *   item, value  never null; empty where there was none */
 TEVPF_API size_t tevpf_message_of(TEVPF_STATUS status, const char* item, const char* value,
                                   char* buffer, size_t size) TEVPF_NOEXCEPT;

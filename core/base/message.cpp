@@ -93,7 +93,11 @@ bool has_type_code(const Texts& texts) noexcept {
 }
 bool has_code(const Texts& texts) noexcept { return is_number(texts.value); }
 bool is_rows(const Texts& texts) noexcept { return texts.item == "table data"; }
+bool is_rows_of(const Texts& texts) noexcept { return is_rows(texts) && has_both(texts); }
 bool is_name_index(const Texts& texts) noexcept { return texts.item == "list index"; }
+bool is_name_index_of(const Texts& texts) noexcept {
+  return is_name_index(texts) && has_both(texts);
+}
 
 // {1} and {2} stand for the two texts; [1] and [2] for texts such as "column melting", whose name is
 // put in quotes.
@@ -121,7 +125,7 @@ constexpr Sentence kSentences[] = {
     {PF_CMPFAIL, always, "the values cannot be compared"},
     {PF_NOFILE, always, "no file is open, or none of this name"},
     {PF_BADTYPE, has_wrong_type, "[1] is of type {2}"},
-    {PF_BADTYPE, is_element, "[1] has type {2}, which is neither list nor table"},
+    {PF_BADTYPE, is_element, "[1] is of kind {2}, neither list nor table"},
     {PF_BADTYPE, has_type_code, "there is no {1} type {2}"},
     {PF_BADTYPE, has_code, "there is no type {2}"},
     {PF_BADTYPE, always, "there is no such type"},
@@ -137,6 +141,10 @@ constexpr Sentence kSentences[] = {
     {PF_RANGE, has_both, "'{2}': {1} is out of range"},
     {PF_RANGE, has_item, "{1} is out of range"},
     {PF_RANGE, always, "the value is out of range"},
+    {PF_BADFORMAT, is_rows_of, "the file ends inside the rows of table '{2}', or is damaged there"},
+    {PF_BADFORMAT, is_name_index_of,
+     "the file ends inside the name index of list '{2}', or is damaged there"},
+    {PF_BADFORMAT, has_both, "the file ends inside '{1}' of table '{2}', or is damaged there"},
     {PF_BADFORMAT, is_rows, "the file ends inside the rows of a table, or is damaged there"},
     {PF_BADFORMAT, is_name_index,
      "the file ends inside the name index of a list, or is damaged there"},

@@ -65,7 +65,11 @@ class File {
   bool is_open() const noexcept { return file_ != nullptr && file_->is_open(); }
   bool is_new() const noexcept { return is_new_; }              // created by opening it
   bool is_read_only() const noexcept { return is_read_only_; }  // may be read, not be written
-  const std::optional<Error>& damage() const noexcept { return damage_; }  // none: read whole
+
+  // What stopped loading, none in a file that was read whole. For PF_BADFORMAT, item() is the element,
+  // "table data", "list index", or a column and " index"; behind an element's body, value() names the
+  // table or list.
+  const std::optional<Error>& damage() const noexcept { return damage_; }
 
   // Writes everything. O(file size).
   //   PF_NOPRIV     read-only, or the system refuses access
@@ -123,6 +127,8 @@ class File {
   static std::string name_of(const std::filesystem::path& path);
   TEVPF_STATUS open_file();
   void load(TEVPF_STATUS status, Damage damage);
+  Error what_stopped_loading(TEVPF_STATUS status) const;
+  std::string owner_of(std::string_view part) const;
   bool is_current() const;
   void adopt_current();
   void create_element(const detail::Name& name, std::string_view description, Kind kind);
@@ -169,9 +175,13 @@ inline void File::adopt_current() {
 // Opening would create a file that is not there, and empty one that may be written but not read.
 inline File File::open(const std::filesystem::path& path, Damage damage) {
   File file(name_of(path));
+  using std::filesystem::file_type;
   std::error_code error;
-  if (!std::filesystem::is_regular_file(path, error)) {
-    const char* const problem = exists(path) ? "' is not a regular file" : "' does not exist";
+  const file_type type = std::filesystem::status(path, error).type();
+  if (type != file_type::regular) {
+    const char* const problem = type == file_type::not_found ? "' does not exist"
+                                : type == file_type::none    ? "' cannot be read"
+                                                             : "' is not a regular file";
     throw Error(PF_OPENFAIL, file.name(), {}, "'" + file.name() + problem);
   }
   if (!std::ifstream(path, std::ios::binary)) {
@@ -193,7 +203,7 @@ inline void File::load(TEVPF_STATUS status, Damage damage) {
     case PF_BADTYPE:
     case PF_DUPLICATE:
       adopt_current();
-      damage_.emplace(status, tevpf_error_item(), tevpf_error_value());
+      damage_.emplace(what_stopped_loading(status));
       if (damage == Damage::refused) throw Error(*damage_);
       return;
     case PF_NOMEM:  // it may be open with what was loaded
@@ -203,6 +213,29 @@ inline void File::load(TEVPF_STATUS status, Damage damage) {
       break;
   }
   detail::raise(status);
+}
+
+inline Error File::what_stopped_loading(TEVPF_STATUS status) const {
+  std::string item = tevpf_error_item();
+  std::string value = tevpf_error_value();
+  if (status == PF_BADFORMAT) value = owner_of(item);
+  return {status, std::move(item), std::move(value)};
+}
+
+// The list or table to which a part that lies behind an element's body belongs: the last one that was
+// loaded. Empty when the part is an element itself.
+inline std::string File::owner_of(std::string_view part) const {
+  constexpr std::string_view index = " index";
+  std::string list;
+  std::string table;
+  for (Element& element : elements()) {
+    (element.kind == Kind::list ? list : table) = std::move(element.name);
+  }
+  if (part == "list index") return list;
+  if (part == "table data") return table;
+  if (table.empty() || !part.ends_with(index)) return {};
+  part.remove_suffix(index.size());
+  return this->table(table).has_column(part) ? table : std::string();
 }
 
 inline File File::create(const std::filesystem::path& path) {

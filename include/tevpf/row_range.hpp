@@ -232,9 +232,10 @@ inline void RowReader::make_room() {
 
 inline RowReader::Block RowReader::read(std::size_t first) {
   if (!table_.has_layout(layout_)) table_.raise_changed();
-  make_room();
   first_ = first;
+  if (first >= table_.ready()) return {rows_.get(), rows_.get()};
   const char* const order = order_.view().empty() ? nullptr : order_.c_str();
+  make_room();
   const std::size_t count = table_.read(order, first, room_, rows_.get(), numbers_.get());
   return {rows_.get(), rows_.get() + count * layout_->row_size};
 }

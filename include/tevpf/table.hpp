@@ -50,6 +50,7 @@ class Table {
 
   std::size_t size() const { return table_.ready(); }
   bool empty() const { return size() == 0; }
+  std::size_t row_size() const { return layout().row_size; }  // bytes of a row, gaps included
 
   // ---- Columns ----
 
