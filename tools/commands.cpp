@@ -1,9 +1,5 @@
 #include "commands.h"
 
-#include <cstdio>
-
-#include "text.h"
-
 namespace tool {
 namespace {
 
@@ -28,12 +24,5 @@ constexpr Command kCommands[] = {
 }  // namespace
 
 std::span<const Command> commands() { return kCommands; }
-
-ExitStatus finish_reading(const PfFile& file) {
-  if (file.damage().empty()) return kDone;
-  std::fprintf(stderr, "tevpf: %s: it is damaged: %s; shown is what could be read\n",
-               visible(file.path()).c_str(), file.damage().c_str());
-  return kUnreadable;
-}
 
 }  // namespace tool
