@@ -1,10 +1,11 @@
-# What `cmake --install` lays out: header, libraries, CMake package, pkg-config file, documents.
+# What `cmake --install` lays out: headers, libraries, CMake package, pkg-config files, documents.
 include(CMakePackageConfigHelpers)
 
 set(package_dir "${CMAKE_INSTALL_LIBDIR}/cmake/tevpf")
 
-install(TARGETS tevpf tevpf_static EXPORT tevpfTargets)
-install(FILES include/tevpf.h DESTINATION "${CMAKE_INSTALL_INCLUDEDIR}")
+install(TARGETS tevpf tevpf_static tevpf_cpp tevpf_cpp_static EXPORT tevpfTargets)
+install(DIRECTORY include/ DESTINATION "${CMAKE_INSTALL_INCLUDEDIR}"
+  FILES_MATCHING PATTERN "*.h" PATTERN "*.hpp")
 install(EXPORT tevpfTargets NAMESPACE tevpf:: DESTINATION "${package_dir}")
 
 configure_package_config_file(cmake/tevpfConfig.cmake.in
@@ -18,9 +19,11 @@ install(FILES "${PROJECT_BINARY_DIR}/tevpfConfig.cmake"
 file(RELATIVE_PATH TEVPF_PC_PREFIX
   "/${CMAKE_INSTALL_LIBDIR}/pkgconfig" "/")
 string(REGEX REPLACE "/$" "" TEVPF_PC_PREFIX "${TEVPF_PC_PREFIX}")
-configure_file(cmake/tevpf.pc.in "${PROJECT_BINARY_DIR}/tevpf.pc" @ONLY)
-install(FILES "${PROJECT_BINARY_DIR}/tevpf.pc"
-  DESTINATION "${CMAKE_INSTALL_LIBDIR}/pkgconfig")
+foreach(name tevpf tevpf-cpp)
+  configure_file(cmake/${name}.pc.in "${PROJECT_BINARY_DIR}/${name}.pc" @ONLY)
+  install(FILES "${PROJECT_BINARY_DIR}/${name}.pc"
+    DESTINATION "${CMAKE_INSTALL_LIBDIR}/pkgconfig")
+endforeach()
 
 install(FILES LICENSE README.md CHANGELOG.md DESTINATION "${CMAKE_INSTALL_DOCDIR}")
 install(DIRECTORY docs/ DESTINATION "${CMAKE_INSTALL_DOCDIR}" OPTIONAL

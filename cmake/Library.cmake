@@ -1,5 +1,5 @@
 # The library in its three forms: shared (tevpf), static (tevpf_static), and the static form with
-# test hooks (tevpf_testing) that only tests link.
+# test hooks (tevpf_testing) that only tests link; and the C++ interface over it.
 get_property(TEVPF_SOURCES GLOBAL PROPERTY TEVPF_SOURCES)
 
 function(tevpf_public_header target)
@@ -49,6 +49,15 @@ add_library(tevpf::tevpf_static ALIAS tevpf_static)
 tevpf_public_header(tevpf_static)
 target_compile_definitions(tevpf_static PUBLIC TEVPF_STATIC)
 set_target_properties(tevpf_static PROPERTIES LINKER_LANGUAGE CXX OUTPUT_NAME tevpf)
+
+# The C++ interface: headers over the one or the other.
+foreach(form "" _static)
+  add_library(tevpf_cpp${form} INTERFACE)
+  add_library(tevpf::cpp${form} ALIAS tevpf_cpp${form})
+  set_target_properties(tevpf_cpp${form} PROPERTIES EXPORT_NAME cpp${form})
+  target_compile_features(tevpf_cpp${form} INTERFACE cxx_std_20)
+  target_link_libraries(tevpf_cpp${form} INTERFACE tevpf${form})
+endforeach()
 
 if(TEVPF_BUILD_TESTS OR TEVPF_BUILD_FUZZ)
   add_library(tevpf_testing STATIC EXCLUDE_FROM_ALL ${TEVPF_SOURCES})

@@ -7,7 +7,7 @@ checks=("$@")
 ((${#checks[@]})) || checks=(format layers tidy cppcheck shell)
 scripts/install-packages.sh build tool test lint
 
-mapfile -t sources < <(git ls-files '*.cpp' '*.c' '*.h')
+mapfile -t sources < <(git ls-files '*.cpp' '*.c' '*.h' '*.hpp')
 mapfile -t library < <(git ls-files 'core/*.cpp' 'values/*.cpp' 'lists/*.cpp' 'tables/*.cpp' 'reports/*.cpp' 'tools/*.cpp')
 
 check_format() { clang-format --dry-run -Werror "${sources[@]}"; }

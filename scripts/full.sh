@@ -15,7 +15,7 @@ seconds=${1:-1800}
 scripts/check.sh
 scripts/test.sh
 
-scripts/install-packages.sh build test full fuzz
+scripts/install-packages.sh build test fuzz
 echo "== kill sweep"
 cmake --build --preset dev --target save_once
 tests/robustness/kill_sweep.py build/dev/tests/robustness/save_once

@@ -1,18 +1,17 @@
 #!/usr/bin/env bash
 # install-packages.sh GROUP...: installs the Debian packages of these groups that are missing.
-# Groups: build tool test bench x86 windows fuzz lint full
+# Groups: build tool test bench x86 windows fuzz lint
 set -euo pipefail
 
 declare -A groups=(
   [build]="cmake ninja-build g++"
   [tool]="libcli11-dev nlohmann-json3-dev"
-  [test]="libgtest-dev pkg-config python3"
+  [test]="libgtest-dev pkg-config python3 strace"
   [bench]="libbenchmark-dev libsqlite3-dev nlohmann-json3-dev python3"
   [x86]="g++-multilib googletest"
   [windows]="g++-mingw-w64-i686-win32"
   [fuzz]="clang libclang-rt-14-dev llvm"
   [lint]="clang-format clang-tidy cppcheck shellcheck python3"
-  [full]="strace"
 )
 
 missing=()

@@ -40,6 +40,7 @@ const Argument kArguments[] = {
     {"--names", "--names", nullptr, "Print the names of the elements alone", &Arguments::names},
     {"--list", "--list", nullptr, "The name is that of a list", &Arguments::list},
     {"--table", "--table", nullptr, "The name is that of a table", &Arguments::table},
+    {"--force", "--force", nullptr, "Write a dump that is far longer than FILE", &Arguments::force},
 };
 
 std::string counted_from_one(const std::string& text) {

@@ -2,24 +2,24 @@
 #include <algorithm>
 
 #include "commands.h"
-#include "elements.h"
+#include "files.h"
 #include "output.h"
 #include "text.h"
 
 namespace tool {
 
 ExitStatus run_check(const Arguments& arguments) {
-  const PfFile file = PfFile::open_to_read(arguments.file);
-  const std::vector<Element> elements = file.elements();
-  if (!file.damage().empty()) {
-    throw Failure(kUnreadable, visible(file.path()) + ": it is damaged: " + file.damage() + "; " +
-                                   counted(elements.size(), "element") +
+  const tevpf::File file = open_to_read(arguments.file);
+  const std::vector<tevpf::Element> elements = file.elements();
+  if (file.damage()) {
+    throw Failure(kUnreadable, visible(arguments.file) + ": it is damaged: " + damage_of(file) +
+                                   "; " + counted(elements.size(), "element") +
                                    " could be read at least in part");
   }
-  const auto lists = static_cast<std::size_t>(
-      std::count_if(elements.begin(), elements.end(),
-                    [](const Element& element) { return element.kind == Kind::kList; }));
-  print(visible(file.path()) + ": in order, " + counted(lists, "list") + " and " +
+  const auto lists = static_cast<std::size_t>(std::count_if(
+      elements.begin(), elements.end(),
+      [](const tevpf::Element& element) { return element.kind == tevpf::Kind::list; }));
+  print(visible(arguments.file) + ": in order, " + counted(lists, "list") + " and " +
         counted(elements.size() - lists, "table") + "\n");
   return kDone;
 }

@@ -1,9 +1,5 @@
 #include "commands.h"
 
-#include <cstdio>
-
-#include "text.h"
-
 namespace tool {
 namespace {
 
@@ -13,12 +9,12 @@ constexpr Command kCommands[] = {
      "FILE ELEMENT --columns --sort --from --to --json --list --table", run_show},
     {"get", "Print the value of a parameter", "FILE LIST PARAM", run_get},
     {"set", "Change the value of a parameter, within its bounds", "FILE LIST PARAM VALUE", run_set},
-    {"dump", "Write the text dump of FILE, or of one element", "FILE [ELEMENT] -o --list --table",
-     run_dump},
+    {"dump", "Write the text dump of FILE, or of one element",
+     "FILE [ELEMENT] -o --list --table --force", run_dump},
     {"export", "Write a list or a table as CSV", "FILE ELEMENT -o --list --table", run_export},
     {"import", "Add the rows of a CSV file to a table, made when it is not there", "FILE TABLE CSV",
      run_import},
-    {"check", "Say whether FILE is whole, or what is wrong and where", "FILE", run_check},
+    {"check", "Say whether FILE is in order, or what is wrong and where", "FILE", run_check},
     {"new", "Make an empty FILE", "FILE", run_new},
     {"rm", "Remove a list or a table", "FILE ELEMENT --list --table", run_rm},
     {"cp", "Copy a list or a table within FILE", "FILE ELEMENT NEW --list --table", run_cp},
@@ -28,12 +24,5 @@ constexpr Command kCommands[] = {
 }  // namespace
 
 std::span<const Command> commands() { return kCommands; }
-
-ExitStatus finish_reading(const PfFile& file) {
-  if (file.damage().empty()) return kDone;
-  std::fprintf(stderr, "tevpf: %s: it is damaged: %s; shown is what could be read\n",
-               visible(file.path()).c_str(), file.damage().c_str());
-  return kUnreadable;
-}
 
 }  // namespace tool

@@ -7,7 +7,7 @@
 #include <vector>
 
 #include "failure.h"
-#include "pf_file.h"
+#include "find.h"
 
 namespace tool {
 
@@ -16,9 +16,11 @@ struct Arguments {
   std::string file, element, parameter, value, new_name, csv, output, sort;
   std::vector<std::string> columns;
   std::size_t from = 0, to = 0;  // 0: not given
-  bool json = false, names = false, list = false, table = false;
+  bool json = false, names = false, list = false, table = false, force = false;
 
-  Kind kind() const { return list ? Kind::kList : table ? Kind::kTable : Kind::kAny; }
+  Kind kind() const {
+    return list ? Kind(tevpf::Kind::list) : table ? Kind(tevpf::Kind::table) : Kind();
+  }
 };
 
 struct Command {
@@ -42,8 +44,5 @@ ExitStatus run_new(const Arguments& arguments);
 ExitStatus run_rm(const Arguments& arguments);
 ExitStatus run_set(const Arguments& arguments);
 ExitStatus run_show(const Arguments& arguments);
-
-// How reading commands end: a damaged file was shown as far as it could be read, and this says so.
-ExitStatus finish_reading(const PfFile& file);
 
 }  // namespace tool

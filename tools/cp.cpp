@@ -1,16 +1,19 @@
 // tevpf cp: copies an element within its file.
 #include "commands.h"
-#include "messages.h"
+#include "files.h"
 
 namespace tool {
 
 ExitStatus run_cp(const Arguments& arguments) {
   check_new_name(arguments.new_name, "the new name");
-  PfFile file = PfFile::open_to_change(arguments.file);
-  const Element element = file.find(arguments.element, arguments.kind());
-  const auto copy = element.kind == Kind::kList ? TEV8R1_PF_copy_list : TEV8R1_PF_copy_table;
-  require(copy(element.name.c_str(), arguments.new_name.c_str()), file.path(), "copy the element");
-  file.save();
+  tevpf::File file = open_to_change(arguments.file);
+  const tevpf::Element element = find_element(file, arguments.element, arguments.kind());
+  if (element.kind == tevpf::Kind::list) {
+    file.copy_list(element.name, arguments.new_name);
+  } else {
+    file.copy_table(element.name, arguments.new_name);
+  }
+  save(file);
   return kDone;
 }
 

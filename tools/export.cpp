@@ -1,25 +1,26 @@
 // tevpf export: a list or a table as CSV that reads back exactly.
 #include "commands.h"
 #include "csv.h"
-#include "elements.h"
+#include "files.h"
 #include "output.h"
+#include "values.h"
 
 namespace tool {
 namespace {
 
 constexpr std::string_view kLineEnd = "\r\n";
 
-void export_list(Output& output, const std::vector<Parameter>& parameters) {
+void export_list(Output& output, const tevpf::List& list) {
   output.write("name,type,value,min,max,precision,units,description\r\n");
-  for (const Parameter& p : parameters) {
+  for (const tevpf::Parameter& p : list) {
     std::string row;
-    append_csv(row, p.name);
+    append_csv(row, p.name());
     row += ',';
-    row += type_word(p.type);
+    row += tevpf::to_string(p.type());
     for (const std::string& field :
-         {exact_text(p.value), p.bounds ? exact_text(p.bounds->min) : "",
-          p.bounds ? exact_text(p.bounds->max) : "",
-          is_floating(p.type) ? std::to_string(p.precision) : "", p.units, p.description}) {
+         {exact_text(p.value()), p.bounds() ? exact_text(p.bounds()->min) : "",
+          p.bounds() ? exact_text(p.bounds()->max) : "",
+          is_floating(p.type()) ? std::to_string(p.precision()) : "", p.units(), p.description()}) {
       row += ',';
       append_csv(row, field);
     }
@@ -27,37 +28,36 @@ void export_list(Output& output, const std::vector<Parameter>& parameters) {
   }
 }
 
-void export_table(Output& output, Table& table) {
-  const std::size_t count = table.columns().size();
-  if (count == 0) return;
-  std::string row;
-  for (std::size_t c = 0; c < count; ++c) {
-    if (c > 0) row += ',';
-    append_csv(row, table.columns()[c].name, count == 1);
+void export_table(Output& output, const tevpf::Table& table) {
+  const std::vector<tevpf::Column> columns = table.columns();
+  const bool is_alone = columns.size() == 1;
+  if (columns.empty()) return;
+  std::string line;
+  for (std::size_t c = 0; c < columns.size(); ++c) {
+    if (c > 0) line += ',';
+    append_csv(line, columns[c].name(), is_alone);
   }
-  output.write(row += kLineEnd);
-  for (std::size_t r = 0; r < table.row_count(); ++r) {
-    table.read_row(r);
-    row.clear();
-    for (std::size_t c = 0; c < count; ++c) {
-      if (c > 0) row += ',';
-      append_csv(row, exact_text(table.cell(c)), count == 1);
+  output.write(line += kLineEnd);
+  for (const tevpf::RowView row : table) {
+    line.clear();
+    for (std::size_t c = 0; c < columns.size(); ++c) {
+      if (c > 0) line += ',';
+      append_csv(line, exact_text(row.value(c)), is_alone);
     }
-    output.write(row += kLineEnd);
+    output.write(line += kLineEnd);
   }
 }
 
 }  // namespace
 
 ExitStatus run_export(const Arguments& arguments) {
-  const PfFile file = PfFile::open_to_read(arguments.file);
-  const Element element = file.find(arguments.element, arguments.kind());
-  Output output(arguments.output, file.path());
-  if (element.kind == Kind::kList) {
-    export_list(output, read_list(file, element.name));
+  const tevpf::File file = open_to_read(arguments.file);
+  const tevpf::Element element = find_element(file, arguments.element, arguments.kind());
+  Output output(arguments.output, file.name());
+  if (element.kind == tevpf::Kind::list) {
+    export_list(output, file.list(element.name));
   } else {
-    Table table(file, element.name);
-    export_table(output, table);
+    export_table(output, file.table(element.name));
   }
   output.finish();
   return finish_reading(file);

@@ -11,7 +11,7 @@ enum ExitStatus {
   kRefused = 1,      // not found, or the request breaks a rule; nothing was changed
   kUsage = 2,        // the command line itself is wrong
   kUnreadable = 3,   // a file is missing, damaged or may not be read
-  kCannotWrite = 4,  // a file, or standard output, could not be written; FILE is as before
+  kCannotWrite = 4,  // a file, or standard output, could not be written
 };
 
 class Failure : public std::runtime_error {

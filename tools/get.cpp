@@ -1,19 +1,20 @@
 // tevpf get: the value of one parameter, exactly, and nothing else.
 #include "commands.h"
-#include "elements.h"
+#include "files.h"
 #include "output.h"
 #include "platform.h"
 #include "text.h"
+#include "values.h"
 
 namespace tool {
 
 ExitStatus run_get(const Arguments& arguments) {
-  const PfFile file = PfFile::open_to_read(arguments.file);
-  const Element element = file.find(arguments.element, Kind::kList);
+  const tevpf::File file = open_to_read(arguments.file);
+  const tevpf::Element list = find_element(file, arguments.element, tevpf::Kind::list);
   const std::string value =
-      exact_text(find_parameter(file, element.name, arguments.parameter).value);
+      exact_text(find_parameter(file, list.name, arguments.parameter).value());
   // A script gets the very bytes; a terminal must not act upon them.
-  print((stdout_is_terminal() ? visible(value) : value) + "\n");
+  print((is_terminal(stdout) ? visible(value) : value) + "\n");
   return finish_reading(file);
 }
 

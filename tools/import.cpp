@@ -1,11 +1,14 @@
 // tevpf import: the rows of a CSV file into a table, all of them or none.
-#include <cerrno>
+#include <array>
 #include <cstdio>
-#include <cstring>
+#include <filesystem>
 #include <memory>
+#include <system_error>
 
 #include "commands.h"
+#include "files.h"
 #include "output.h"
+#include "platform.h"
 #include "table_import.h"
 #include "text.h"
 
@@ -22,20 +25,35 @@ std::string read_whole(const std::string& path) {
   const std::unique_ptr<std::FILE, CloseFile> stream{path == "-" ? stdin
                                                                  : std::fopen(path.c_str(), "rb")};
   std::string text;
-  std::size_t size = 0;
+  std::array<char, 65536> block;
   while (stream) {
-    text.resize(size + 65536);
-    const std::size_t count = std::fread(text.data() + size, 1, 65536, stream.get());
-    size += count;
-    if (count == 0) break;
-    if (text.capacity() < size + 65536) text.reserve(size * 2);
+    const std::size_t count = std::fread(block.data(), 1, block.size(), stream.get());
+    if (std::ferror(stream.get()) != 0) break;
+    text.append(block.data(), count);
+    if (count < block.size()) return text;
   }
-  if (!stream || std::ferror(stream.get()) != 0) {
-    throw Failure(kUnreadable, visible(path) + ": it cannot be read: " + std::strerror(errno) +
-                                   "; name a CSV file, or - for standard input");
+  throw Failure(kUnreadable, visible(path) + ": it cannot be read: " + last_error().message() +
+                                 "; name a CSV file, or - for standard input");
+}
+
+bool exists(const std::string& path) {
+  std::error_code ignored;
+  return std::filesystem::symlink_status(path, ignored).type() !=
+         std::filesystem::file_type::not_found;
+}
+
+// The number of rows added.
+std::size_t import_and_save(const std::string& path, const std::string& table, const CsvText& csv) {
+  if (exists(path)) {
+    tevpf::File file = open_to_change(path);
+    const std::size_t rows = import_csv(file, table, csv);
+    save(file);
+    return rows;
   }
-  text.resize(size);
-  return text;
+  NewFile made = NewFile::create(path);
+  const std::size_t rows = import_csv(made.file(), table, csv);
+  made.save();
+  return rows;
 }
 
 }  // namespace
@@ -44,14 +62,14 @@ ExitStatus run_import(const Arguments& arguments) {
   check_new_name(arguments.element, "the table's name");
   const std::string text = read_whole(arguments.csv);
   const std::string name = arguments.csv == "-" ? "standard input" : arguments.csv;
-  PfFile file = PfFile::open_or_create(arguments.file);
-  if (!file.has(Kind::kTable, arguments.element) && file.has(Kind::kList, arguments.element)) {
-    throw Failure(kRefused, visible(file.path()) + ": " + in_quotes(arguments.element) +
-                                " is a list; rows go into tables, so choose another name");
+  const std::size_t rows = import_and_save(arguments.file, arguments.element, {text, name});
+  const std::string done = counted(rows, "row") + " added to table " + in_quotes(arguments.element);
+  try {
+    print(done + "\n");
+  } catch (const Failure& failure) {
+    throw Failure(failure.status(),
+                  visible(arguments.file) + " is changed: " + done + "; but " + failure.what());
   }
-  const std::size_t rows = import_csv(file, arguments.element, {text, name});
-  file.save();
-  print(counted(rows, "row") + " added to table " + in_quotes(arguments.element) + "\n");
   return kDone;
 }
 

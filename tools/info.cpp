@@ -1,10 +1,7 @@
 // tevpf info: what FILE holds, one line an element.
-#include <filesystem>
-
 #include "commands.h"
-#include "elements.h"
+#include "files.h"
 #include "json.h"
-#include "messages.h"
 #include "output.h"
 #include "text.h"
 #include "text_table.h"
@@ -16,31 +13,19 @@ struct Sizes {
   std::size_t parameters = 0, rows = 0, columns = 0, row_bytes = 0;
 };
 
-Sizes sizes_of(const PfFile& file, const Element& element) {
-  Sizes sizes;
-  if (element.kind == Kind::kList) {
-    std::int32_t count = 0;
-    require(TEV8R1_PF_inq_num_params(element.name.c_str(), &count), file.path(), "read the list");
-    sizes.parameters = static_cast<std::size_t>(count);
-  } else {
-    const Table table(file, element.name);
-    sizes = {0, table.row_count(), table.columns().size(), table.row_size()};
-  }
-  return sizes;
+Sizes sizes_of(const tevpf::File& file, const tevpf::Element& element) {
+  if (element.kind == tevpf::Kind::list) return {file.list(element.name).size(), 0, 0, 0};
+  const tevpf::Table table = file.table(element.name);
+  return {0, table.size(), table.columns().size(), table.row_size()};
 }
 
-std::uintmax_t file_bytes(const PfFile& file) {
-  std::error_code error;
-  const std::uintmax_t bytes = std::filesystem::file_size(file.path(), error);
-  return error ? 0 : bytes;
-}
-
-void write_json(Output& output, const PfFile& file, const std::vector<Element>& elements) {
+void write_json(Output& output, const tevpf::File& file,
+                const std::vector<tevpf::Element>& elements) {
   Json lists = Json::array(), tables = Json::array();
-  for (const Element& element : elements) {
+  for (const tevpf::Element& element : elements) {
     const Sizes sizes = sizes_of(file, element);
     Json entry = {{"name", element.name}, {"description", element.description}};
-    if (element.kind == Kind::kList) {
+    if (element.kind == tevpf::Kind::list) {
       entry["parameters"] = sizes.parameters;
       lists.push_back(entry);
     } else {
@@ -51,17 +36,18 @@ void write_json(Output& output, const PfFile& file, const std::vector<Element>& 
     }
   }
   const Json all = {
-      {"file", file.path()}, {"bytes", file_bytes(file)}, {"lists", lists}, {"tables", tables}};
+      {"file", file.name()}, {"bytes", size_on_disk(file)}, {"lists", lists}, {"tables", tables}};
   output.write(json_text(all, 2) + "\n");
 }
 
-void write_lines(Output& output, const PfFile& file, const std::vector<Element>& elements) {
+void write_lines(Output& output, const tevpf::File& file,
+                 const std::vector<tevpf::Element>& elements) {
   using Align = TextTable::Align;
   std::vector<std::vector<std::string>> lines;
-  for (const Element& element : elements) {
+  for (const tevpf::Element& element : elements) {
     const Sizes sizes = sizes_of(file, element);
     lines.push_back(
-        element.kind == Kind::kList
+        element.kind == tevpf::Kind::list
             ? std::vector<std::string>{"list", element.name, counted(sizes.parameters, "parameter"),
                                        "", "", element.description}
             : std::vector<std::string>{"table", element.name, counted(sizes.rows, "row"),
@@ -81,13 +67,13 @@ void write_lines(Output& output, const PfFile& file, const std::vector<Element>&
 }  // namespace
 
 ExitStatus run_info(const Arguments& arguments) {
-  const PfFile file = PfFile::open_to_read(arguments.file);
-  const std::vector<Element> elements = file.elements();
-  Output output({}, file.path());
+  const tevpf::File file = open_to_read(arguments.file);
+  const std::vector<tevpf::Element> elements = file.elements();
+  Output output({}, file.name());
   if (arguments.json) {
     write_json(output, file, elements);
   } else if (arguments.names) {
-    for (const Element& element : elements) output.write(visible(element.name) + "\n");
+    for (const tevpf::Element& element : elements) output.write(visible(element.name) + "\n");
   } else {
     write_lines(output, file, elements);
   }

@@ -20,8 +20,7 @@ inline Json value_json(const Value& value) {
   return std::visit([](const auto& v) { return Json(v); }, value);
 }
 
-inline std::string json_text(const Json& json, int indent = -1) {
-  return json.dump(indent, ' ', false, Json::error_handler_t::replace);
-}
+// As UTF-8, with escapes for all control characters: JSON itself leaves those from DEL on as they are.
+std::string json_text(const Json& json, int indent = -1);
 
 }  // namespace tool

@@ -10,7 +10,7 @@
 #include "failure.h"
 #include "output.h"
 #include "platform.h"
-#include "tevpf.h"
+#include "tevpf.hpp"
 #include "text.h"
 
 namespace {
@@ -37,6 +37,16 @@ std::string overview() {
          "3 a file is missing, damaged or unreadable, 4 a file cannot be written.\n";
 }
 
+// What the library refused, and what helps.
+tool::Failure refusal(const std::string& file, const tevpf::Error& error) {
+  const bool cannot_write = error.status() == PF_OPENFAIL;
+  const char* const advice = cannot_write                     ? "; check its folder and free space"
+                             : error.status() == PF_DUPLICATE ? "; choose another one"
+                                                              : "";
+  return {cannot_write ? tool::kCannotWrite : tool::kRefused,
+          tool::visible(file) + ": " + tool::visible(error.what()) + advice};
+}
+
 int run(int argc, char** argv) {
   const std::string name = argc > 1 ? argv[1] : "";
   if (name == "--help" || name == "-h" || name == "help") {
@@ -59,14 +69,18 @@ int run(int argc, char** argv) {
   tool::Arguments arguments;
   auto status = tool::kDone;
   if (!tool::read_arguments(*command, argc - 1, argv + 1, arguments, status)) return status;
-  return command->run(arguments);
+  try {
+    return command->run(arguments);
+  } catch (const tevpf::Error& error) {
+    throw refusal(arguments.file, error);
+  }
 }
 
 }  // namespace
 
 int main(int argc, char** argv) {
   try {
-    tool::prepare_standard_output();
+    tool::prepare_process();
     return run(argc, argv);
   } catch (const tool::ClosedPipe&) {
     return tool::kDone;

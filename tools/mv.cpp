@@ -1,17 +1,19 @@
 // tevpf mv: renames an element.
 #include "commands.h"
-#include "messages.h"
+#include "files.h"
 
 namespace tool {
 
 ExitStatus run_mv(const Arguments& arguments) {
   check_new_name(arguments.new_name, "the new name");
-  PfFile file = PfFile::open_to_change(arguments.file);
-  const Element element = file.find(arguments.element, arguments.kind());
-  const std::int32_t type = element.kind == Kind::kList ? PF_ELEM_LIST : PF_ELEM_TABLE;
-  require(TEV8R1_modify_elem_name(type, element.name.c_str(), arguments.new_name.c_str()),
-          file.path(), "rename the element");
-  file.save();
+  tevpf::File file = open_to_change(arguments.file);
+  const tevpf::Element element = find_element(file, arguments.element, arguments.kind());
+  if (element.kind == tevpf::Kind::list) {
+    file.list(element.name).rename_list(arguments.new_name);
+  } else {
+    file.table(element.name).rename_table(arguments.new_name);
+  }
+  save(file);
   return kDone;
 }
 

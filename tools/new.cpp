@@ -1,10 +1,11 @@
 // tevpf new: makes an empty parameter file.
 #include "commands.h"
+#include "files.h"
 
 namespace tool {
 
 ExitStatus run_new(const Arguments& arguments) {
-  PfFile::create(arguments.file).save();
+  NewFile::create(arguments.file).save();
   return kDone;
 }
 

@@ -1,8 +1,6 @@
 #include "output.h"
 
-#include <array>
 #include <cerrno>
-#include <cstring>
 #include <system_error>
 #include <utility>
 
@@ -14,24 +12,6 @@ namespace fs = std::filesystem;
 
 namespace tool {
 namespace {
-
-// Dumps do not report a full disk. When one was cut short by it, the bytes behind it find no room
-// either.
-bool has_room_behind(const fs::path& file) {
-  std::error_code error;
-  const std::uintmax_t size = fs::file_size(file, error);
-  if (error) return false;
-  std::FILE* stream = std::fopen(file.string().c_str(), "ab");
-  if (stream == nullptr) return false;
-  static constexpr std::array<char, 65536> kProbe{};
-  const bool written = std::fwrite(kProbe.data(), 1, kProbe.size(), stream) == kProbe.size();
-  const bool flushed = std::fflush(stream) == 0;
-  const int reason = errno;
-  const bool closed = std::fclose(stream) == 0;
-  fs::resize_file(file, size, error);
-  if (!(written && flushed)) errno = reason;
-  return written && flushed && closed && !error;
-}
 
 // The file that a path names in the end: an existing link stays a link.
 fs::path followed(const fs::path& path) {
@@ -49,6 +29,7 @@ Output::Output(const std::string& name, const fs::path& source) : name_(name) {
                                   " itself; send the output to another file");
     }
     stream_ = stdout;
+    to_terminal_ = is_terminal(stdout);
     return;
   }
   std::error_code ignored;
@@ -60,74 +41,49 @@ Output::Output(const std::string& name, const fs::path& source) : name_(name) {
   if (!fs::exists(target_, ignored) || fs::is_regular_file(target_, ignored)) {
     if (fs::exists(target_, ignored)) {
       std::FILE* writable = std::fopen(name.c_str(), "r+b");
-      if (writable == nullptr) fail(errno);
+      if (writable == nullptr) fail(last_error());
       std::fclose(writable);
     }
-    temp_.emplace(TempFile::beside(target_));
+    temp_.emplace(target_);
+    stream_ = temp_->stream();
+    return;
   }
-  open_stream();
+  stream_ = std::fopen(target_.string().c_str(), "wb");
+  if (stream_ == nullptr) fail(last_error());
+  to_terminal_ = is_terminal(stream_);
 }
 
 Output::~Output() {
-  if (stream_ != nullptr && stream_ != stdout) std::fclose(stream_);
+  if (stream_ != nullptr && stream_ != stdout && !temp_) std::fclose(stream_);
 }
 
-void Output::open_stream() {
-  stream_ = std::fopen((temp_ ? temp_->path() : target_).string().c_str(), "wb");
-  if (stream_ == nullptr) fail(errno);
-}
-
-void Output::fail(int error) {
-  if (error == EPIPE) throw ClosedPipe{};
+void Output::fail(const std::error_code& error) {
+  if (error == std::errc::broken_pipe) throw ClosedPipe{};
   throw Failure(kCannotWrite, (target_.empty() ? "standard output" : in_quotes(name_)) +
-                                  " cannot be written: " + std::generic_category().message(error) +
+                                  " cannot be written: " + error.message() +
                                   "; make room or choose another file");
 }
 
+void Output::put(std::string_view text) {
+  if (std::fwrite(text.data(), 1, text.size(), stream_) != text.size()) fail(last_error());
+}
+
 void Output::write(std::string_view text) {
-  if (std::fwrite(text.data(), 1, text.size(), stream_) != text.size()) fail(errno);
-}
-
-void Output::write_file(const std::function<void(const std::string& path)>& make) {
-  if (temp_) {
-    std::fclose(std::exchange(stream_, nullptr));
-    make(temp_->path().string());
-    if (!has_room_behind(temp_->path())) fail(errno);
-    return;
-  }
-  TempFile made = TempFile::anywhere();
-  make(made.path().string());
-  if (!has_room_behind(made.path())) {
-    throw Failure(kCannotWrite, "there is no room for a temporary file in " +
-                                    in_quotes(made.path().parent_path().string()) + ": " +
-                                    std::strerror(errno) + "; make room or use -o");
-  }
-  copy_from(made.path());
-}
-
-void Output::copy_from(const fs::path& file) {
-  std::FILE* source = std::fopen(file.string().c_str(), "rb");
-  if (source == nullptr) fail(errno);
-  std::array<char, 65536> block;
-  std::size_t count = 0;
-  do {
-    count = std::fread(block.data(), 1, block.size(), source);
-    try {
-      write({block.data(), count});
-    } catch (...) {
-      std::fclose(source);
-      throw;
-    }
-  } while (count > 0);
-  std::fclose(source);
+  if (!to_terminal_) return put(text);
+  line_ += text;
+  const std::size_t whole_lines = line_.rfind('\n') + 1;
+  put(visible_lines(std::string_view(line_).substr(0, whole_lines)));
+  line_.erase(0, whole_lines);
 }
 
 void Output::finish() {
-  if (stream_ != nullptr) {
-    if (std::fflush(stream_) != 0) fail(errno);
-    if (stream_ != stdout && std::fclose(std::exchange(stream_, nullptr)) != 0) fail(errno);
+  put(visible_lines(line_));
+  if (std::fflush(stream_) != 0) fail(last_error());
+  if (temp_) {
+    if (const std::error_code error = temp_->replace_target()) fail(error);
+    return;
   }
-  if (temp_) temp_->replace(target_);
+  if (stream_ != stdout && std::fclose(std::exchange(stream_, nullptr)) != 0) fail(last_error());
 }
 
 void print(const std::string& text) {

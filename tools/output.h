@@ -4,10 +4,10 @@
 
 #include <cstdio>
 #include <filesystem>
-#include <functional>
 #include <optional>
 #include <string>
 #include <string_view>
+#include <system_error>
 
 #include "temp_file.h"
 
@@ -22,24 +22,22 @@ class Output {
   Output& operator=(const Output&) = delete;
   ~Output();
 
+  // A terminal gets control characters as escapes, everything else the very bytes.
   void write(std::string_view text);
-
-  // Has `make` write a file by its path and takes over what it wrote, instead of any write().
-  // `make` cannot notice a full disk; this does.
-  void write_file(const std::function<void(const std::string& path)>& make);
 
   // Everything is written: the file gets its name. Without it nothing appears.
   void finish();
 
  private:
-  [[noreturn]] void fail(int error);
-  void open_stream();
-  void copy_from(const std::filesystem::path& file);
+  [[noreturn]] void fail(const std::error_code& error);
+  void put(std::string_view text);
 
   std::string name_;              // as it was given, for messages
   std::filesystem::path target_;  // links followed; empty: standard output
   std::optional<TempFile> temp_;  // none for standard output and for devices
   std::FILE* stream_ = nullptr;
+  bool to_terminal_ = false;
+  std::string line_;  // that a terminal does not show yet, because it goes on
 };
 
 // A command's short answer on standard output.

@@ -7,51 +7,35 @@
 #include <cerrno>
 #include <csignal>
 #include <cstdio>
+#include <cstdlib>
 #include <cstring>
+#include <memory>
+#include <random>
 #include <string>
 
 #ifdef _WIN32
 #include <io.h>
 #else
 #include <unistd.h>
+
+#include <future>
 #endif
+
+namespace fs = std::filesystem;
 
 namespace tool {
 namespace {
 
-#ifdef _WIN32
-constexpr int kCreate = _O_CREAT | _O_EXCL | _O_WRONLY | _O_BINARY;
-constexpr int kUpdate = _O_RDWR | _O_BINARY;
-constexpr int kPrivate = _S_IREAD | _S_IWRITE, kShared = kPrivate;
-int descriptor(std::FILE* stream) { return _fileno(stream); }
-int open_file(const char* name, int mode, int permissions) {
-  return _open(name, mode, permissions);
-}
-int sync_file(int file) { return _commit(file); }
-int close_file(int file) { return _close(file); }
-int is_terminal(int file) { return _isatty(file); }
-int remove_name(const char* name) { return _unlink(name); }
-#else
-constexpr int kCreate = O_CREAT | O_EXCL | O_WRONLY | O_CLOEXEC;
-constexpr int kUpdate = O_RDWR | O_CLOEXEC;
-constexpr unsigned kPrivate = 0600, kShared = 0666;
-int descriptor(std::FILE* stream) { return fileno(stream); }
-int open_file(const char* name, int mode, unsigned permissions) {
-  return open(name, mode, permissions);
-}
-int sync_file(int file) { return fsync(file); }
-int close_file(int file) { return close(file); }
-int is_terminal(int file) { return isatty(file); }
-int remove_name(const char* name) { return unlink(name); }
-#endif
-
-bool sync_and_close(int file) {
-  const bool synced = sync_file(file) == 0;
-  return close_file(file) == 0 && synced;
-}
-
 // Read by the signal handler: a fixed buffer, empty when there is nothing to remove.
 std::array<char, 4096> interrupted_file;
+
+#ifdef _WIN32
+constexpr int kInterrupts[] = {SIGINT, SIGTERM};
+int remove_name(const char* name) { return _unlink(name); }
+#else
+constexpr int kInterrupts[] = {SIGHUP, SIGINT, SIGTERM};
+int remove_name(const char* name) { return unlink(name); }
+#endif
 
 extern "C" void on_interrupt(int signal) {
   if (interrupted_file[0] != '\0') (void)remove_name(interrupted_file.data());
@@ -59,70 +43,211 @@ extern "C" void on_interrupt(int signal) {
   std::raise(signal);
 }
 
+void catch_interrupts() {
+  for (const int signal : kInterrupts) {
+    const bool was_ignored = std::signal(signal, SIG_IGN) == SIG_IGN;
+    if (!was_ignored) std::signal(signal, on_interrupt);
+  }
+}
+
 }  // namespace
 
-void prepare_standard_output() {
-#ifdef _WIN32
-  _setmode(_fileno(stdout), _O_BINARY);
-  _setmode(_fileno(stdin), _O_BINARY);
-#else
-  std::signal(SIGPIPE, SIG_IGN);
-#endif
-}
+std::error_code last_error() { return {errno, std::generic_category()}; }
 
-bool stdout_is_terminal() { return is_terminal(descriptor(stdout)) != 0; }
-
-bool stdout_is(const std::filesystem::path& file) {
-#ifdef _WIN32
-  (void)file;  // has no cheap identity of an open file there
-  return false;
-#else
-  struct stat output, other;
-  return fstat(descriptor(stdout), &output) == 0 && stat(file.c_str(), &other) == 0 &&
-         output.st_dev == other.st_dev && output.st_ino == other.st_ino;
-#endif
-}
-
-bool create_exclusively(const std::filesystem::path& file, bool is_private) {
-  const int made = open_file(file.string().c_str(), kCreate, is_private ? kPrivate : kShared);
-  if (made < 0) return false;
-  if (sync_and_close(made)) return true;
-  const int reason = errno;  // for the message
-  (void)remove_name(file.string().c_str());
-  errno = reason;
-  return false;
-}
-
-bool flush_to_disk(const std::filesystem::path& file) {
-  const int opened = open_file(file.string().c_str(), kUpdate, kShared);
-  return opened >= 0 && sync_and_close(opened);
-}
-
-void copy_owner(const std::filesystem::path& from, const std::filesystem::path& to) {
-#ifdef _WIN32
-  (void)from, (void)to;
-#else
-  struct stat owner;
-  if (stat(from.c_str(), &owner) != 0) return;
-  // Only the administrator may give files away; anyone else keeps at least the group.
-  if (chown(to.c_str(), owner.st_uid, owner.st_gid) != 0 &&
-      chown(to.c_str(), static_cast<uid_t>(-1), owner.st_gid) != 0) {
-    return;
-  }
-#endif
-}
-
-void remove_on_interrupt(const std::filesystem::path& file) {
+void remove_on_interrupt(const fs::path& file) {
+  const HoldInterrupts hold;
   const std::string name = file.string();
   interrupted_file[0] = '\0';
-  if (name.empty() || name.size() >= interrupted_file.size()) return;
-  std::memcpy(interrupted_file.data() + 1, name.c_str() + 1, name.size());
-  interrupted_file[0] = name[0];  // last: the handler sees nothing or the whole name
-  std::signal(SIGINT, on_interrupt);
-  std::signal(SIGTERM, on_interrupt);
-#ifndef _WIN32
-  std::signal(SIGHUP, on_interrupt);
-#endif
+  if (name.size() < interrupted_file.size()) {
+    std::memcpy(interrupted_file.data(), name.c_str(), name.size() + 1);
+  }
 }
+
+std::string unused_path_beside(const fs::path& target) {
+  static constexpr std::string_view kLetters = "abcdefghijklmnopqrstuvwxyz0123456789";
+  static constexpr int kLength = 8;
+  std::random_device random;
+  std::uniform_int_distribution<std::size_t> letter(0, kLetters.size() - 1);
+  std::string path = (target.parent_path() / ".tevpf-").string();
+  for (int i = 0; i < kLength; ++i) path += kLetters[letter(random)];
+  return path;
+}
+
+// ---- Windows ----
+
+#ifdef _WIN32
+
+void prepare_process() {
+  _setmode(_fileno(stdout), _O_BINARY);
+  _setmode(_fileno(stdin), _O_BINARY);
+  catch_interrupts();
+}
+
+bool is_terminal(std::FILE* stream) { return _isatty(_fileno(stream)) != 0; }
+
+bool stdout_is(const fs::path&) { return false; }  // an open file has no cheap identity there
+
+HoldInterrupts::HoldInterrupts() = default;
+HoldInterrupts::~HoldInterrupts() = default;
+
+std::FILE* create_private_file(const fs::path& name) {
+  constexpr int kFlags = _O_CREAT | _O_EXCL | _O_RDWR | _O_BINARY;
+  const int file = _wopen(name.c_str(), kFlags, _S_IREAD | _S_IWRITE);
+  return file < 0 ? nullptr : _fdopen(file, "w+b");
+}
+
+bool copy_rights(std::FILE*, const fs::path&) { return true; }
+
+bool flush_to_disk(std::FILE* stream) {
+  return std::fflush(stream) == 0 && _commit(_fileno(stream)) == 0;
+}
+
+bool rename_to_new(const fs::path& from, const fs::path& to) {
+  return std::rename(from.string().c_str(), to.string().c_str()) == 0;
+}
+
+// By way of a file in the user's own folder for temporary files.
+void collect(const std::function<void(const std::string& path)>& make,
+             const std::function<void(std::string_view)>& take) {
+  struct Removed {
+    std::string name = unused_path_beside(fs::temp_directory_path() / "dump");
+    std::FILE* stream = create_private_file(name);
+    ~Removed() {
+      if (stream == nullptr) return;
+      std::fclose(stream);
+      remove_name(name.c_str());
+    }
+  };
+  const Removed file;
+  if (file.stream == nullptr) throw std::system_error(last_error(), file.name);
+  make(file.name);
+  std::array<char, 65536> block;
+  while (const std::size_t count = std::fread(block.data(), 1, block.size(), file.stream)) {
+    take({block.data(), count});
+  }
+}
+
+#else
+
+// ---- POSIX ----
+
+namespace {
+
+class Descriptor {
+ public:
+  explicit Descriptor(int fd) : fd_(fd) {}
+  ~Descriptor() { close(fd_); }
+  Descriptor(const Descriptor&) = delete;
+  Descriptor& operator=(const Descriptor&) = delete;
+
+ private:
+  int fd_;
+};
+
+// Of nested holders, the outermost one lets interrupts in again.
+int holders = 0;
+sigset_t mask_before;
+
+sigset_t interrupts() {
+  sigset_t set;
+  sigemptyset(&set);
+  for (const int signal : kInterrupts) sigaddset(&set, signal);
+  return set;
+}
+
+// A stream that the caller has closed must not become the next file that is opened: messages would
+// go there. What takes its place fails as a closed one does.
+void occupy_closed_streams() {
+  for (int fd = 0; fd <= 2; ++fd) {
+    if (fcntl(fd, F_GETFD) < 0) (void)open("/dev/null", fd == 0 ? O_WRONLY : O_RDONLY);
+  }
+}
+
+mode_t mode_of_new_files() {
+  const mode_t mask = umask(0);
+  umask(mask);
+  return 0666 & ~mask;
+}
+
+}  // namespace
+
+void prepare_process() {
+  occupy_closed_streams();
+  std::signal(SIGPIPE, SIG_IGN);
+  std::signal(SIGXFSZ, SIG_IGN);
+  catch_interrupts();
+}
+
+bool is_terminal(std::FILE* stream) { return isatty(fileno(stream)) != 0; }
+
+bool stdout_is(const fs::path& file) {
+  struct stat output, other;
+  return fstat(STDOUT_FILENO, &output) == 0 && stat(file.c_str(), &other) == 0 &&
+         output.st_dev == other.st_dev && output.st_ino == other.st_ino;
+}
+
+HoldInterrupts::HoldInterrupts() {
+  const sigset_t set = interrupts();
+  if (holders++ == 0) pthread_sigmask(SIG_BLOCK, &set, &mask_before);
+}
+
+HoldInterrupts::~HoldInterrupts() {
+  if (--holders == 0) pthread_sigmask(SIG_SETMASK, &mask_before, nullptr);
+}
+
+std::FILE* create_private_file(const fs::path& name) {
+  const int file = open(name.c_str(), O_RDWR | O_CREAT | O_EXCL | O_CLOEXEC, 0600);
+  return file < 0 ? nullptr : fdopen(file, "w+b");
+}
+
+bool copy_rights(std::FILE* stream, const fs::path& like) {
+  const int file = fileno(stream);
+  struct stat old;
+  if (stat(like.c_str(), &old) != 0 || !S_ISREG(old.st_mode)) {
+    return fchmod(file, mode_of_new_files()) == 0;
+  }
+  mode_t mode = old.st_mode & 07777;
+  // Only the administrator may give files away; anyone else keeps at least the group. Whom a file
+  // of another owner or group lets in, the old one did not.
+  if (fchown(file, old.st_uid, old.st_gid) != 0) {
+    mode &= 0777;
+    if (fchown(file, static_cast<uid_t>(-1), old.st_gid) != 0) mode &= 0707;
+  }
+  return fchmod(file, mode) == 0;
+}
+
+bool flush_to_disk(std::FILE* stream) {
+  return std::fflush(stream) == 0 &&
+         (fsync(fileno(stream)) == 0 || errno == EINVAL || errno == ENOTSUP);
+}
+
+bool rename_to_new(const fs::path& from, const fs::path& to) {
+  if (renameat2(AT_FDCWD, from.c_str(), AT_FDCWD, to.c_str(), RENAME_NOREPLACE) == 0) return true;
+  if (errno != EINVAL && errno != ENOSYS) return false;
+  // Not every file system knows the flag. A link never replaces a file either.
+  return link(from.c_str(), to.c_str()) == 0 && unlink(from.c_str()) == 0;
+}
+
+// By way of a pipe: writing into it cannot fail, and what `take` throws ends the writing.
+void collect(const std::function<void(const std::string& path)>& make,
+             const std::function<void(std::string_view)>& take) {
+  int ends[2];
+  if (pipe2(ends, O_CLOEXEC) != 0) throw std::system_error(last_error(), "pipe");
+  std::future<void> made = std::async(std::launch::async, [&make, end = ends[1]] {
+    const Descriptor closed_afterwards(end);
+    make("/dev/fd/" + std::to_string(end));
+  });
+  const Descriptor closed_first(ends[0]);
+  std::array<char, 65536> block;
+  for (;;) {
+    const ssize_t count = read(ends[0], block.data(), block.size());
+    if (count < 0) throw std::system_error(last_error(), "pipe");
+    if (count == 0) break;
+    take({block.data(), static_cast<std::size_t>(count)});
+  }
+  made.get();
+}
+
+#endif
 
 }  // namespace tool

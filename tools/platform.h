@@ -1,30 +1,60 @@
-// What the standard library does not say about terminals, pipes and files. The only file with a
-// branch for Windows.
+// What the standard library does not say about terminals, pipes, signals and files. The only file
+// with a branch for Windows.
 #pragma once
 
+#include <cstdio>
 #include <filesystem>
+#include <functional>
+#include <string>
+#include <string_view>
+#include <system_error>
 
 namespace tool {
 
-// Standard output carries bytes unchanged, and a closed pipe is an error of writing, not a signal.
-void prepare_standard_output();
+// What errno says.
+std::error_code last_error();
 
-bool stdout_is_terminal();
+// To be called first. Standard output carries bytes unchanged; a closed pipe and a size limit are
+// errors of writing, not signals; an interrupt removes the file that remove_on_interrupt names,
+// unless interrupts were ignored when the program started.
+void prepare_process();
+
+bool is_terminal(std::FILE* stream);
 
 // Standard output is redirected to this very file.
 bool stdout_is(const std::filesystem::path& file);
 
-// Creates an empty file that was not there, whatever stands in the way; private: for its owner
-// alone.
-bool create_exclusively(const std::filesystem::path& file, bool is_private);
-
-// What was written to the file is on the disk. False when it could not be brought there.
-bool flush_to_disk(const std::filesystem::path& file);
-
-// Gives `to` the owner and group of `from`, as far as this user may.
-void copy_owner(const std::filesystem::path& from, const std::filesystem::path& to);
-
 // The file is removed when the user interrupts the program; an empty path forgets it again.
 void remove_on_interrupt(const std::filesystem::path& file);
+
+// Interrupts wait while such an object lives.
+class HoldInterrupts {
+ public:
+  HoldInterrupts();
+  ~HoldInterrupts();
+  HoldInterrupts(const HoldInterrupts&) = delete;
+  HoldInterrupts& operator=(const HoldInterrupts&) = delete;
+};
+
+// A path for a temporary file in the folder of `target`: random, so that it is free in practice.
+std::string unused_path_beside(const std::filesystem::path& target);
+
+// Creates a file that was not there, readable by this user alone, and opens it for reading and
+// writing. Null: errno says why.
+std::FILE* create_private_file(const std::filesystem::path& name);
+
+// Gives an open file the owner and the mode of the file `like`, as far as this user may, or the
+// mode of a new file when there is none.
+bool copy_rights(std::FILE* stream, const std::filesystem::path& like);
+
+// Everything written to the stream is on the disk. False when it could not be brought there.
+bool flush_to_disk(std::FILE* stream);
+
+// Renames a file to a name that must be free. False: errno says why.
+bool rename_to_new(const std::filesystem::path& from, const std::filesystem::path& to);
+
+// Calls `make` with a path to write to, and `take` with all that is written there, as it comes.
+void collect(const std::function<void(const std::string& path)>& make,
+             const std::function<void(std::string_view)>& take);
 
 }  // namespace tool

@@ -1,15 +1,18 @@
 // tevpf rm: removes an element with everything it holds.
 #include "commands.h"
-#include "messages.h"
+#include "files.h"
 
 namespace tool {
 
 ExitStatus run_rm(const Arguments& arguments) {
-  PfFile file = PfFile::open_to_change(arguments.file);
-  const Element element = file.find(arguments.element, arguments.kind());
-  const auto remove = element.kind == Kind::kList ? TEV8R1_PF_delete_list : TEV8R1_PF_delete_table;
-  require(remove(element.name.c_str()), file.path(), "remove the element");
-  file.save();
+  tevpf::File file = open_to_change(arguments.file);
+  const tevpf::Element element = find_element(file, arguments.element, arguments.kind());
+  if (element.kind == tevpf::Kind::list) {
+    file.remove_list(element.name);
+  } else {
+    file.remove_table(element.name);
+  }
+  save(file);
   return kDone;
 }
 

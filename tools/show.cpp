@@ -1,13 +1,15 @@
 // tevpf show: a list or a table for people (aligned text) or programs (JSON).
 #include <algorithm>
 #include <numeric>
+#include <optional>
 
 #include "commands.h"
-#include "elements.h"
+#include "files.h"
 #include "json.h"
 #include "output.h"
 #include "text.h"
 #include "text_table.h"
+#include "values.h"
 
 namespace tool {
 namespace {
@@ -16,131 +18,144 @@ using Align = TextTable::Align;
 
 // ---- Lists ----
 
-void show_list(Output& output, const std::vector<Parameter>& parameters) {
+void show_list(Output& output, const tevpf::List& list) {
+  std::vector<tevpf::Parameter> parameters;
+  for (const tevpf::Parameter& p : list) parameters.push_back(p);
   TextTable text;
   for (const char* heading : {"name", "value", "units", "bounds", "description"}) {
     text.add_column(heading, Align::kLeft);
   }
   text.write(output, parameters.size(), [&](std::size_t row, std::size_t column) {
-    const Parameter& p = parameters[row];
+    const tevpf::Parameter& p = parameters[row];
     switch (column) {
       case 0:
-        return p.name;
+        return p.name();
       case 1:
-        return display_text(p.value, p.precision);
+        return display_text(p.value(), p.precision());
       case 2:
-        return p.units;
+        return p.units();
       case 3:
-        return bounds_text(p.bounds, {});
+        return bounds_text(p.bounds(), {});
       default:
-        return p.description;
+        return p.description();
     }
   });
 }
 
-Json bounds_json(Json json, const std::optional<Bounds>& bounds, std::int32_t precision) {
-  if (bounds) {
+// What parameters and columns have in common, behind their own members.
+template <class Definition>
+Json with_definition(Json json, const Definition& definition) {
+  if (const auto& bounds = definition.bounds()) {
     json["min"] = value_json(bounds->min);
     json["max"] = value_json(bounds->max);
   }
-  if (precision > 0) json["precision"] = precision;
+  if (definition.precision() > 0) json["precision"] = definition.precision();
+  json["units"] = definition.units();
+  json["description"] = definition.description();
   return json;
 }
 
-Json parameter_json(const Parameter& p) {
-  Json json = {{"name", p.name}, {"type", type_word(p.type)}, {"value", value_json(p.value)}};
-  json = bounds_json(std::move(json), p.bounds, p.precision);
-  json["units"] = p.units;
-  json["description"] = p.description;
-  return json;
+void show_list_json(Output& output, const tevpf::List& list, const tevpf::Element& element) {
+  Json json = {{"list", element.name}, {"description", element.description}};
+  json["parameters"] = Json::array();
+  for (const tevpf::Parameter& p : list) {
+    json["parameters"].push_back(with_definition({{"name", p.name()},
+                                                  {"type", tevpf::to_string(p.type())},
+                                                  {"value", value_json(p.value())}},
+                                                 p));
+  }
+  output.write(json_text(json, 1) + "\n");
 }
 
 // ---- Tables ----
 
-Json column_json(const Column& c) {
-  Json json = {{"name", c.name}, {"type", type_word(c.type)}, {"width", c.width}};
-  json = bounds_json(std::move(json), c.bounds, c.precision);
-  json["units"] = c.units;
-  json["description"] = c.description;
-  json["indexed"] = c.indexed;
-  json["unique"] = c.unique;
+Json column_json(const tevpf::Column& c) {
+  Json json = with_definition(
+      {{"name", c.name()}, {"type", tevpf::to_string(c.type())}, {"width", c.width()}}, c);
+  json["indexed"] = c.is_indexed();
+  json["unique"] = c.is_unique();
   return json;
 }
 
-// The columns to show, each --columns being one name or several with commas between them.
-std::vector<std::size_t> chosen_columns(const Table& table, const std::vector<std::string>& names) {
-  const std::vector<Column>& all = table.columns();
+// What of a table is shown: columns by position and rows by number, in the order asked for.
+struct Selection {
+  Columns all;
+  std::vector<std::size_t> columns, rows;
+};
+
+// Each --columns is one name, or several with commas between them.
+std::vector<std::size_t> chosen_columns(const Columns& all, const std::vector<std::string>& names) {
   std::vector<std::size_t> chosen;
   if (names.empty()) {
     chosen.resize(all.size());
     std::iota(chosen.begin(), chosen.end(), std::size_t{0});
   }
   for (const std::string& name : names) {
-    const bool is_one_name =
-        std::any_of(all.begin(), all.end(), [&](const Column& c) { return c.name == name; });
+    const bool is_one_name = all.has(name);
     for (std::size_t begin = 0; begin <= name.size();) {
       const std::size_t end =
           is_one_name ? name.size() : std::min(name.find(',', begin), name.size());
-      chosen.push_back(table.column_position(name.substr(begin, end - begin)));
+      chosen.push_back(all.position_of(name.substr(begin, end - begin)));
       begin = end + 1;
     }
   }
   return chosen;
 }
 
-// The rows to show, in the order asked for.
-std::vector<std::size_t> chosen_rows(Table& table, const Arguments& arguments) {
-  std::vector<std::size_t> rows(table.row_count());
-  std::iota(rows.begin(), rows.end(), std::size_t{0});
-  if (!arguments.sort.empty()) {
-    const std::size_t column = table.column_position(arguments.sort);
-    std::vector<Value> keys;
-    keys.reserve(rows.size());
-    for (const std::size_t row : rows) {
-      table.read_row(row);
-      keys.push_back(table.cell(column));
-    }
-    std::stable_sort(rows.begin(), rows.end(),
-                     [&](std::size_t a, std::size_t b) { return comes_before(keys[a], keys[b]); });
-  }
-  const std::size_t last = arguments.to == 0 ? rows.size() : std::min(arguments.to, rows.size());
-  const std::size_t first = arguments.from == 0 ? 0 : std::min(arguments.from - 1, last);
-  return {rows.begin() + static_cast<std::ptrdiff_t>(first),
-          rows.begin() + static_cast<std::ptrdiff_t>(last)};
+void sort_rows(std::vector<std::size_t>& rows, const tevpf::Table& table, std::size_t column) {
+  std::vector<Value> keys;
+  keys.reserve(rows.size());
+  for (const tevpf::RowView row : table) keys.push_back(row.value(column));
+  std::stable_sort(rows.begin(), rows.end(),
+                   [&](std::size_t a, std::size_t b) { return comes_before(keys[a], keys[b]); });
 }
 
-void show_table(Output& output, Table& table, const std::vector<std::size_t>& columns,
-                const std::vector<std::size_t>& rows) {
+Selection select(const tevpf::File& file, const tevpf::Table& table, const Arguments& arguments) {
+  const Columns all(file, table);
+  const std::vector<std::size_t> columns = chosen_columns(all, arguments.columns);
+  std::vector<std::size_t> rows(table.size());
+  std::iota(rows.begin(), rows.end(), std::size_t{0});
+  if (!arguments.sort.empty()) sort_rows(rows, table, all.position_of(arguments.sort));
+  if (arguments.to != 0) rows.resize(std::min(arguments.to, rows.size()));
+  const std::size_t skipped = arguments.from == 0 ? 0 : std::min(arguments.from - 1, rows.size());
+  rows.erase(rows.begin(), rows.begin() + static_cast<std::ptrdiff_t>(skipped));
+  return {all, columns, rows};
+}
+
+void show_table(Output& output, const tevpf::Table& table, const Selection& selection) {
   TextTable text;
-  for (const std::size_t column : columns) {
-    const Column& c = table.columns()[column];
-    text.add_column(c.units.empty() ? c.name : c.name + " [" + c.units + "]",
-                    is_number(c.type) ? Align::kRight : Align::kLeft);
+  for (const std::size_t column : selection.columns) {
+    const tevpf::Column& c = selection.all[column];
+    text.add_column(c.units().empty() ? c.name() : c.name() + " [" + c.units() + "]",
+                    c.type() == Type::string ? Align::kLeft : Align::kRight);
   }
-  text.write(output, rows.size(), [&](std::size_t row, std::size_t column) {
-    if (column == 0) table.read_row(rows[row]);
-    return display_text(table.cell(columns[column]), table.columns()[columns[column]].precision);
+  std::optional<tevpf::Row> current;
+  text.write(output, selection.rows.size(), [&](std::size_t row, std::size_t i) {
+    if (i == 0) current = table.row(selection.rows[row]);
+    const std::size_t column = selection.columns[i];
+    return display_text(current->value(column), selection.all[column].precision());
   });
 }
 
 // Rows are written one by one, so that a large table needs no JSON in memory.
-void show_table_json(Output& output, Table& table, const Element& element,
-                     const std::vector<std::size_t>& columns,
-                     const std::vector<std::size_t>& rows) {
+void show_table_json(Output& output, const tevpf::Table& table, const tevpf::Element& element,
+                     const Selection& selection) {
   Json definitions = Json::array();
-  for (const std::size_t column : columns) {
-    definitions.push_back(column_json(table.columns()[column]));
+  for (const std::size_t column : selection.columns) {
+    definitions.push_back(column_json(selection.all[column]));
   }
   output.write("{\"table\": " + json_text(element.name) +
                ",\n\"description\": " + json_text(element.description) +
                ",\n\"columns\": " + json_text(definitions, 1) + ",\n\"rows\": [");
-  for (std::size_t i = 0; i < rows.size(); ++i) {
-    table.read_row(rows[i]);
-    Json row = Json::object();
-    for (const std::size_t column : columns) {
-      row[table.columns()[column].name] = value_json(table.cell(column));
+  const char* separator = "\n";
+  for (const std::size_t number : selection.rows) {
+    const tevpf::Row row = table.row(number);
+    Json json = Json::object();
+    for (const std::size_t column : selection.columns) {
+      json[selection.all[column].name()] = value_json(row.value(column));
     }
-    output.write((i == 0 ? "\n" : ",\n") + json_text(row));
+    output.write(separator + json_text(json));
+    separator = ",\n";
   }
   output.write("\n]}\n");
 }
@@ -157,29 +172,18 @@ void refuse_table_options(const Arguments& arguments) {
 }  // namespace
 
 ExitStatus run_show(const Arguments& arguments) {
-  const PfFile file = PfFile::open_to_read(arguments.file);
-  const Element element = file.find(arguments.element, arguments.kind());
-  Output output({}, file.path());
-  if (element.kind == Kind::kList) {
+  const tevpf::File file = open_to_read(arguments.file);
+  const tevpf::Element element = find_element(file, arguments.element, arguments.kind());
+  Output output({}, file.name());
+  if (element.kind == tevpf::Kind::list) {
     refuse_table_options(arguments);
-    const std::vector<Parameter> parameters = read_list(file, element.name);
-    if (arguments.json) {
-      Json list = {{"list", element.name}, {"description", element.description}};
-      list["parameters"] = Json::array();
-      for (const Parameter& p : parameters) list["parameters"].push_back(parameter_json(p));
-      output.write(json_text(list, 1) + "\n");
-    } else {
-      show_list(output, parameters);
-    }
+    const tevpf::List list = file.list(element.name);
+    arguments.json ? show_list_json(output, list, element) : show_list(output, list);
   } else {
-    Table table(file, element.name);
-    const std::vector<std::size_t> columns = chosen_columns(table, arguments.columns);
-    const std::vector<std::size_t> rows = chosen_rows(table, arguments);
-    if (arguments.json) {
-      show_table_json(output, table, element, columns, rows);
-    } else {
-      show_table(output, table, columns, rows);
-    }
+    const tevpf::Table table = file.table(element.name);
+    const Selection selection = select(file, table, arguments);
+    arguments.json ? show_table_json(output, table, element, selection)
+                   : show_table(output, table, selection);
   }
   output.finish();
   return finish_reading(file);

@@ -1,16 +1,16 @@
 #include "table_import.h"
 
 #include <algorithm>
-#include <cstring>
 #include <limits>
-#include <type_traits>
+#include <optional>
+#include <utility>
 #include <vector>
 
 #include "csv.h"
-#include "elements.h"
-#include "messages.h"
-#include "tevpf.h"
+#include "failure.h"
+#include "find.h"
 #include "text.h"
+#include "values.h"
 
 namespace tool {
 namespace {
@@ -56,12 +56,12 @@ void fit(Shape& shape, std::string_view field) {
   }
   if (!shape.numbers) return;
   Value value;
-  if (would_lose_digits(text) || parse_value(PF_TYPE_DOUBLE, text, value) != Parsed::kValue) {
+  if (would_lose_digits(text) || parse_value(Type::float64, text, value) != Parsed::kValue) {
     shape.numbers = false;
     return;
   }
   const double number = std::get<double>(value);
-  shape.integers = shape.integers && parse_value(PF_TYPE_INT, text, value) == Parsed::kValue;
+  shape.integers = shape.integers && parse_value(Type::int32, text, value) == Parsed::kValue;
   if (!std::any_of(text.begin(), text.end(), is_digit)) {
     shape.has_infinity = shape.has_infinity || !is_nan(number);
     return;
@@ -70,28 +70,20 @@ void fit(Shape& shape, std::string_view field) {
   shape.precision = std::clamp(significant_digits(number), shape.precision, kMostPrecision);
 }
 
-std::int32_t type_of(const Shape& shape) {
-  if (!shape.numbers || !shape.has_digits) return PF_TYPE_STRING;
-  return shape.integers && !shape.has_empty ? PF_TYPE_INT : PF_TYPE_DOUBLE;
+Type type_of(const Shape& shape) {
+  if (!shape.numbers || !shape.has_digits) return Type::string;
+  return shape.integers && !shape.has_empty ? Type::int32 : Type::float64;
 }
 
-void define_column(const PfFile& file, const std::string& table, const std::string& name,
-                   const Shape& shape) {
-  const std::int32_t type = type_of(shape);
-  TEVPF_COL_DEF def{};
-  require(TEV8R1_PF_inq_col_dft(table.c_str(), type, &def), file.path(), "make a column");
-  def.description = nullptr;  // the templates of a new table have none
-  std::memcpy(def.name, name.c_str(), name.size() + 1);
-  if (type == PF_TYPE_STRING) def.width = static_cast<std::int32_t>(shape.longest);
-  if (type == PF_TYPE_DOUBLE) {
-    def.limits.f64.precision = shape.precision;
-    def.width = shape.precision + 7;  // sign, point and exponent
-    if (shape.has_infinity) {
-      def.limits.f64.max = std::numeric_limits<double>::infinity();
-      def.limits.f64.min = -std::numeric_limits<double>::infinity();
-    }
+tevpf::Column column_for(const std::string& name, const Shape& shape) {
+  tevpf::Column column(name, type_of(shape));
+  if (column.type() == Type::string) column.width(static_cast<std::int32_t>(shape.longest));
+  if (column.type() == Type::float64) {
+    static constexpr double kInfinity = std::numeric_limits<double>::infinity();
+    column.precision(shape.precision).width(shape.precision + 7);  // sign, point and exponent
+    if (shape.has_infinity) column.bounds(-kInfinity, kInfinity);
   }
-  require(TEV8R1_PF_def_column(table.c_str(), def), file.path(), "make a column");
+  return column;
 }
 
 // ---- Reading rows ----
@@ -122,7 +114,7 @@ bool next_row(CsvReader& reader, CsvRecord& record, std::size_t fields) {
   return true;
 }
 
-void make_table(const PfFile& file, const std::string& table, const CsvText& csv) {
+tevpf::Table make_table(tevpf::File& file, const std::string& name, const CsvText& csv) {
   CsvReader reader(csv.text, csv.name);
   const std::vector<std::string> names = read_header(reader);
   std::vector<Shape> shapes(names.size());
@@ -130,111 +122,94 @@ void make_table(const PfFile& file, const std::string& table, const CsvText& csv
   while (next_row(reader, record, names.size())) {
     for (std::size_t i = 0; i < names.size(); ++i) fit(shapes[i], record.fields[i]);
   }
-  if (!file.has(Kind::kTable, table)) {
-    require(TEV8R1_PF_create_elem(table.c_str(), "", PF_ELEM_TABLE), file.path(), "make the table");
-  }
-  for (std::size_t i = 0; i < names.size(); ++i) define_column(file, table, names[i], shapes[i]);
+  std::optional<tevpf::Table> table = file.find_table(name);
+  if (!table) table = file.create_table(name);
+  for (std::size_t i = 0; i < names.size(); ++i) table->add_column(column_for(names[i], shapes[i]));
+  return *table;
 }
 
 class RowLoader {
  public:
-  RowLoader(const PfFile& file, const std::string& table, const CsvText& csv)
-      : table_(file, table), reader_(csv.text, csv.name) {
+  RowLoader(const tevpf::File& file, tevpf::Table table, const CsvText& csv)
+      : table_(std::move(table)), columns_(file, table_), reader_(csv.text, csv.name) {
     for (const std::string& name : read_header(reader_)) {
-      columns_.push_back(&table_.columns()[table_.column_position(name)]);
+      positions_.push_back(columns_.position_of(name));
     }
-    default_row_.resize(table_.row_size());
-    require(TEV8R1_PF_inq_dft_row(table.c_str(), default_row_.data()), file.path(), "read a row");
   }
 
   std::size_t load_all() {
+    const tevpf::Row default_row = table_.new_row();
     std::size_t count = 0;
-    for (CsvRecord record; next_row(reader_, record, columns_.size()); ++count) {
-      row_ = default_row_;
-      for (std::size_t i = 0; i < columns_.size(); ++i) {
-        store(*columns_[i], record.fields[i], record.line);
+    for (CsvRecord record; next_row(reader_, record, positions_.size()); ++count) {
+      tevpf::Row row = default_row;
+      for (std::size_t i = 0; i < positions_.size(); ++i) {
+        row.set(positions_[i], value_of(column(i), record.fields[i], record.line));
       }
-      const TEVPF_STATUS status = TEV8R1_PF_add_row(table_.name().c_str(), row_.data());
-      if (status != PF_NORMAL) refuse_row(status, record);
+      try {
+        table_.append(row);
+      } catch (const tevpf::Error& error) {
+        refuse_row(error, record);
+      }
     }
     return count;
   }
 
  private:
-  [[noreturn]] void refuse(const Column& column, std::size_t line, const std::string& why) {
-    reader_.fail(line, "column " + in_quotes(column.name) + ": " + why + "; nothing was imported");
+  const tevpf::Column& column(std::size_t field) const { return columns_[positions_[field]]; }
+
+  [[noreturn]] void refuse(const tevpf::Column& column, std::size_t line, const std::string& why) {
+    reader_.fail(line,
+                 "column " + in_quotes(column.name()) + ": " + why + "; nothing was imported");
   }
 
-  void store(const Column& column, const std::string& field, std::size_t line) {
-    if (column.type == PF_TYPE_STRING) {
-      store_text(column, field, line);
-      return;
-    }
-    const bool is_empty = trimmed(field).empty();
-    if (is_empty && !is_floating(column.type)) {
-      refuse(column, line, "the field is empty, but an integer column needs a number in each row");
-    }
-    Value value;
-    const Parsed parsed = parse_value(column.type, is_empty ? "nan" : field, value);
-    if (parsed != Parsed::kValue) {
-      refuse(column, line, refused_value(field, column.type, parsed, column.bounds, column.units));
-    }
-    // What is not a number equals everything: it would spoil the order of an index.
-    if (column.indexed && is_nan(value)) {
-      refuse(column, line, "the column has an index, so each row needs a number");
-    }
-    std::visit(
-        [&](const auto& v) {
-          if constexpr (!std::is_same_v<std::decay_t<decltype(v)>, std::string>) {
-            std::memcpy(row_.data() + column.offset, &v, sizeof v);
-          }
-        },
-        value);
-  }
-
-  void store_text(const Column& column, const std::string& field, std::size_t line) {
-    const auto width = static_cast<std::size_t>(column.width);
-    if (field.size() > width) {
+  Value value_of(const tevpf::Column& column, const std::string& field, std::size_t line) {
+    if (column.type() == Type::string) {
+      const auto width = static_cast<std::size_t>(column.width());
+      if (field.size() <= width) return field;
       refuse(column, line,
              "the text has " + counted(field.size(), "byte") + ", the column holds " +
                  std::to_string(width));
     }
-    char* cell = row_.data() + column.offset;
-    std::memset(cell, 0, width + 1);
-    std::memcpy(cell, field.c_str(), field.size() + 1);
-  }
-
-  // The library names the value but not the column: look for the first one that refuses its value.
-  [[noreturn]] void refuse_row(TEVPF_STATUS status, const CsvRecord& record) {
-    for (std::size_t i = 0; i < columns_.size(); ++i) {
-      const Column& column = *columns_[i];
-      if (TEV8R1_validate_row_value(table_.name().c_str(), column.name.c_str(),
-                                    row_.data() + column.offset) != status) {
-        continue;
-      }
-      if (status == PF_RANGE) {
-        refuse(column, record.line,
-               refused_value(record.fields[i], column.type, Parsed::kOutOfRange, column.bounds,
-                             column.units));
-      }
-      refuse(column, record.line, reason(status));
+    const bool is_empty = trimmed(field).empty();
+    if (is_empty && !is_floating(column.type())) {
+      refuse(column, line, "the field is empty, but an integer column needs a number in each row");
     }
-    reader_.fail(record.line, reason(status) + "; nothing was imported");
+    Value value;
+    const Parsed parsed = parse_value(column.type(), is_empty ? "nan" : field, value);
+    if (parsed != Parsed::kValue) refuse(column, line, refused_value(field, parsed, column));
+    // What is not a number equals everything: it would spoil the order of an index.
+    if (column.is_indexed() && is_nan(value)) {
+      refuse(column, line, "the column has an index, so each row needs a number");
+    }
+    return value;
   }
 
-  Table table_;
+  [[noreturn]] void refuse_row(const tevpf::Error& error, const CsvRecord& record) {
+    for (std::size_t i = 0; i < positions_.size(); ++i) {
+      if (error.status() == PF_RANGE && column(i).name() == error.value()) {
+        refuse(column(i), record.line,
+               refused_value(record.fields[i], Parsed::kOutOfRange, column(i)));
+      }
+    }
+    reader_.fail(record.line, visible(error.what()) + "; nothing was imported");
+  }
+
+  tevpf::Table table_;
+  Columns columns_;
   CsvReader reader_;
-  std::vector<const Column*> columns_;  // in the order of the fields
-  std::vector<char> default_row_, row_;
+  std::vector<std::size_t> positions_;  // of the fields' columns
 };
 
 }  // namespace
 
-std::size_t import_csv(const PfFile& file, const std::string& table, const CsvText& csv) {
-  if (!file.has(Kind::kTable, table) || Table(file, table).columns().empty()) {
-    make_table(file, table, csv);
+std::size_t import_csv(tevpf::File& file, const std::string& name, const CsvText& csv) {
+  std::optional<tevpf::Table> table = file.find_table(name);
+  if (!table && file.find_list(name)) {
+    throw Failure(kRefused, visible(file.name()) + ": " + in_quotes(name) +
+                                " is a list; rows go into tables, so choose another name");
   }
-  return RowLoader(file, table, csv).load_all();
+  if (!table || table->columns().empty()) table = make_table(file, name, csv);
+  return RowLoader(file, *std::move(table), csv).load_all();
 }
 
 }  // namespace tool

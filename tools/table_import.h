@@ -6,7 +6,7 @@
 #include <string>
 #include <string_view>
 
-#include "pf_file.h"
+#include "tevpf.hpp"
 
 namespace tool {
 
@@ -16,6 +16,6 @@ struct CsvText {
 
 // Adds all rows behind those that are there and returns their number. A Failure names the line; the
 // file in memory then holds a part of them and must not be saved.
-std::size_t import_csv(const PfFile& file, const std::string& table, const CsvText& csv);
+std::size_t import_csv(tevpf::File& file, const std::string& table, const CsvText& csv);
 
 }  // namespace tool

@@ -26,7 +26,8 @@ _tevpf() {
   case ${COMP_WORDS[1]} in
     info) options+=" --json --names" ;;
     show) options+=" --columns --sort --from --to --json --list --table" ;;
-    dump | export) options+=" -o --output --list --table" ;;
+    dump) options+=" -o --output --list --table --force" ;;
+    export) options+=" -o --output --list --table" ;;
     rm | cp | mv) options+=" --list --table" ;;
   esac
   case $previous in

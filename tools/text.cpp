@@ -46,13 +46,19 @@ std::string escape(char byte) {
   return {'\\', 'x', kDigits[value >> 4U], kDigits[value & 0xFU]};
 }
 
-}  // namespace
+// The bytes at the front of a text that lay out lines.
+std::size_t layout_sequence(std::string_view text) {
+  if (text[0] == '\n' || text[0] == '\t' || text[0] == '\f') return 1;
+  return text.starts_with("\r\n") ? 2 : 0;
+}
 
-std::string visible(std::string_view text) {
+std::size_t nothing(std::string_view) { return 0; }
+
+std::string escaped(std::string_view text, std::size_t (*kept)(std::string_view)) {
   std::string result;
   result.reserve(text.size());
   while (!text.empty()) {
-    const std::size_t size = printable_sequence(text);
+    const std::size_t size = std::max(printable_sequence(text), kept(text));
     if (size > 0) {
       result += text.substr(0, size);
     } else {
@@ -62,6 +68,12 @@ std::string visible(std::string_view text) {
   }
   return result;
 }
+
+}  // namespace
+
+std::string visible(std::string_view text) { return escaped(text, nothing); }
+
+std::string visible_lines(std::string_view text) { return escaped(text, layout_sequence); }
 
 std::string in_quotes(std::string_view text) { return "'" + visible(text) + "'"; }
 
@@ -76,7 +88,7 @@ std::string_view trimmed(std::string_view text) {
   return text.substr(first, text.find_last_not_of(" \t") - first + 1);
 }
 
-std::string counted(std::size_t count, std::string_view noun) {
+std::string counted(std::uintmax_t count, std::string_view noun) {
   std::string result = std::to_string(count) + " ";
   result += noun;
   if (count != 1) result += 's';

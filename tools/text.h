@@ -2,6 +2,7 @@
 #pragma once
 
 #include <cstddef>
+#include <cstdint>
 #include <string>
 #include <string_view>
 
@@ -9,6 +10,9 @@ namespace tool {
 
 // Control characters as \n, \t, \r or \xNN, and so every byte that is not well-formed UTF-8.
 std::string visible(std::string_view text);
+
+// The same for whole lines: line ends, tabs and page ends stay as they are.
+std::string visible_lines(std::string_view text);
 
 // 'text', made visible.
 std::string in_quotes(std::string_view text);
@@ -19,6 +23,6 @@ std::size_t display_width(std::string_view text);
 std::string_view trimmed(std::string_view text);  // without blanks and tabs at both ends
 
 // "1 row", "2 rows".
-std::string counted(std::size_t count, std::string_view noun);
+std::string counted(std::uintmax_t count, std::string_view noun);
 
 }  // namespace tool

@@ -5,21 +5,13 @@
 #include <charconv>
 #include <cmath>
 #include <cstdio>
-#include <cstring>
+#include <limits>
 #include <type_traits>
 
-#include "tevpf.h"
 #include "text.h"
 
 namespace tool {
 namespace {
-
-template <class T>
-T load(const void* bytes) {
-  T value;
-  std::memcpy(&value, bytes, sizeof value);
-  return value;
-}
 
 template <class T>
 Parsed parse_number(std::string_view text, Value& value) {
@@ -35,58 +27,39 @@ Parsed parse_number(std::string_view text, Value& value) {
   return Parsed::kValue;
 }
 
+bool is_whole_range(const tevpf::Bounds& bounds) {
+  return std::visit(
+      [&](const auto& min) {
+        using T = std::decay_t<decltype(min)>;
+        if constexpr (std::is_same_v<T, std::string>) {
+          return true;
+        } else {
+          return min <= std::numeric_limits<T>::lowest() &&
+                 std::get<T>(bounds.max) >= std::numeric_limits<T>::max();
+        }
+      },
+      bounds.min);
+}
+
 }  // namespace
 
-const char* type_word(std::int32_t type) {
+bool is_floating(Type type) { return type == Type::float32 || type == Type::float64; }
+
+Parsed parse_value(Type type, std::string_view text, Value& value) {
   switch (type) {
-    case PF_TYPE_INT:
-      return "integer";
-    case PF_TYPE_REAL:
-      return "real";
-    case PF_TYPE_STRING:
-      return "string";
-    case PF_TYPE_DOUBLE:
-      return "double";
-    case PF_TYPE_SHORT:
-      return "short";
-    default:
-      return "unknown";
-  }
-}
-
-bool is_number(std::int32_t type) { return type != PF_TYPE_STRING; }
-
-bool is_floating(std::int32_t type) { return type == PF_TYPE_REAL || type == PF_TYPE_DOUBLE; }
-
-Value load_value(std::int32_t type, const void* bytes) {
-  switch (type) {
-    case PF_TYPE_INT:
-      return load<std::int32_t>(bytes);
-    case PF_TYPE_SHORT:
-      return load<std::int16_t>(bytes);
-    case PF_TYPE_REAL:
-      return load<float>(bytes);
-    case PF_TYPE_DOUBLE:
-      return load<double>(bytes);
-    default:
-      return std::string(static_cast<const char*>(bytes));
-  }
-}
-
-Parsed parse_value(std::int32_t type, std::string_view text, Value& value) {
-  switch (type) {
-    case PF_TYPE_INT:
+    case Type::int32:
       return parse_number<std::int32_t>(text, value);
-    case PF_TYPE_SHORT:
+    case Type::int16:
       return parse_number<std::int16_t>(text, value);
-    case PF_TYPE_REAL:
+    case Type::float32:
       return parse_number<float>(text, value);
-    case PF_TYPE_DOUBLE:
+    case Type::float64:
       return parse_number<double>(text, value);
-    default:
-      value = std::string(text);
-      return Parsed::kValue;
+    case Type::string:
+      break;
   }
+  value = std::string(text);
+  return Parsed::kValue;
 }
 
 std::string exact_text(const Value& value) {
@@ -126,6 +99,24 @@ bool is_nan(const Value& value) {
 bool comes_before(const Value& a, const Value& b) {
   if (is_nan(a) || is_nan(b)) return !is_nan(a) && is_nan(b);
   return a < b;
+}
+
+std::string bounds_text(const std::optional<tevpf::Bounds>& bounds, const std::string& units) {
+  if (!bounds || is_whole_range(*bounds)) return {};
+  return exact_text(bounds->min) + " to " + exact_text(bounds->max) +
+         (units.empty() ? "" : " " + visible(units));
+}
+
+std::string refused_value(const std::string& text, Parsed parsed, Type type,
+                          const std::string& bounds) {
+  const std::string word = tevpf::to_string(type);
+  const std::string article = type == Type::int32 ? "an " : "a ";
+  if (parsed == Parsed::kNotANumber) {
+    return in_quotes(text) + " is not " + article + word +
+           (bounds.empty() ? "" : "; give a number from " + bounds);
+  }
+  if (!bounds.empty()) return visible(text) + " is out of range; it must lie within " + bounds;
+  return visible(text) + " does not fit " + article + word;
 }
 
 }  // namespace tool

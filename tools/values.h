@@ -1,28 +1,25 @@
-// Values of the five types outside the library: read from and written as text that reads back
-// exactly.
+// Values as text: read, and written so that they read back exactly.
 #pragma once
 
 #include <cstdint>
+#include <optional>
 #include <string>
 #include <string_view>
-#include <variant>
+
+#include "tevpf.hpp"
 
 namespace tool {
 
-using Value = std::variant<std::int32_t, std::int16_t, float, double, std::string>;
+using tevpf::Type;
+using tevpf::Value;
 
-const char* type_word(std::int32_t type);  // integer, real, string, double, short
-bool is_number(std::int32_t type);         // any of the four types that are not text
-bool is_floating(std::int32_t type);       // real or double
-
-// A value of the type from its binary form, at any address; texts end at their terminator.
-Value load_value(std::int32_t type, const void* bytes);
+bool is_floating(Type type);  // real or double
 
 enum class Parsed { kValue, kNotANumber, kOutOfRange };
 
 // Reads text as a value of the type. Numbers may have blanks around them and a sign; "nan" and
 // "inf" are numbers of the floating types.
-Parsed parse_value(std::int32_t type, std::string_view text, Value& value);
+Parsed parse_value(Type type, std::string_view text, Value& value);
 
 // The shortest text that reads back as the same value.
 std::string exact_text(const Value& value);
@@ -34,5 +31,20 @@ bool is_nan(const Value& value);
 
 // Numbers by size, what is not a number last; texts by their bytes. Both values are of one type.
 bool comes_before(const Value& a, const Value& b);
+
+// "0 to 3000 rpm"; empty when the bounds only say what the type can hold.
+std::string bounds_text(const std::optional<tevpf::Bounds>& bounds, const std::string& units);
+
+// Why a text is refused that is no value of the type, or lies outside the bounds: the end of a
+// sentence. `bounds`: their text.
+std::string refused_value(const std::string& text, Parsed parsed, Type type,
+                          const std::string& bounds);
+
+// The same for a value of a parameter or a column.
+template <class Definition>
+std::string refused_value(const std::string& text, Parsed parsed, const Definition& definition) {
+  return refused_value(text, parsed, definition.type(),
+                       bounds_text(definition.bounds(), definition.units()));
+}
 
 }  // namespace tool

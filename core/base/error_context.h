@@ -1,5 +1,5 @@
-// The error context itself: the texts of the most recent failure. Written by core/status alone;
-// read by the command-line tool and the tests, which link the static library.
+// The error context itself: the texts of the most recent failure. Written by core/base/status alone;
+// read by core/base/message and by the tests, which link the static library.
 #pragma once
 
 namespace tevpf {

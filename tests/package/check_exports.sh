@@ -1,9 +1,11 @@
 #!/usr/bin/env bash
-# check_exports.sh LIBRARY LIST: the symbols that the shared library (.so or .dll) exports are those
-# of the sorted list, no more and no fewer.
+# check_exports.sh LIBRARY LIST...: the symbols that the shared library (.so or .dll) exports are those
+# of the lists, no more and no fewer.
 set -euo pipefail
 export LC_ALL=C
-library=$1 list=$2
+library=$1
+shift
+listed=$(sort -u "$@")
 
 exported() {
   case $library in
@@ -16,15 +18,15 @@ exported() {
 }
 
 found=$(exported)
-strangers=$(comm -13 "$list" <(printf '%s\n' "$found"))
-missing=$(comm -23 "$list" <(printf '%s\n' "$found"))
+strangers=$(comm -13 <(printf '%s\n' "$listed") <(printf '%s\n' "$found"))
+missing=$(comm -23 <(printf '%s\n' "$listed") <(printf '%s\n' "$found"))
 status=0
 if [[ -n $strangers ]]; then
-  printf 'exported, but not in the list:\n%s\n' "$strangers"
+  printf 'exported, but not in the lists:\n%s\n' "$strangers"
   status=1
 fi
 if [[ -n $missing ]]; then
-  printf 'in the list, but not exported:\n%s\n' "$missing"
+  printf 'in the lists, but not exported:\n%s\n' "$missing"
   status=1
 fi
 exit "$status"

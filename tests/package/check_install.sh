@@ -1,10 +1,11 @@
 #!/usr/bin/env bash
-# check_install.sh BUILD WORK CMAKE CC TOOLCHAIN CFLAGS: installs the build into a fresh folder,
-# then builds and runs the README's program against it in the three ways a user would: find_package
-# with the shared library, with the static one, and pkg-config.
+# check_install.sh BUILD WORK CMAKE CC CXX TOOLCHAIN CFLAGS: installs the build into a fresh folder, then
+# builds and runs programs against it in the ways a user would: with find_package, shared and static, and
+# with pkg-config, as C99, C++20 and C++23, with CC and CXX and, where there is one, clang.
 set -euo pipefail
-build=$1 work=$2 cmake=$3 cc=$4 toolchain=$5 cflags=$6
-source=$(cd "$(dirname "${BASH_SOURCE[0]}")/consumer" && pwd)
+build=$1 work=$2 cmake=$3 cc=$4 cxx=$5 toolchain=$6 cflags=$7
+here=$(cd "$(dirname "${BASH_SOURCE[0]}")" && pwd)
+examples=$here/../../examples
 
 rm -rf "$work"
 mkdir -p "$work"
@@ -12,32 +13,66 @@ mkdir -p "$work"
 mv "$work/moved" "$work/prefix" # the tree names no absolute path of its own
 prefix=$work/prefix
 
-program=$work/readme.c
-awk '/^```c$/ { code = 1; next } /^```/ { code = 0 } code' "$source/../../../README.md" >"$program"
-printf '%s\n' "Thrust is 480 kN" "900 kN is out of range; the value is as before" >"$work/said"
+# What the README shows are the examples, and what they print.
+shown() { # shown LANGUAGE: the README's blocks in it
+  awk -v fence="\`\`\`$1" '$0 == fence { inside = 1; next } /^```/ { inside = 0 } inside' \
+    "$here/../../README.md"
+}
+shown c | diff - "$examples/engine.c"
+shown cpp | diff - "$examples/engine.cpp"
+shown text >"$work/engine.cpp.said"
+printf '%s\n' "Thrust is 480 kN" "900 kN is out of range; the value is as before" >"$work/engine.c.said"
+: >"$work/interface.cpp.said"
 
-run() { # run LABEL PROGRAM: it makes its file, finds its value there again and keeps it
-  for _ in new again; do
-    (cd "$work" && "$2") | diff - "$work/said" || { echo "$1: the program failed"; exit 1; }
+run() { # run LABEL PROGRAM SOURCE: it makes its file; examples find their values there again
+  local times=(new) said=$work/${3##*/}.said
+  [[ $3 == "$examples"/* ]] && times+=(again)
+  for _ in "${times[@]}"; do
+    (cd "$work" && "$2") | diff - "$said" || { echo "$1: the program failed"; exit 1; }
   done
-  rm "$work/engine.pf"
+  rm -f "$work"/*.pf
   echo "$1: built and ran"
 }
 
 for linkage in shared static; do
-  options=(-G Ninja -DCMAKE_PREFIX_PATH="$prefix" -DCMAKE_C_COMPILER="$cc"
-    -DCMAKE_C_FLAGS="$cflags" -DCMAKE_CXX_FLAGS="$cflags" -DLINKAGE="$linkage" -DPROGRAM="$program")
-  [[ -z $toolchain ]] || options+=(-DCMAKE_TOOLCHAIN_FILE="$toolchain")
-  "$cmake" -S "$source" -B "$work/$linkage" "${options[@]}" >"$work/$linkage.log"
-  "$cmake" --build "$work/$linkage" >>"$work/$linkage.log" || { cat "$work/$linkage.log"; exit 1; }
-  run "find_package, $linkage" "$work/$linkage/consumer"
+  for source in "$examples/engine.c" "$examples/engine.cpp"; do
+    folder=$work/$linkage.${source##*.}
+    options=(-G Ninja -DCMAKE_PREFIX_PATH="$prefix" -DCMAKE_C_COMPILER="$cc"
+      -DCMAKE_CXX_COMPILER="$cxx" -DCMAKE_C_FLAGS="$cflags" -DCMAKE_CXX_FLAGS="$cflags"
+      -DLINKAGE="$linkage" -DPROGRAM="$source")
+    [[ -z $toolchain ]] || options+=(-DCMAKE_TOOLCHAIN_FILE="$toolchain")
+    "$cmake" -S "$here/consumer" -B "$folder" "${options[@]}" >"$folder.log"
+    "$cmake" --build "$folder" >>"$folder.log" || { cat "$folder.log"; exit 1; }
+    run "find_package, $linkage, ${source##*/}" "$folder/consumer" "$source"
+  done
 done
 
 PKG_CONFIG_PATH=$(dirname "$(find "$prefix" -name tevpf.pc)")
 export PKG_CONFIG_PATH
-read -ra flags <<<"$cflags $(pkg-config --cflags tevpf)"
-read -ra libs <<<"$(pkg-config --libs tevpf)"
-"$cc" -std=c99 -Wall -Wextra -Werror "${flags[@]}" "$program" -o "$work/by_pkg_config" "${libs[@]}"
 LD_LIBRARY_PATH=$(pkg-config --variable=libdir tevpf)
 export LD_LIBRARY_PATH
-run pkg-config "$work/by_pkg_config"
+strict=(-Wall -Wextra -Wconversion -Wshadow -Werror)
+read -ra base <<<"$cflags"
+
+by_pkg_config() { # by_pkg_config PACKAGE SOURCE COMPILER...: compiled once, linked shared and static
+  local package=$1 source=$2 linkage flags libs
+  shift 2
+  read -ra flags <<<"$(pkg-config --cflags "$package")"
+  read -ra libs <<<"$(pkg-config --libs "$package")"
+  "$@" "${strict[@]}" "${base[@]}" "${flags[@]}" -c "$source" -o "$work/by_pkg_config.o"
+  for linkage in shared static; do
+    [[ $linkage == shared ]] || libs=("$LD_LIBRARY_PATH/libtevpf.a" -lstdc++ -lm)
+    "$1" "${base[@]}" "$work/by_pkg_config.o" -o "$work/by_pkg_config" "${libs[@]}"
+    run "pkg-config, $* ${source##*/}, $linkage" "$work/by_pkg_config" "$source"
+  done
+}
+
+compilers=("$cxx")
+# Programs of clang cannot be linked to a library with the sanitizers of gcc.
+[[ $cflags == *-fsanitize* ]] || ! command -v clang++ >/dev/null || compilers+=(clang++)
+by_pkg_config tevpf "$examples/engine.c" "$cc" -std=c99
+for compiler in "${compilers[@]}"; do
+  for standard in c++20 c++2b; do
+    by_pkg_config tevpf-cpp "$here/consumer/interface.cpp" "$compiler" "-std=$standard"
+  done
+done

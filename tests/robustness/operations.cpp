@@ -1,5 +1,6 @@
 #include "robustness/operations.h"
 
+#include "core/base/status.h"
 #include "core/file.h"
 #include "core/library.h"
 #include "core/reader.h"
@@ -53,7 +54,7 @@ TEVPF_LIST& list() {
   return *found_list;
 }
 TEVPF_TABLE& table(const char* name = "t") {
-  EXPECT_EQ(TEV8R1_get_table_ptr(name, &found_table), PF_NORMAL);
+  EXPECT_EQ(tevpf::find_table(name, found_table), PF_NORMAL);
   return *found_table;
 }
 
@@ -347,10 +348,11 @@ void add_column_calls(std::vector<Call>& calls) {
     CALL(check_column_values, (&table(), 0, column("int", n), 0), PF_TYPE_INT, 8, 99, 0, 3, 0, 0),
     MORE(calc_col_width, kNoStatus, (n[0], n[1]), 5, 9),
     {"adjust_data", {}, [](Numbers) {
-       TEVPF_TABLE alike = table();
+       PF_TRY(TEV8R1_get_table_ptr("t", &found_table));  // its copy shares no blocks
+       TEVPF_TABLE alike = *found_table;
        alike.slots.bytes = std::int64_t{alike.num_rows} * alike.row_wid;
        alike.row_data = static_cast<unsigned char*>(std::malloc(std::size_t(alike.slots.bytes)));
-       std::memcpy(alike.row_data, table().row_data, std::size_t(alike.slots.bytes));
+       std::memcpy(alike.row_data, found_table->row_data, std::size_t(alike.slots.bytes));
        const TEVPF_STATUS status =
            TEV8R1_adjust_data(&alike, 4, alike.row_wid, 0, &alike.col_array->def);
        std::free(alike.row_data);

@@ -69,6 +69,23 @@ TEST_F(OperationsTest, TheFileIsTheSameFromEveryBuild) {
   EXPECT_TRUE(read_file(dir_ / "other") == read_file(TEVPF_ELEMENTS_FILE));
 }
 
+// Leaves the settled state, as changes in the middle do, of every sequence of a table.
+void unsettle(TEVPF_TABLE& table) {
+  const auto leave = [&](tevpf::Sequence& sequence) {
+    EXPECT_TRUE(sequence.make_ready_to_move(table.num_rows, 0, table.num_rows - 1));
+  };
+  if (table.num_rows < 2) return;
+  leave(table.slots.order);
+  for (TEVPF_COLUMN& column : std::span(table.col_array, table.num_cols)) {
+    if (column.def.idx_flag != 0) leave(column.index);
+  }
+}
+void unsettle_tables() {
+  const TEVPF_FILE& file = *tevpf::library.current_file;
+  for (int i = 0; i < tevpf::directory_of(file, PF_ELEM_TABLE).count; ++i)
+    unsettle(tevpf::table_at(file, i));
+}
+
 // Each request of each operation fails once: it says so, nothing but spare slots has changed, and the same
 // call then succeeds as if nothing had been; or it can do without and nobody notices.
 TEST_F(OperationsTest, EveryRequestForMemoryFailsOnce) {
@@ -78,14 +95,22 @@ TEST_F(OperationsTest, EveryRequestForMemoryFailsOnce) {
     start();
     const TEVPF_STATUS usual = call.run(call.numbers.data());
     const std::string usual_state = snapshot(true), usual_text = read_file(dir_ / "text");
+    bool settled = true;  // then once more for tables that are not
     for (std::int64_t n = 0;; ++n) {
-      SCOPED_TRACE(testing::Message() << call.operation << ", request " << n);
+      SCOPED_TRACE(testing::Message() << call.operation << ", request " << n << ", " << settled);
       start();
       const std::string before = snapshot(false);
+      if (!settled) unsettle_tables();
       set_error_texts();
       tevpf::heap_fail_at(n);
       TEVPF_STATUS status = call.run(call.numbers.data());
-      if (!tevpf::heap_fail_off()) break;
+      if (!tevpf::heap_fail_off()) {
+        // These calls write a table first, which settles it.
+        if (!settled || std::string_view(call.operation).starts_with("format_")) break;
+        settled = false;
+        n = -1;
+        continue;
+      }
       ++requests;
       EXPECT_EQ(broken_rules(), "");
       if (status == PF_NOMEM) {

@@ -371,6 +371,7 @@ class TableModelTest : public TableTest, public testing::WithParamInterface<unsi
 
   void compare() {
     const TEVPF_TABLE& t = table();
+    expect_no_broken_rule();
     ASSERT_EQ(t.num_cols, int(model_.columns.size()));
     ASSERT_EQ(t.num_rows, model_.count());
     // Slots without rows may go with a change of layout.
@@ -384,7 +385,7 @@ class TableModelTest : public TableTest, public testing::WithParamInterface<unsi
     EXPECT_EQ(t.cur_col == nullptr ? "" : t.cur_col->def.name, model_.search);
     for (int i = 0; i < t.num_rows; ++i) {
       SCOPED_TRACE(testing::Message() << "row " << i);
-      compare_bytes(tevpf::row_at(t, slot_of(t, i)), model_.rows[i]);
+      compare_bytes(t, tevpf::row_at(t, slot_of(t, i)), model_.rows[i]);
     }
     for (int i = 0; i < t.num_cols; ++i) {
       const Column& expected = model_.columns[i];
@@ -417,12 +418,11 @@ class TableModelTest : public TableTest, public testing::WithParamInterface<unsi
   }
   void compare_row() {
     const int row = model_.row_at(model_.cur);
-    compare_bytes(out_.data(), model_.rows[row]);
+    compare_bytes(table(), out_.data(), model_.rows[row]);
     EXPECT_EQ(TEV8R1_convert_row("t", model_.cur), row);
   }
 
-  static void compare_bytes(const void* bytes, const Row& expected) {
-    const TEVPF_TABLE& t = table();
+  static void compare_bytes(const TEVPF_TABLE& t, const void* bytes, const Row& expected) {
     ASSERT_EQ(decode(t, bytes), expected);
     if (expected.bytes.empty()) return;
     ASSERT_EQ(std::string(static_cast<const char*>(bytes), t.row_wid), expected.bytes);
@@ -587,7 +587,7 @@ class TableModelTest : public TableTest, public testing::WithParamInterface<unsi
     const Result expected = model_.interactive ? Result{} : model_.check_row(row, -2);
     if (BOTH(expected, TEV8R1_PF_set_dft_row("t", bytes.data()))) model_.defaults = row;
     TEV8R1_PF_inq_dft_row("t", out());
-    compare_bytes(out_.data(), model_.defaults);
+    compare_bytes(table(), out_.data(), model_.defaults);
   }
   void interactive() {
     model_.interactive = !model_.interactive && chance(30);
@@ -695,7 +695,7 @@ class TableModelTest : public TableTest, public testing::WithParamInterface<unsi
     const TEVPF_TABLE& t = settled();
     EXPECT_TRUE(t.slots.order.is_identity());
     for (int i = 0; i < t.num_rows; ++i) {
-      compare_bytes(t.row_data + std::ptrdiff_t{i} * t.row_wid, model_.rows[i]);
+      compare_bytes(t, t.row_data + std::ptrdiff_t{i} * t.row_wid, model_.rows[i]);
     }
     for (size_t i = 0; i < model_.columns.size(); ++i) {
       const Index& index = model_.columns[i].index;

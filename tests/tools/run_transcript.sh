@@ -3,9 +3,11 @@
 # empty folder, and compares what they print, errors included, and their exit status with what stands
 # behind them. Lines that start with "# " are comments. The programs are called by their file names.
 # Of a Markdown text the console blocks are run; they find the examples beside the
-# text, and the programs behind the first one as if they had been built in the folder.
+# text, and the programs behind the first one as if they had been built in the folder. Where nothing can
+# be tested, a line exits with 77; where something cannot, it says so on descriptor 3, the test's log.
 set -uo pipefail
 export LC_ALL=C.UTF-8
+exec 3>&1
 transcript=$(realpath "$1")
 for program in "${@:2}"; do PATH=$(dirname "$(realpath "$program")"):$PATH; done
 folder=$(mktemp -d)

@@ -1,0 +1,187 @@
+#include "files.h"
+
+#include <cstdio>
+#include <filesystem>
+#include <system_error>
+#include <utility>
+
+#include "platform.h"
+#include "text.h"
+
+namespace fs = std::filesystem;
+
+namespace tool {
+namespace {
+
+void check_length(const std::string& path) {
+  if (path.size() < TEVPF_FILE_NAME_SIZE) return;
+  throw Failure(kRefused, visible(path) + ": the path has more than " +
+                              std::to_string(TEVPF_FILE_NAME_SIZE - 1) +
+                              " characters; go to its folder and use the short name");
+}
+
+// Why the library could not open a file.
+std::string obstacle_to_opening(const std::string& path) {
+  std::error_code error;
+  const fs::file_type type = fs::status(path, error).type();
+  if (type == fs::file_type::not_found) return "there is no such file; 'tevpf new' makes one";
+  if (!error && type != fs::file_type::regular) {
+    return "it is not a regular file; name a parameter file";
+  }
+  if (!error) {
+    if (std::FILE* const readable = std::fopen(path.c_str(), "rb")) {
+      std::fclose(readable);
+      return "it cannot be opened or read to its end; check its disk";
+    }
+    error = last_error();
+  }
+  return "it cannot be read: " + error.message();
+}
+
+tevpf::File open(const std::string& path) {
+  check_length(path);
+  try {
+    return tevpf::File::recover(path);
+  } catch (const tevpf::Error& error) {
+    throw Failure(kUnreadable,
+                  visible(path) + ": " +
+                      (error.status() == PF_OPENFAIL ? obstacle_to_opening(path)
+                       : error.status() == PF_BADFILE
+                           ? "it is not a parameter file, or not even its first element is whole"
+                           : visible(error.what())));
+  }
+}
+
+// Where a file ends, or contradicts itself.
+std::string place_of(const tevpf::Error& damage) {
+  static constexpr std::string_view kIndex = " index";
+  const std::string& part = damage.item();
+  const std::string& owner = damage.value();
+  if (part == "table data") return "the rows of table " + in_quotes(owner);
+  if (part == "list index") return "the name index of list " + in_quotes(owner);
+  if (!owner.empty()) {
+    return "the index of column " + in_quotes(part.substr(0, part.size() - kIndex.size())) +
+           " of table " + in_quotes(owner);
+  }
+  return part.empty() ? "the head of an element" : "element " + in_quotes(part);
+}
+
+// What tells whether a file on the disk has been touched.
+struct Stamp {
+  std::uintmax_t size;
+  fs::file_time_type written;
+  explicit Stamp(const std::string& path) {
+    std::error_code ignored;
+    size = fs::file_size(path, ignored);
+    written = fs::last_write_time(path, ignored);
+  }
+  bool operator==(const Stamp&) const = default;
+};
+
+enum class OnDisk { kAsBefore, kTouched };
+
+Failure save_failure(const std::string& path, const std::string& obstacle, OnDisk state) {
+  return {kCannotWrite,
+          visible(path) + ": it cannot be saved: " + obstacle +
+              (state == OnDisk::kTouched ? "; it may hold only a part of its new content"
+                                         : "; it is as it was before")};
+}
+
+std::string obstacle_to_saving(const tevpf::Error& error) {
+  if (error.status() == PF_OPENFAIL) return "its new content could not be written; make room";
+  return visible(error.what());
+}
+
+}  // namespace
+
+tevpf::File open_to_read(const std::string& path) { return open(path); }
+
+ExitStatus finish_reading(const tevpf::File& file) {
+  if (!file.damage()) return kDone;
+  std::fprintf(stderr, "tevpf: %s: it is damaged: %s; shown is what could be read\n",
+               visible(file.name()).c_str(), damage_of(file).c_str());
+  return kUnreadable;
+}
+
+tevpf::File open_to_change(const std::string& path) {
+  tevpf::File file = open(path);
+  if (file.damage()) {
+    throw Failure(kUnreadable,
+                  visible(path) + ": it is damaged: " + damage_of(file) +
+                      "; it was not changed, because what cannot be read would be lost");
+  }
+  if (file.is_read_only()) {
+    throw Failure(kCannotWrite, visible(path) +
+                                    ": it may only be read; change its permissions or "
+                                    "work on a copy");
+  }
+  return file;
+}
+
+void save(tevpf::File& file) {
+  const HoldInterrupts hold;
+  const Stamp before(file.name());
+  try {
+    file.save();
+  } catch (const tevpf::Error& error) {
+    // A file that cannot be replaced in one step was written over.
+    const bool is_touched = Stamp(file.name()) != before;
+    throw save_failure(file.name(), obstacle_to_saving(error),
+                       is_touched ? OnDisk::kTouched : OnDisk::kAsBefore);
+  }
+}
+
+// The library creates a file when it opens it; an empty one must not be seen under its final name.
+NewFile NewFile::create(const std::string& path) {
+  check_length(path);
+  std::error_code error;
+  if (fs::symlink_status(path, error).type() != fs::file_type::not_found) {
+    throw Failure(kRefused, visible(path) + ": it " +
+                                (error ? "cannot be looked at: " + error.message()
+                                       : "exists already; choose another name or remove it first"));
+  }
+  const HoldInterrupts hold;  // until the file is known as one to remove
+  try {
+    return {path, tevpf::File::create(unused_path_beside(path))};
+  } catch (const tevpf::Error&) {
+    throw Failure(kCannotWrite,
+                  visible(path) + ": it cannot be created; make room or choose another folder");
+  }
+}
+
+NewFile::NewFile(const std::string& path, tevpf::File file)
+    : path_(path), temp_(file.name()), file_(std::move(file)) {}
+
+void NewFile::save() {
+  const HoldInterrupts hold;
+  try {
+    file_.save();
+  } catch (const tevpf::Error& error) {
+    throw save_failure(path_, obstacle_to_saving(error), OnDisk::kAsBefore);
+  }
+  file_.close();
+  if (!rename_to_new(temp_.path(), path_)) {
+    throw save_failure(path_, last_error().message(), OnDisk::kAsBefore);
+  }
+  temp_.forget();
+}
+
+std::string damage_of(const tevpf::File& file) {
+  const tevpf::Error& damage = *file.damage();
+  switch (damage.status()) {
+    case PF_BADFORMAT:
+      return "it ends inside " + place_of(damage) + ", or contradicts itself there";
+    case PF_DUPLICATE:
+      return visible(damage.item()) + " is in it twice";
+    default:
+      return visible(damage.what());
+  }
+}
+
+std::uintmax_t size_on_disk(const tevpf::File& file) {
+  std::error_code error;
+  const std::uintmax_t bytes = fs::file_size(file.name(), error);
+  return error ? 0 : bytes;
+}
+
+}  // namespace tool
