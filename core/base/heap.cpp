@@ -33,14 +33,16 @@ constexpr bool must_fail(std::uint64_t) noexcept { return false; }
 #endif
 
 // Asks for a large block in large pages: fresh memory then costs one fault for 2 MB instead of 512,
-// and rows reached at random hardly ever miss in the address cache. Only a hint.
+// and rows reached at random hardly ever miss in the address cache. Only a hint. It covers every page that
+// the block touches: a mapping of which only a part is hinted at cannot be grown without copying it.
 void* in_large_pages(void* block, [[maybe_unused]] std::size_t bytes) noexcept {
 #ifdef __linux__
   constexpr std::size_t kLarge = std::size_t{4} << 20;
   if (block == nullptr || bytes < kLarge) return block;
   const auto page = static_cast<std::uintptr_t>(sysconf(_SC_PAGESIZE));
-  const std::uintptr_t first = (reinterpret_cast<std::uintptr_t>(block) + page - 1) & ~(page - 1);
-  const std::uintptr_t end = (reinterpret_cast<std::uintptr_t>(block) + bytes) & ~(page - 1);
+  const std::uintptr_t first = reinterpret_cast<std::uintptr_t>(block) & ~(page - 1);
+  const std::uintptr_t end =
+      (reinterpret_cast<std::uintptr_t>(block) + bytes + page - 1) & ~(page - 1);
   (void)madvise(reinterpret_cast<void*>(first), end - first, MADV_HUGEPAGE);
 #endif
   return block;

@@ -14,6 +14,9 @@ constexpr std::int64_t kItemsPerEntry = 1;
 constexpr std::int64_t kItemsPerEntry = 16;
 #endif
 
+// Looking at a run costs a cache miss or two, as scanning some items does.
+constexpr std::int32_t kItemsPerRun = 64;
+
 constexpr std::int32_t kNoBlock = -1;
 
 template <class Visit>
@@ -69,7 +72,7 @@ SequencePlace SequenceBlocks::look_everywhere(std::int32_t item) noexcept {
     const SequenceGroup& group = *groups[g];
     for (std::int32_t b = 0; b < group.count; ++b) {
       const SequenceChunk chunk = group.chunk(b);
-      effort += chunk.items == nullptr ? 1 : chunk.count;
+      effort += chunk.items == nullptr ? kItemsPerRun : chunk.count;
       const std::int32_t offset = offset_in(chunk, item);
       if (offset >= 0) return place_in(group, b, offset);
     }
