@@ -14,8 +14,8 @@ struct CsvText {
   std::string_view text, name;
 };
 
-// Adds all rows behind those that are there and returns their number. A Failure names the line; the
-// file in memory then holds a part of them and must not be saved.
-std::size_t import_csv(tevpf::File& file, const std::string& table, const CsvText& csv);
+// Adds all rows to the table of that name, behind those that are there, and returns their number. A
+// Failure names the line; the file in memory then holds a part of them and must not be saved.
+std::size_t import_csv(tevpf::File& file, const std::string& name, const CsvText& csv);
 
 }  // namespace tool
