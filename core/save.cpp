@@ -82,7 +82,9 @@ TEVPF_STATUS write_copy(const TEVPF_FILE& file, const char* path) noexcept {
     return status;
   }
   const bool closed = std::fclose(stream) == 0;
-  return status == PF_NORMAL && !closed ? fail(PF_OPENFAIL, path) : status;
+  if (closed || status != PF_NORMAL) return status;
+  if (created) std::remove(path);
+  return fail(PF_OPENFAIL, path);
 }
 
 TEVPF_STATUS save_copy(const TEVPF_FILE& file, const char* path) noexcept {

@@ -10,8 +10,8 @@
 #include "reports/segments.h"
 #include "tables/column_index.h"
 #include "tables/directory.h"
-#include "tables/settle.h"
 #include "tables/row_store.h"
+#include "tables/settle.h"
 
 namespace tevpf {
 

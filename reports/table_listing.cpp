@@ -11,8 +11,8 @@
 #include "tables/column_record.h"
 #include "tables/cursor.h"
 #include "tables/directory.h"
-#include "tables/settle.h"
 #include "tables/row_store.h"
+#include "tables/settle.h"
 
 namespace tevpf {
 
