@@ -611,9 +611,9 @@ TEVPF_API int32_t TEV8R1_calc_col_width(int32_t width, int32_t name_length) TEVP
  * tolerance) and PF_DUPLICATE (another row of a unique column holds an equal value). Interactive
  * mode switches them off where the comment says so.
  *
- * Adding and deleting take O(log n) comparisons and O(n) moves of entries for each index, and O(n)
- * moves of rows. Appending moves no row, and no entry of an index in which its value is the
- * greatest. */
+ * Changes cost O(log n) comparisons for each index, and moves of a few hundred entries, at any size.
+ * What goes over the whole table afterwards (saving, dumps, changes of columns) first takes O(n) to put
+ * it in order again. Any operation may return PF_NOMEM; the table is then as it was. */
 
 /* Append a row; insert it before a row number (PF_END_POS or a number after the last one: at the
  * end; negative: at the front); or append it after copying the default row's value, in the caller's
@@ -626,8 +626,7 @@ TEVPF_API TEVPF_STATUS TEV8R1_PF_add_row_with_dft(const char* table_name, void* 
                                                   const int32_t* supplied) TEVPF_NOEXCEPT;
 
 /* Replaces the current row. The value checks always apply; the unique values of the replaced row do
- * not count as duplicates. O(log n) comparisons and O(n) moves of entries for each index whose
- * value changes.
+ * not count as duplicates.
  *   PF_NOCURROW  no row is current */
 TEVPF_API TEVPF_STATUS TEV8R1_PF_replace_row(const char* table_name,
                                              const void* row) TEVPF_NOEXCEPT;
@@ -638,7 +637,6 @@ TEVPF_API TEVPF_STATUS TEV8R1_PF_replace_row(const char* table_name,
 TEVPF_API TEVPF_STATUS TEV8R1_PF_delete_row(const char* table_name) TEVPF_NOEXCEPT;
 
 /* Moves row number `from` so that it becomes row number `to`, or the last row. The cursor stays.
- * O(n).
  *   PF_SEARCHSET  a search column is set
  *   PF_BADPOS     no such row, or fewer than two rows
  *   PF_RANGE, PF_DUPLICATE  the row does not pass the value checks and stays where it was */
