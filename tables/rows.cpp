@@ -312,7 +312,7 @@ TEVPF_STATUS TEV8R1_PF_add_row_with_dft(const char* table_name, void* row,
 
 TEVPF_STATUS TEV8R1_PF_replace_row(const char* table_name, const void* row) noexcept {
   TEVPF_TABLE* table;
-  std::int32_t slot;
+  std::int32_t slot = 0;
   PF_TRY(find_current_row(table_name, table, slot));
   const GivenRow given(*table, row);
   if (given.get() == nullptr) return fail_empty(PF_NOMEM);
@@ -323,7 +323,7 @@ TEVPF_STATUS TEV8R1_PF_replace_row(const char* table_name, const void* row) noex
 
 TEVPF_STATUS TEV8R1_PF_delete_row(const char* table_name) noexcept {
   TEVPF_TABLE* table;
-  std::int32_t slot;
+  std::int32_t slot = 0;
   PF_TRY(find_current_row(table_name, table, slot));
   PF_TRY(delete_row(*table, slot, row_number_at(*table, table->cur_row)));
   table->cur_row = -1;
