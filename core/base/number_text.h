@@ -5,8 +5,7 @@
 
 namespace tevpf {
 
-inline constexpr int kDefaultPrecision =
-    6;  // of "%g"; as in printf, also used for a negative precision
+inline constexpr int kDefaultPrecision = 6;  // of "%g", and for a negative precision
 
 // The largest precision used; larger ones are reduced to it.
 inline constexpr int kMaxPrecision = 1100;

@@ -13,9 +13,8 @@ constexpr std::size_t kReadAhead = 256;  // even small files exceed it
 #else
 constexpr std::size_t kReadAhead = std::size_t{64} * 1024;
 #endif
-constexpr std::uint64_t kSmallClaim =
-    std::uint64_t{64} * 1024;  // not worth checking against the file size
-constexpr std::uint64_t kMaxRead = std::uint64_t{1} << 30;  // fits size_t everywhere
+constexpr std::uint64_t kSmallClaim = std::uint64_t{64} * 1024;  // not worth checking
+constexpr std::uint64_t kMaxRead = std::uint64_t{1} << 30;       // fits size_t everywhere
 }  // namespace
 
 bool Input::read_ahead() noexcept {
