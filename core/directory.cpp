@@ -9,14 +9,14 @@ namespace tevpf {
 namespace {
 
 constexpr std::int32_t kDirectoryStep = 100;  // slots added when a directory is full
-constexpr std::int32_t kWorthHashing = 16;    // elements from which on names are hashed
+constexpr std::int32_t kWorthHashing = 16;    // number of elements from which names are hashed
 
 Directory& current_directory(std::int32_t elem_type) noexcept {
   return directory_of(*library.current_file, elem_type);
 }
 
-// Whether the hashed names are those of the directory; builds them when they are not. A directory of
-// a few elements is walked instead.
+// Whether the name set matches the directory; rebuilds it if not. Small directories are scanned
+// instead.
 bool names_are_hashed(Directory& directory) noexcept {
   NameSet& names = directory.names;
   if (directory.count < kWorthHashing || directory.is_unhashed != 0) return false;
@@ -38,7 +38,7 @@ TEVPF_ELEM_HEADER* find_kept_name(Directory& directory, const char* name) noexce
   return nullptr;
 }
 
-// Makes sure of a free slot; false when memory runs out.
+// Ensures a free slot; false when out of memory.
 bool make_slot(Directory& directory) noexcept {
   if (directory.free_slots != 0) return true;
   const std::int64_t needed = std::int64_t{directory.count} + kDirectoryStep;
@@ -60,7 +60,7 @@ void append(Directory& directory, TEVPF_ELEM_HEADER* element) noexcept {
   --directory.free_slots;
 }
 
-// Keeps names that are hashed in step with an element that was appended and has got its name.
+// Adds the name of an element that was just appended to the name set, if that is in use.
 void hash_new_name(Directory& directory, TEVPF_ELEM_HEADER* element) noexcept {
   NameSet& names = directory.names;
   if (names.count == directory.count - 1 && names.slots != nullptr) add_name(names, element);
@@ -110,7 +110,7 @@ TEVPF_STATUS find_element(std::int32_t elem_type, const char* name,
   TEVPF_ELEM_HEADER*& last = directory.last;
   if (last == nullptr || std::strcmp(last->elem_name, name) != 0) {
     TEVPF_ELEM_HEADER* const found = find_kept_name(directory, name);
-    // A longer name is not the one that is kept of it.
+    // A name longer than the kept characters does not match.
     if (found == nullptr || std::strcmp(found->elem_name, name) != 0) {
       return fail(PF_NOELEM, kind_of(elem_type).word, name);
     }
@@ -174,7 +174,7 @@ TEVPF_STATUS delete_element(std::int32_t elem_type, const char* name) noexcept {
   return PF_NORMAL;
 }
 
-// The copy is whole before it is put into the directory.
+// The copy is complete before it enters the directory.
 TEVPF_STATUS copy_element(std::int32_t elem_type, const char* source_name,
                           const char* new_name) noexcept {
   TEVPF_ELEM_HEADER* source = nullptr;

@@ -1,5 +1,5 @@
-// The directory of the current file: its elements by name and in order. Elements of every kind go by the
-// same rules; each function takes the type code of the kind.
+// The directory of the current file: its elements by name and in order. Elements of every kind
+// follow the same rules; each function takes the kind's type code.
 #pragma once
 
 #include <cstdint>
@@ -10,9 +10,9 @@
 
 namespace tevpf {
 
-// The element that was found last if it has this name, of fewer than 8 characters; else null, and
-// find_element finds it. Every operation starts here, and mostly with the element of the last one and a
-// short name: that case calls nothing.
+// The element found last if it has this name and the name has fewer than 8 characters; otherwise
+// null, and find_element must search. Every operation starts here, usually with a short name and
+// the same element as the previous operation; that case makes no call.
 inline TEVPF_ELEM_HEADER* last_element(std::int32_t elem_type, const char* name) noexcept {
   if (library.current_file == nullptr) return nullptr;
   TEVPF_ELEM_HEADER* const last = directory_of(*library.current_file, elem_type).last;
@@ -25,22 +25,22 @@ inline TEVPF_ELEM_HEADER* last_element(std::int32_t elem_type, const char* name)
 [[nodiscard]] TEVPF_STATUS find_element(std::int32_t elem_type, const char* name,
                                         TEVPF_ELEM_HEADER*& element) noexcept;
 
-// The position of this very record.
+// The position of this record, compared by address.
 //   PF_NOELEM  it is not there; the texts stay as they were
 [[nodiscard]] TEVPF_STATUS element_position(std::int32_t elem_type,
                                             const TEVPF_ELEM_HEADER* element,
                                             std::int32_t& position) noexcept;
 
-// Whether no element has a name with the same first 19 characters.
+// Checks that no element has a name with the same first 19 characters.
 //   PF_NOFILE, PF_DUPLICATE  texts: the word and the name, "the file"
 [[nodiscard]] TEVPF_STATUS check_name_unique(std::int32_t elem_type, const char* name) noexcept;
 
-// Appends a new element of that header.
+// Appends a new element with the given header.
 //   PF_NOFILE, PF_DUPLICATE, PF_NOMEM
 [[nodiscard]] TEVPF_STATUS create_element(TEVPF_ELEM_HEADER header, std::int32_t elem_type,
                                           TEVPF_ELEM_HEADER*& element) noexcept;
 
-// Appends a record that a caller outside fills in, its name included.
+// Appends a record that the library's caller fills in, including its name.
 //   PF_NOFILE, PF_NOMEM
 [[nodiscard]] TEVPF_STATUS insert_unnamed(std::int32_t elem_type,
                                           TEVPF_ELEM_HEADER*& element) noexcept;

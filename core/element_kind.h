@@ -1,5 +1,5 @@
-// What the core knows of a kind of element. It asks for everything else through this record, which the
-// folder of the kind fills in.
+// What the core knows about a kind of element. Everything else goes through this record, which the
+// kind's folder provides.
 #pragma once
 
 #include <cstddef>
@@ -11,31 +11,31 @@
 
 namespace tevpf {
 
-// Every function takes the header that a record of the kind starts with for the record.
+// Functions take a record of the kind by the header at its start.
 struct ElementKind {
   const char* word;            // in error texts
-  const char* lead;            // the same with a blank behind it
+  const char* lead;            // the same, followed by a blank
   std::size_t record_size;     // bytes
   std::int32_t smallest_body;  // btf of an element that holds nothing
-  bool streams_body;           // reads its body part by part; else from one block
+  bool streams_body;           // reads its body part by part; otherwise from one block
 
-  // Brings a record that is zero but for its header to the state of a new element.
+  // Initialises a new element in a record that is zero except for its header.
   void (*start)(TEVPF_ELEM_HEADER& element) noexcept;
 
-  // Gives a new element its first slots; false when memory runs out.
+  // Allocates the first slots of a new element; false when out of memory.
   bool (*reserve)(TEVPF_ELEM_HEADER& element) noexcept;
 
-  // Gives `copy`, a new element with a name of its own, all else that `source` holds; false when memory
-  // runs out, and then `copy` is as it was.
+  // Copies everything except the name from `source` to the new element `copy`; false when out of
+  // memory, and then `copy` is unchanged.
   bool (*copy)(TEVPF_ELEM_HEADER& source, TEVPF_ELEM_HEADER& copy) noexcept;
 
-  // Releases a record and everything that it owns.
+  // Releases a record and everything it owns.
   void (*release)(TEVPF_ELEM_HEADER* element) noexcept;
 
-  // Creates an element in the current file from its stored form: a header whose texts end in their
-  // fields, the header.btf bytes of its body, and what follows them in `input`. The shape of the body is
-  // checked before the element is created. A failure behind that leaves the element in the directory
-  // with what was built so far, which is a state like any other: sizes, counts and indexes agree.
+  // Creates an element in the current file from its stored form: a header with terminated texts,
+  // the header.btf bytes of its body, and what follows them in `input`. The shape of the body is
+  // checked before the element is created. A later failure leaves the element in the directory with
+  // what was built so far; its sizes, counts and indexes agree.
   //   PF_BADFORMAT, PF_BADTYPE, PF_DUPLICATE, PF_NOMEM
   TEVPF_STATUS (*read)(const TEVPF_ELEM_HEADER& header, Body body, Input& input) noexcept;
 
@@ -47,8 +47,8 @@ struct ElementKind {
 extern const ElementKind list_kind;   // lists/list_kind.cpp
 extern const ElementKind table_kind;  // tables/table_kind.cpp
 
-// The kinds by their type codes, which count from 1, in the order in which a file is written. A third
-// kind is a folder like lists/ and a line here.
+// The kinds by type code, starting at 1, in the order in which a file is written. A third kind
+// needs a folder like lists/ and an entry here.
 inline constexpr const ElementKind* kElementKinds[] = {&list_kind, &table_kind};
 inline constexpr std::int32_t kNumKinds = std::size(kElementKinds);
 static_assert(PF_ELEM_LIST == 1 && PF_ELEM_TABLE == 2);

@@ -1,4 +1,4 @@
-// The chain of open files, and what callers may ask about the current one.
+// The chain of open files, and inquiries about the current one.
 #include "core/file.h"
 
 #include <cerrno>
@@ -48,7 +48,7 @@ bool access_denied(int error_number) noexcept {
 
 namespace {
 
-// Names and descriptions of elements in arrays that become the caller's.
+// Returns names and descriptions of elements in new arrays that the caller owns.
 TEVPF_STATUS hand_out_elements(const Directory& directory, char (**names_out)[TEVPF_NAME_SIZE],
                                char (**descs_out)[TEVPF_DESC_SIZE]) noexcept {
   if (directory.count <= 0) return PF_NORMAL;

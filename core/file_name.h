@@ -1,4 +1,4 @@
-// Names of files as callers give them, and as the system knows them.
+// Translates the file names that callers pass into names that the system knows.
 #pragma once
 
 #include "include/tevpf.h"
@@ -9,8 +9,8 @@ struct FileName {
   char text[TEVPF_FILE_NAME_SIZE];
 };
 
-// Translates a name: a leading "$NAME", up to the first "/", gives way to the value of the
-// environment variable of that name, the "$" being part of it.
+// Translates a name: a leading "$NAME", up to the first "/", is replaced by the value of the
+// environment variable of that name; the "$" is part of the variable's name.
 //   PF_OPENFAIL  undefined variable; texts: the name as given, the second one stays
 //   PF_OPENFAIL  too long; texts: the translated name
 [[nodiscard]] TEVPF_STATUS translate_file_name(const char* name, FileName& out) noexcept;

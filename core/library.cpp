@@ -20,7 +20,7 @@ Library library = {
 
 namespace {
 
-// Takes over a setting: 0 stands for the default; false when it is negative, and then nothing
+// Applies a setting; 0 stands for the default. False if the value is negative, and then nothing
 // changes.
 bool take_setting(std::int32_t& setting, std::int32_t value, std::int32_t standard) noexcept {
   if (value < 0) return false;

@@ -11,7 +11,7 @@ namespace {
 
 constexpr std::uint32_t kFirstSlots = 64;
 
-// FNV-1a over the characters that count, mixed once more since low bits choose the slot.
+// FNV-1a over the characters that are kept, mixed once more because the low bits choose the slot.
 std::uint32_t hash_name(const char* name) noexcept {
   std::uint32_t hash = 2166136261u;
   for (int i = 0; i < TEVPF_NAME_SIZE - 1 && name[i] != '\0'; ++i) {
@@ -29,7 +29,7 @@ NameSet::Slot& place(NameSet& set, NameSet::Slot wanted) noexcept {
   return set.slots[i];
 }
 
-// At most half full, so that probes stay short; false when memory runs out.
+// Keeps the set at most half full, so that probes stay short; false when out of memory.
 bool make_room(NameSet& set) noexcept {
   const std::uint32_t old_slots = set.slots == nullptr ? 0 : set.mask + 1;
   if (static_cast<std::uint32_t>(set.count) < old_slots / 2) return true;
@@ -74,8 +74,7 @@ void remove_name(NameSet& set, const TEVPF_ELEM_HEADER* element) noexcept {
     if (set.slots[hole].element == nullptr) return drop_names(set);  // its name was changed
     hole = (hole + 1) & set.mask;
   }
-  // Close the gap: a later slot moves into the hole unless its own first choice lies behind the
-  // hole.
+  // Close the gap: a later entry moves into the hole unless its home slot comes after the hole.
   for (std::uint32_t i = (hole + 1) & set.mask; set.slots[i].element != nullptr;
        i = (i + 1) & set.mask) {
     const std::uint32_t probed = (i - set.slots[i].hash) & set.mask;

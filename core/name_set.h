@@ -1,6 +1,6 @@
-// Element names of one kind in one file, hashed by the 19 characters that are kept of a name: an
-// accelerator beside the directory, which stays the truth. It may be dropped at any time and is
-// built again when it is needed; without memory for it, callers walk the directory.
+// The element names of one kind in one file, hashed by the 19 characters that are kept of a name.
+// The set only speeds up searches; the directory is authoritative. It may be dropped at any time
+// and is rebuilt when needed; if there is no memory for it, callers scan the directory.
 #pragma once
 
 #include <cstdint>
@@ -19,14 +19,14 @@ struct NameSet {
   std::int32_t count;  // names in the set
 };
 
-// Adds an element, whose name must not change while it is in the set. Without memory, all names are
-// dropped.
+// Adds an element, whose name must not change while it is in the set. When out of memory, drops all
+// names.
 void add_name(NameSet& set, TEVPF_ELEM_HEADER* element) noexcept;
 
 // The element whose name has the same first 19 characters, or null.
 TEVPF_ELEM_HEADER* find_name(const NameSet& set, const char* name) noexcept;
 
-// Takes an element out, before its name changes or it is released. O(1).
+// Removes an element. Call before its name changes or it is released. O(1).
 void remove_name(NameSet& set, const TEVPF_ELEM_HEADER* element) noexcept;
 
 void drop_names(NameSet& set) noexcept;

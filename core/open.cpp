@@ -19,7 +19,7 @@ struct OpenedStream {
   bool created;
 };
 
-// A file that may be written but not read counts as none, and is emptied.
+// A file that can be written but not read is treated as new and is emptied.
 OpenedStream open_emptied(const char* name) noexcept {
   std::FILE* const stream = open_regular(name, Access::kWrite);
   if (stream == nullptr || empty_file(stream)) return {stream, false, true};
@@ -27,8 +27,8 @@ OpenedStream open_emptied(const char* name) noexcept {
   return {nullptr, false, false};
 }
 
-// For update where that is allowed, else for reading. Any failure but "not there" and "no right" is no
-// reason to make a file: it may pass.
+// Opens for update if permitted, otherwise for reading. A failure other than "not found" or
+// "permission denied" may be temporary, so it is no reason to create a file.
 OpenedStream open_existing(const char* name) noexcept {
   if (std::FILE* const stream = open_regular(name, Access::kUpdate)) return {stream, false, false};
   if (!access_denied(errno)) return {nullptr, false, false};
@@ -36,9 +36,9 @@ OpenedStream open_existing(const char* name) noexcept {
   return access_denied(errno) ? open_emptied(name) : OpenedStream{nullptr, false, false};
 }
 
-// A file that appears between looking and making is opened, its content with it.
+// If the file appears between the check and the creation, it is opened with its content.
 OpenedStream open_or_create(const char* name) noexcept {
-  constexpr int kTries = 3;  // more would be needed only by a link that leads nowhere
+  constexpr int kTries = 3;  // only a dangling symbolic link exhausts them
   for (int i = 0; i < kTries; ++i) {
     const OpenedStream existing = open_existing(name);
     if (existing.stream != nullptr || errno != ENOENT) return existing;
@@ -59,7 +59,7 @@ TEVPF_STATUS TEV8R1_PF_open(const char* name) noexcept {
   PF_TRY(translate_file_name(name, file_name));
   if (find_open_file(file_name.text) != nullptr) return fail_empty(PF_FILEOPEN);
 
-  // Before a file is created: a failure leaves nothing behind.
+  // Allocated before a file is created, so that a failure leaves no file behind.
   Owned<TEVPF_FILE> record = new_file_record(file_name.text);
   if (!record) return fail_empty(PF_NOMEM);
   const OpenedStream opened = open_or_create(file_name.text);

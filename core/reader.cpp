@@ -1,4 +1,4 @@
-// Loads a file, element after element, in one pass.
+// Loads a file in one pass, element by element.
 #include "core/reader.h"
 
 #include "core/base/status.h"
@@ -12,13 +12,13 @@ namespace {
 
 constexpr std::int32_t kFirstScratch = 4096;
 
-// The body of the element being read; one block, replaced by larger ones only.
+// A block for the body of the element being read; replaced only by larger ones.
 struct Scratch {
   Owned<unsigned char> block;
   std::int32_t room = 0;
 };
 
-// The body of the element that was announced last, in the scratch block.
+// Reads the body of the current element into the scratch block.
 Input::Got read_body(Input& input, std::int32_t bytes, Scratch& scratch) noexcept {
   if (bytes > scratch.room) {
     const Input::Got got = input.read_block(static_cast<std::uint32_t>(bytes), scratch.block);
@@ -37,7 +37,7 @@ TEVPF_STATUS load_element(const TEVPF_ELEM_HEADER& header, Input& input,
   }
   const ElementKind& kind = kind_of(header.elem_type);
   if (header.btf < kind.smallest_body) return fail(PF_BADFORMAT, header.elem_name);
-  // A body that is streamed needs no block, but the file must hold it.
+  // A streamed body needs no block, but the file must contain all of it.
   const auto bytes = static_cast<std::uint32_t>(header.btf);
   if (kind.streams_body && input.weigh(bytes) == Input::Claim::kFits) {
     return kind.read(header, Body(input, header.btf), input);
@@ -53,7 +53,7 @@ TEVPF_STATUS load_element(const TEVPF_ELEM_HEADER& header, Input& input,
   return kind.read(header, Body(scratch.block.get(), header.btf), input);
 }
 
-// Loads one element after the other until the stream ends between two of them.
+// Loads elements until the stream ends at an element boundary.
 TEVPF_STATUS load_elements(Input& input) noexcept {
   Scratch scratch{new_array<unsigned char>(kFirstScratch), kFirstScratch};
   if (!scratch.block || !input.read_ahead()) return fail_empty(PF_NOMEM);
@@ -67,7 +67,7 @@ TEVPF_STATUS load_elements(Input& input) noexcept {
   }
 }
 
-// Closes a file of which nothing, or not all that it holds, can be said.
+// Closes a file that could not be read, or not to its end.
 TEVPF_STATUS give_up(TEVPF_FILE& file, TEVPF_STATUS reason) noexcept {
   const TEVPF_STATUS status = fail(reason, file.file_name);
   file.new_file = 0;
@@ -85,7 +85,7 @@ void terminate_texts(TEVPF_ELEM_HEADER& header) noexcept {
 TEVPF_STATUS load_file(TEVPF_FILE& file) noexcept {
   Input input(file.fp);
   const TEVPF_STATUS status = load_elements(input);
-  // The disk failed: what was read may be a shorter file than there is, and must not be saved as such.
+  // A read error: the elements read may be only part of the file and must not be saved over it.
   if (input.has_failed()) return give_up(file, PF_OPENFAIL);
   if (status == PF_NORMAL) {
     file.new_file = 0;

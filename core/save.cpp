@@ -14,14 +14,14 @@ namespace tevpf {
 
 namespace {
 
-// Takes a stream for writing in place of the one that the file had.
+// Replaces the file's stream with a stream for writing and closes the old one.
 void adopt_stream(TEVPF_FILE& file, std::FILE* stream) noexcept {
   if (file.fp != nullptr) std::fclose(file.fp);
   file.fp = stream;
 }
 
-// Empties the file on the disk and writes it again. The old stream goes first: what a failed write
-// has left in its buffer must not end up in the new file.
+// Truncates the file on disk and rewrites it. The old stream is closed first: data that a failed
+// write left in its buffer must not reach the new file.
 TEVPF_STATUS overwrite(TEVPF_FILE& file) noexcept {
   adopt_stream(file, nullptr);
   adopt_stream(file, std::fopen(file.file_name, "wb"));
@@ -29,11 +29,11 @@ TEVPF_STATUS overwrite(TEVPF_FILE& file) noexcept {
   return write_elements(file, file.fp, file.file_name);
 }
 
-// What came of putting the elements of a file in the place of an existing one.
+// The result of replacing an existing file with the elements of a file.
 struct Replaced {
-  bool possible;        // no: nothing was done, and the caller writes plainly
+  bool possible;        // false: nothing was done, and the caller writes plainly
   TEVPF_STATUS status;  // when it was possible
-  std::FILE* stream;    // stands for the file that is in place now; null when the old one still is
+  std::FILE* stream;    // refers to the new file; null if the old one is still in place
 };
 
 Replaced replace_existing(const TEVPF_FILE& file, const char* name) noexcept {
@@ -55,7 +55,7 @@ Replaced replace_existing(const TEVPF_FILE& file, const char* name) noexcept {
   return {false, PF_NORMAL, nullptr};
 }
 
-// Writes the file in place: by an image that takes its place once it is whole, or else plainly.
+// Rewrites the file: by an image that replaces it once complete, or else plainly.
 TEVPF_STATUS rewrite(TEVPF_FILE& file) noexcept {
   const Replaced replaced = replace_existing(file, file.file_name);
   if (!replaced.possible) return overwrite(file);
@@ -69,8 +69,8 @@ TEVPF_STATUS save_in_place(TEVPF_FILE& file) noexcept {
   return rewrite(file);
 }
 
-// Writes a copy where there is no file, or one that cannot be replaced. What could not be written whole
-// does not stay, unless it stands in the place of something else.
+// Writes a copy to a new file, or to one that cannot be replaced. An incomplete copy is removed if
+// this call created the file.
 TEVPF_STATUS write_copy(const TEVPF_FILE& file, const char* path) noexcept {
   std::FILE* stream = create_file(path);
   const bool created = stream != nullptr;

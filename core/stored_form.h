@@ -1,6 +1,6 @@
-// How records are packed into their stored form: their fields in stored order, as data, from which sizes,
-// reader and writer follow. Little-endian, without padding; the stored form is the same whatever the size
-// of a pointer.
+// Packs records into their stored form. A table lists the fields in stored order; sizes, reader and
+// writer follow from it. The stored form is little-endian, without padding, and independent of the
+// size of a pointer.
 #pragma once
 
 #include <array>
@@ -22,7 +22,7 @@ struct Field {
   std::size_t bytes;
 };
 
-inline constexpr std::size_t kNowhere = SIZE_MAX;  // zero in the file, no part of the record
+inline constexpr std::size_t kNowhere = SIZE_MAX;  // zero in the file, not part of the record
 
 template <std::size_t N>
 constexpr std::int32_t stored_size(const Field (&fields)[N]) noexcept {
@@ -31,7 +31,7 @@ constexpr std::int32_t stored_size(const Field (&fields)[N]) noexcept {
   return static_cast<std::int32_t>(bytes);
 }
 
-// Where the field that stands at that place in the record lies in the stored form.
+// The offset in the stored form of the field at offset `place` in the record.
 template <std::size_t N>
 constexpr std::size_t stored_place(const Field (&fields)[N], std::size_t place) noexcept {
   std::size_t bytes = 0;
@@ -41,7 +41,7 @@ constexpr std::size_t stored_place(const Field (&fields)[N], std::size_t place) 
 
 namespace stored_form {
 
-// Fields that stand side by side in the record too are one; what is left over at the end is empty.
+// Merges fields that are also contiguous in the record. Unused entries at the end are empty.
 template <const auto& Fields>
 constexpr auto joined() noexcept {
   std::array<Field, std::size(Fields)> runs{};
@@ -62,7 +62,7 @@ constexpr auto joined() noexcept {
 template <const auto& Fields>
 inline constexpr auto kRuns = joined<Fields>();
 
-// Each run is copied with a size known to the compiler.
+// Copies each run with a size that is known at compile time.
 template <const auto& Fields, std::size_t... I>
 void pack(const void* record, unsigned char* out, std::index_sequence<I...>) noexcept {
   const auto* from = static_cast<const unsigned char*>(record);
@@ -82,7 +82,7 @@ void unpack(const unsigned char* in, void* record, std::index_sequence<I...>) no
 
 }  // namespace stored_form
 
-// Copies the fields of a record to their stored form, and back.
+// Copy the fields of a record to their stored form, and back.
 template <const auto& Fields>
 void pack(const void* record, unsigned char* out) noexcept {
   stored_form::pack<stored_form::kRuns<Fields>>(record, out,

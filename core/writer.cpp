@@ -17,7 +17,7 @@ TEVPF_STATUS put_elements(Sink& sink, const TEVPF_FILE& file) noexcept {
   return PF_NORMAL;
 }
 
-// Writes by `put` and empties the sink, also behind a record that could not be stored.
+// Writes with `put` and flushes the sink, even after a record that could not be stored.
 template <class Put>
 TEVPF_STATUS write_through_sink(std::FILE* stream, const char* name, Put put) noexcept {
   Sink sink(stream);

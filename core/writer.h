@@ -1,4 +1,4 @@
-// Writes elements as the file holds them: every element of a kind in directory order, kind after kind.
+// Writes elements in file order: kind by kind, each kind in directory order.
 #pragma once
 
 #include <cstdio>
@@ -14,7 +14,8 @@ TEVPF_API TEVPF_STATUS TEV8R1_store_file(TEVPF_FILE* file) noexcept;
 
 namespace tevpf {
 
-// Writes all elements of a file to a stream that stands for the file of that name, and flushes it.
+// Writes all elements of a file to a stream and flushes it. `name` is the file's name in error
+// texts.
 [[nodiscard]] TEVPF_STATUS write_elements(const TEVPF_FILE& file, std::FILE* stream,
                                           const char* name) noexcept;
 

@@ -9,7 +9,7 @@
 namespace tevpf {
 namespace {
 
-// The list's table, made by the first operation that needs it; null when memory runs out.
+// The list's table, created by the first operation that needs it; null when out of memory.
 TEVPF_PARAM_DEF* defaults_of(TEVPF_LIST& list) noexcept {
   if (list.dft_ptr == nullptr && TEV8R1_load_param_dft(&list.dft_ptr) != PF_NORMAL) return nullptr;
   return list.dft_ptr;

@@ -1,5 +1,5 @@
-// Adding parameters and replacing their definitions. Each operation has every block it needs before
-// it changes the list.
+// Adding parameters and replacing their definitions. Each operation allocates every block it needs
+// before it changes the list.
 #include <algorithm>
 #include <cstring>
 #include <limits>
@@ -19,7 +19,7 @@ namespace {
 
 constexpr std::int64_t kMostSlots = std::numeric_limits<std::int32_t>::max();
 
-// Gives both arrays at least `slots` slots; when memory runs out, the list still is in order.
+// Gives both arrays at least `slots` slots; when out of memory, the list remains valid.
 bool make_room(TEVPF_LIST& list, std::int64_t slots) noexcept {
   if (slots <= list.param_room) return true;
   if (slots > kMostSlots) return false;
@@ -35,8 +35,8 @@ bool make_room(TEVPF_LIST& list, std::int64_t slots) noexcept {
   return true;
 }
 
-// Full arrays get the documented number of spare slots, counted whatever the blocks behind them
-// hold.
+// Full arrays get the documented number of spare slots; the count does not depend on how many slots
+// are allocated.
 TEVPF_STATUS ensure_free_slot(TEVPF_LIST& list) noexcept {
   if (list.free_params > 0) return PF_NORMAL;
   const std::int32_t increment = library.alloc_increment;
@@ -45,7 +45,7 @@ TEVPF_STATUS ensure_free_slot(TEVPF_LIST& list) noexcept {
   return PF_NORMAL;
 }
 
-// Stores a record with texts of its own at a position, and its name at a place of the index.
+// Stores a record that owns its texts at a position, and its index entry at a place.
 void insert_param(TEVPF_LIST& list, const TEVPF_PARAM& param, std::int32_t position,
                   std::int32_t place) noexcept {
   TEVPF_PARAM* const slot = list.param_ptr + position;
@@ -57,7 +57,7 @@ void insert_param(TEVPF_LIST& list, const TEVPF_PARAM& param, std::int32_t posit
   --list.free_params;
 }
 
-// The texts and the size of a parameter that is to be redefined, found out before it is.
+// The new texts and the change in size of a parameter, prepared before it is redefined.
 struct Redefinition {
   NewText value;
   NewText description;

@@ -27,7 +27,7 @@ inline TEVPF_LIST* as_list(TEVPF_ELEM_HEADER* element) noexcept {
   return reinterpret_cast<TEVPF_LIST*>(element);
 }
 
-// The list that was found last if it has this name, of fewer than 8 characters; else null.
+// The list found last if it has this name and the name has fewer than 8 characters; otherwise null.
 inline TEVPF_LIST* last_list(const char* name) noexcept {
   return as_list(last_element(PF_ELEM_LIST, name));
 }

@@ -1,4 +1,4 @@
-// How operations on a list begin: they find it in the current file by its name, then its parameter.
+// The start of operations on a list: find it in the current file by name, then find its parameter.
 #pragma once
 
 #include "core/base/status.h"
@@ -8,7 +8,7 @@
 
 namespace tevpf {
 
-// The list, and the position of the parameter that the name, or pattern, finds.
+// Finds the list and the position of the parameter that matches the name or pattern.
 //   PF_NOFILE, PF_NOELEM, PF_NOPARAM
 [[nodiscard]] inline TEVPF_STATUS find_param_of(const char* list_name, const char* param_name,
                                                 TEVPF_LIST*& list,
@@ -17,7 +17,7 @@ namespace tevpf {
   return find_param(*list, param_name, position);
 }
 
-// The list, which has a parameter at that position.
+// Finds the list and checks that it has a parameter at that position.
 //   PF_NOFILE, PF_NOELEM
 //   PF_BADPOS  it has none; texts: the position, the number of parameters
 [[nodiscard]] inline TEVPF_STATUS find_list_with(const char* list_name, std::int32_t position,

@@ -1,4 +1,4 @@
-// What can be asked of a list without moving its cursor.
+// Inquiries about a list that do not move its cursor.
 #include <cstring>
 
 #include "core/library.h"

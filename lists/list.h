@@ -1,10 +1,9 @@
-// Lists and their parameters as records, and what holds whole records together: their release and
-// copy.
+// The records of lists and their parameters, and operations on whole records: release and copy.
 //
 // Invariants: index_ptr[0 .. num_params - 1] holds each position once, ordered by name; no two
 // names compare equal; header.btf = 12 + the stored sizes of all parameters; for strings, length is
-// the length of value; description and string value lie in the list's text block, or are blocks of
-// the record's own.
+// the length of value; description and string value lie in the list's text block, or are blocks
+// that the record owns.
 #pragma once
 
 #include <cstddef>
@@ -52,7 +51,7 @@ struct TEVPF_LIST {
   std::int32_t* index_ptr;   // positions ordered by name
   std::int32_t free_params;  // spare slots at the end of both arrays
 
-  std::int32_t param_room;  // slots that the two blocks really have, at least what is counted
+  std::int32_t param_room;  // allocated slots of both arrays, at least num_params + free_params
   tevpf::NameTable names;   // all zero: not built
   tevpf::TextBlock texts;
 };
@@ -65,15 +64,16 @@ static_assert(offsetof(TEVPF_PARAM_DEF, description) == 32);
 
 namespace tevpf {
 
-// Releases everything that the list owns, half-built ones too; release_list the record as well.
+// release_contents releases everything that the list owns, even if it is only partly built;
+// release_list also releases the record.
 void release_contents(TEVPF_LIST& list) noexcept;
 void release_list(TEVPF_LIST* list) noexcept;
 
-// Gives `copy`, a new empty list, all that `source` holds but its name; false when memory runs out,
-// and then `copy` is still empty.
+// Copies everything except the name from `source` to `copy`, a new empty list; false when out of
+// memory, and then `copy` is still empty.
 [[nodiscard]] bool copy_list_body(const TEVPF_LIST& source, TEVPF_LIST& copy) noexcept;
 
-// Gives a new list its first spare slots; false when memory runs out.
+// Allocates the first spare slots of a new list; false when out of memory.
 [[nodiscard]] bool reserve_first_params(TEVPF_LIST& list, std::int32_t slots) noexcept;
 
 }  // namespace tevpf

@@ -18,8 +18,8 @@ namespace {
 
 constexpr std::size_t kTypePlace = stored_place(kParamFields, offsetof(TEVPF_PARAM, def.type));
 
-// Takes the value of a string, whose length stands in `def`, and the terminator behind it. `to_come`:
-// bytes of the body behind those at hand.
+// Parses the value of a string, whose length is in `def`, and its terminator. `to_come`: bytes of
+// the body after the buffered ones.
 Parsed parse_string_value(ByteReader& bytes, std::int64_t to_come, TEVPF_PARAM_DEF& def) noexcept {
   const std::int32_t length = def.part.str.length;
   if (length < 0 || length >= bytes.left() + to_come) return Parsed::kBroken;
@@ -33,21 +33,21 @@ Parsed parse_string_value(ByteReader& bytes, std::int64_t to_come, TEVPF_PARAM_D
   return Parsed::kWhole;
 }
 
-// Takes the description that desc_loc, as it was read, speaks of.
+// Parses the description if the stored desc_loc announces one.
 Parsed parse_description(ByteReader& bytes, TEVPF_PARAM& param, TextSizes& sizes) noexcept {
   if (param.desc_loc == 0) return Parsed::kWhole;
   const std::int64_t before = bytes.left();
   param.def.description = const_cast<char*>(bytes.take_text());
   if (param.def.description == nullptr) return Parsed::kCutOff;
   sizes.description = before - bytes.left();
-  // Of a string, any place means that there is one.
+  // For a string, any nonzero place means that there is a description.
   const std::int8_t place = description_place(param.def);
   if (param.def.type != PF_TYPE_STRING && param.desc_loc != place) return Parsed::kBroken;
   param.desc_loc = place;
   return Parsed::kWhole;
 }
 
-// Takes one stored parameter. Its texts are left where they are.
+// Parses one stored parameter. Its texts are not copied.
 Parsed parse_param(ByteReader& bytes, std::int64_t to_come, TEVPF_PARAM& param,
                    TextSizes& sizes) noexcept {
   param = {};
@@ -56,7 +56,8 @@ Parsed parse_param(ByteReader& bytes, std::int64_t to_come, TEVPF_PARAM& param,
   if (fields == nullptr) return Parsed::kCutOff;
   unpack<kParamFields>(fields, &param);
   TEVPF_PARAM_DEF& def = param.def;
-  // Not from the record: what comes next waits for the type, and the record is still being written.
+  // Loaded from the stored bytes, not from the record: the next steps depend on the type, and the
+  // stores to the record may still be in flight.
   const auto type = load<std::int32_t>(fields + kTypePlace);
   if (!is_value_type(type)) return Parsed::kUnknownType;
   terminate_field(def.name);
@@ -78,7 +79,7 @@ Parsed parse_param(ByteReader& bytes, std::int64_t to_come, TEVPF_PARAM& param,
   return parse_description(bytes, param, sizes);
 }
 
-// Gets more of a body to hand behind what is left at hand.
+// Buffers more of a body after the bytes that are still unparsed.
 Parsed fetch_more(Body& body, ByteReader& at_hand) noexcept {
   body.take(body.at_hand().left() - at_hand.left());
   const Input::Got got = body.fetch_more();
@@ -88,15 +89,15 @@ Parsed fetch_more(Body& body, ByteReader& at_hand) noexcept {
                                     : Parsed::kNoMemory;
 }
 
-// How many of a body's bytes can be texts, at most: their number is known when it has been gone
-// through. What is too much, up to 24 bytes a number, stays at the end of the list's text block.
+// An upper bound for the bytes of texts in a body; the exact number is known only after parsing.
+// The excess, up to 24 bytes per number, stays unused at the end of the list's text block.
 std::int64_t text_room(const Body& body, std::int32_t count) noexcept {
   constexpr std::int32_t kLeastPart = value_type(PF_TYPE_STRING).param_part;
   return body.left() - std::int64_t{count} * (kParamHead + kLeastPart);
 }
 
-// Takes the parameters off the body, up to the first one of an unknown type, whose size nobody
-// knows, and gives them texts of their own. The list counts those it has got, and their bytes.
+// Parses the parameters of the body, up to the first one of an unknown type, whose size cannot be
+// determined, and copies their texts. The list counts the parameters taken and their bytes.
 Parsed take_params(Body& body, std::int32_t count, TEVPF_LIST& list) noexcept {
   TextPacker packer;
   if (!packer.reserve(text_room(body, count), list.texts)) return Parsed::kNoMemory;
@@ -124,7 +125,8 @@ Parsed take_params(Body& body, std::int32_t count, TEVPF_LIST& list) noexcept {
   return body.left() == 0 ? Parsed::kWhole : Parsed::kBroken;
 }
 
-// Makes room for the parameters that the body claims, when it can hold so many, and takes them.
+// Allocates the number of parameters that the body claims, if it can hold that many, and parses
+// them.
 Parsed take_body(Body& body, TEVPF_LIST& list) noexcept {
   if (list.header.btf < kListHead) return Parsed::kBroken;
   const unsigned char* const fields = body.take_fields(kListHead);
@@ -143,12 +145,12 @@ Parsed take_body(Body& body, TEVPF_LIST& list) noexcept {
     list.param_room = count;
   }
   const Parsed parsed = take_params(body, count, list);
-  // A body that is cut short is none, whatever stands in it.
+  // A truncated body is invalid, whatever it contains.
   return parsed == Parsed::kUnknownType && !body.take_rest() ? Parsed::kBroken : parsed;
 }
 
-// Gives what a body held an element of its own. A body that is no list makes none; one that is cut
-// short by an unknown type does.
+// Creates an element for the contents of a body. An invalid body creates none; one that was parsed
+// only up to an unknown type does.
 TEVPF_STATUS create(Parsed parsed, const TEVPF_LIST& loaded, TEVPF_LIST*& list) noexcept {
   if (parsed == Parsed::kNoMemory) return fail_empty(PF_NOMEM);
   if (parsed == Parsed::kBroken) return fail(PF_BADFORMAT, loaded.header.elem_name);
@@ -160,7 +162,7 @@ TEVPF_STATUS create(Parsed parsed, const TEVPF_LIST& loaded, TEVPF_LIST*& list) 
   return PF_NORMAL;
 }
 
-// Reads the name index; `usable` when it is one.
+// Reads the name index; sets `usable` if it is valid.
 TEVPF_STATUS read_name_index(TEVPF_LIST& list, Input& input, bool& usable) noexcept {
   const std::uint64_t bytes = static_cast<std::uint64_t>(list.num_params) * sizeof(std::int32_t);
   if (input.read(list.index_ptr, bytes) != bytes) return fail(PF_BADFORMAT, "list index");

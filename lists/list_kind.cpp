@@ -1,4 +1,4 @@
-// Lists, as the core knows them.
+// The list kind, as the core sees it.
 #include "core/element_kind.h"
 #include "core/library.h"
 #include "lists/directory.h"

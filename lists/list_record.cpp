@@ -11,7 +11,7 @@
 namespace tevpf {
 namespace {
 
-// What all texts of a list take: the rest of btf is known from the types.
+// Bytes of all texts of a list: btf minus the part that the types determine.
 std::int64_t text_bytes(const TEVPF_LIST& list) noexcept {
   std::int64_t bytes = list.header.btf - kListHead;
   for (std::int32_t i = 0; i < list.num_params; ++i) {
@@ -20,7 +20,7 @@ std::int64_t text_bytes(const TEVPF_LIST& list) noexcept {
   return bytes;
 }
 
-// The array of copied records in `half`; num_params counts those that are whole.
+// Copies the records into `half`; its num_params counts the complete ones.
 bool copy_params(const TEVPF_LIST& source, TEVPF_LIST& half) noexcept {
   half.param_ptr = new_array<TEVPF_PARAM>(static_cast<std::uint32_t>(source.num_params)).release();
   TextPacker packer;

@@ -1,4 +1,4 @@
-// Lists in their stored form, written.
+// Writes lists in their stored form.
 #pragma once
 
 #include <cstdio>

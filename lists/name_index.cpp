@@ -14,8 +14,8 @@
 namespace tevpf {
 namespace {
 
-// A name to search for. Plain ones are compared eight bytes at a time, which takes them as a field
-// of their own, zero behind the end; of a name too long for a field, as much as one holds.
+// A name to search for. Plain names are compared eight bytes at a time, as a zero-padded field; of
+// a name too long for a field, only what fits is compared.
 struct Wanted {
   explicit Wanted(const char* name) noexcept : pattern(make_pattern(name)) {
     std::memcpy(field, name, std::min(std::strlen(name), sizeof field));
@@ -27,8 +27,8 @@ struct Wanted {
 
 int first_bit(std::uint64_t word) noexcept { return word == 0 ? 64 : std::countr_zero(word); }
 
-// The order of a record's name and a wanted one, as strcmp gives it. Reads whole fields: what
-// stands behind a terminator does not count, because the lowest byte that differs or ends decides.
+// The order of a record's name and a wanted one, as strcmp gives it. Reads whole fields: bytes
+// after a terminator have no effect, because the lowest byte that differs or ends decides.
 int compare_fields(const char (&name)[TEVPF_NAME_SIZE],
                    const char (&wanted)[TEVPF_NAME_SIZE]) noexcept {
   for (const std::size_t offset : {std::size_t{0}, std::size_t{8}, sizeof name - 8}) {
@@ -42,7 +42,7 @@ int compare_fields(const char (&name)[TEVPF_NAME_SIZE],
     }
     if (end < 64) return 0;
   }
-  return -1;  // the wanted name goes on beyond any field
+  return -1;  // the wanted name is longer than any field
 }
 
 int order_of(const TEVPF_PARAM& param, const Wanted& wanted) noexcept {
@@ -50,8 +50,8 @@ int order_of(const TEVPF_PARAM& param, const Wanted& wanted) noexcept {
                                : compare_fields(param.def.name, wanted.field);
 }
 
-// Searches `count` entries; entry(place) gives the position there. Several names can match: once
-// one has been met, the search goes on among those before it, for the first one.
+// Searches `count` entries; entry(place) is the position there. Several names can match: after a
+// match, the search continues before it, for the first one.
 template <class Entry>
 NamePlace search(const TEVPF_PARAM* params, std::int32_t count, const Wanted& wanted,
                  Entry entry) noexcept {

@@ -8,12 +8,12 @@
 namespace tevpf {
 namespace {
 
-constexpr std::int32_t kFewNames = 16;         // fewer are found as fast in the index
-constexpr std::int32_t kLookupsPerTable = 16;  // n / 16 look-ups pay for a table of n names
+constexpr std::int32_t kFewNames = 16;         // with fewer, the index is as fast
+constexpr std::int32_t kLookupsPerTable = 16;  // n / 16 look-ups repay a table of n names
 constexpr std::size_t kLongestName = TEVPF_NAME_SIZE - 1;
 
-// The name as three words, zero behind its end; each word is mixed in by a multiplication whose
-// upper half is folded back.
+// Hashes the name as three zero-padded words; each is mixed in by a multiplication whose upper half
+// is folded into the lower.
 std::uint32_t hash_name(const char* name, std::size_t length) noexcept {
   constexpr std::uint64_t kOdd = 0x9E3779B97F4A7C15u;
   std::uint64_t words[3] = {};
@@ -44,7 +44,7 @@ bool strictly_ascending(const TEVPF_LIST& list) noexcept {
   return true;
 }
 
-// A table of all parameters with room for `names`, at least as many.
+// Builds a table of all parameters with room for `names` names, at least num_params.
 bool build(TEVPF_LIST& list, std::int64_t names) noexcept {
   std::uint64_t slots = 2 * std::uint64_t{kFewNames};
   while (slots < 2 * static_cast<std::uint64_t>(names)) slots *= 2;
@@ -70,8 +70,8 @@ bool table_answers(TEVPF_LIST& list) noexcept {
   if (list.num_params < kFewNames || ++table.lookups < list.num_params / kLookupsPerTable) {
     return false;
   }
-  table.lookups = 0;  // without memory, or in an unordered list: try again after as many more
-  // Where the index is out of order or holds a name twice, only a search in it gives its answers.
+  table.lookups = 0;  // if out of memory or unordered, retry after as many more
+  // If the index is out of order or holds a name twice, only searching it gives the same results.
   table.in_order = table.in_order || strictly_ascending(list);
   return table.in_order && build(list, list.num_params);
 }
@@ -92,7 +92,7 @@ std::int32_t look_up(const TEVPF_LIST& list, const TextPattern& name) noexcept {
 
 void append_name(TEVPF_LIST& list) noexcept {
   NameTable& table = list.names;
-  if (list.num_params == 0) table.in_order = 1;  // and stays so: names are inserted in order
+  if (list.num_params == 0) table.in_order = 1;  // and stays 1: names are inserted in order
   if (table.slots == nullptr) return;
   const bool half_full = static_cast<std::uint32_t>(list.num_params) >= table.mask / 2;
   if (half_full && !build(list, std::int64_t{2} * list.num_params)) {

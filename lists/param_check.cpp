@@ -8,7 +8,7 @@ namespace {
 template <class T>
 TEVPF_STATUS check_number(const TEVPF_PARAM_DEF& definition) noexcept {
   const auto& part = number_part<T>(definition);
-  if (!(part.max >= part.min)) return PF_BADRANGE;  // or not comparable
+  if (!(part.max >= part.min)) return PF_BADRANGE;  // also when either is NaN
   if (part.value > part.max || part.value < part.min) return out_of_range<T>(part.value);
   if constexpr (kIsFloating<T>) {
     if (part.precision < 1) return fail(PF_BADPREC, Text(part.precision), definition.name);

@@ -1,4 +1,4 @@
-// What a parameter's definition and its value must fulfil.
+// The checks on a parameter's definition and value.
 #pragma once
 
 #include "core/base/status.h"
@@ -19,7 +19,7 @@ TEVPF_API TEVPF_STATUS TEV8R1_validate_param_def(const TEVPF_LIST* list,
 
 namespace tevpf {
 
-// The refusal of a number outside its bounds.
+// Reports a number outside its bounds.
 template <class T>
 [[nodiscard]] TEVPF_STATUS out_of_range(T value) noexcept {
   return fail(PF_RANGE, number_text(value));

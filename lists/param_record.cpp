@@ -60,7 +60,7 @@ TextSizes text_sizes(const TEVPF_PARAM_DEF& definition) noexcept {
 }
 
 bool own_texts(TEVPF_PARAM_DEF& definition) noexcept {
-  TextPacker none;  // each text gets a block of its own
+  TextPacker none;  // each text gets its own block
   return own_texts(definition, text_sizes(definition), none, {});
 }
 

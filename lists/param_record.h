@@ -1,4 +1,5 @@
-// One parameter as a record: its stored size, the place of its description, and the texts it owns.
+// The record of one parameter: its stored size, the place of its description, and the texts it
+// owns.
 #pragma once
 
 #include <cstddef>
@@ -11,30 +12,30 @@
 
 extern "C" {
 
-// Replaces the texts that the record points to by heap copies of its own, and gives its stored
-// size.
+// Replaces the texts that the record points to with heap copies that it owns, and returns its
+// stored size.
 //   PF_NOMEM, PF_BADTYPE  the record is as it was
 TEVPF_API TEVPF_STATUS TEV8R1_construct_param(TEVPF_PARAM* param, std::int32_t* bytes_out) noexcept;
 }
 
 namespace tevpf {
 
-// What every parameter takes in the file before its type part.
+// Bytes of every stored parameter before its type part.
 inline constexpr std::int32_t kParamHead = 44;
 
-// Bytes of the type part, of a string without its text; codes that are none count as integers.
+// Bytes of the type part, for a string without its text. Unknown codes count as integers.
 constexpr std::int32_t part_size(std::int32_t type) noexcept {
   return value_type(is_value_type(type) ? type : PF_TYPE_INT).param_part;
 }
 
-// The bytes that the texts of a definition take, terminators counted; 0 where there is no text.
+// Bytes of the texts of a definition, terminators included; 0 for a missing text.
 struct TextSizes {
   std::int64_t value;
   std::int64_t description;
 };
 TextSizes text_sizes(const TEVPF_PARAM_DEF& definition) noexcept;
 
-// Bytes of a parameter in the file, in 64 bits so that no text is too long to be measured.
+// Bytes of a parameter in the file; 64 bits, so that no length overflows.
 constexpr std::int64_t stored_size(std::int32_t type, const TextSizes& texts) noexcept {
   return kParamHead + part_size(type) + texts.value + texts.description;
 }
@@ -43,21 +44,22 @@ std::int64_t stored_size(const TEVPF_PARAM_DEF& definition) noexcept;
 
 // The desc_loc of a record with that definition.
 inline std::int8_t description_place(const TEVPF_PARAM_DEF& definition) noexcept {
-  constexpr std::int32_t kHeadBeforeDef = 8;  // desc_loc counts from behind it
+  constexpr std::int32_t kHeadBeforeDef = 8;  // desc_loc counts from its end
   if (definition.description == nullptr) return 0;
   if (definition.type == PF_TYPE_STRING) return 1;
   return static_cast<std::int8_t>(kParamHead + part_size(definition.type) - kHeadBeforeDef);
 }
 
-// Whether btf can change by that many bytes and still fit its 31 bits.
+// Whether btf still fits in 31 bits after a change by `bytes`.
 bool btf_can_change(const TEVPF_LIST& list, std::int64_t bytes) noexcept;
 
-// A copy of a caller's definition as records hold them: name and units terminated, the absent
-// string value an empty text, length that of the value. The texts still are the caller's.
+// Brings a copy of a caller's definition into the form that records hold: name and units
+// terminated, a missing string value replaced by an empty text, length set from the value. The
+// caller still owns the texts.
 //   PF_NOMEM  the value is longer than 31 bits can say
 [[nodiscard]] TEVPF_STATUS normalise(TEVPF_PARAM_DEF& definition) noexcept;
 
-// Copies the value of a definition that is in order, strings with their terminator.
+// Copies the value of a valid definition; strings with their terminator.
 inline void copy_value(const TEVPF_PARAM_DEF& definition, void* value_out) noexcept {
   if (definition.type == PF_TYPE_STRING) {
     const auto length = static_cast<std::size_t>(definition.part.str.length);
@@ -69,14 +71,14 @@ inline void copy_value(const TEVPF_PARAM_DEF& definition, void* value_out) noexc
   });
 }
 
-// Releases the texts of a definition but those in that block, and leaves null pointers.
+// Releases the texts of a definition except those in `block`, and sets the pointers to null.
 void release_texts(TEVPF_PARAM_DEF& definition, const TextBlock& block = {}) noexcept;
 
-// Replaces the texts that the definition points to by heap copies; false when memory runs out, and
-// then the definition is as it was.
+// Replaces the texts that the definition points to with heap copies that it owns; false when out of
+// memory, and then the definition is unchanged.
 [[nodiscard]] bool own_texts(TEVPF_PARAM_DEF& definition) noexcept;
 
-// The same with copies in the block that is being packed.
+// The same, with copies in the block that is being packed.
 [[nodiscard]] inline bool own_texts(TEVPF_PARAM_DEF& definition, const TextSizes& sizes,
                                     TextPacker& packer, const TextBlock& block) noexcept {
   char* value = nullptr;
@@ -96,16 +98,16 @@ void release_texts(TEVPF_PARAM_DEF& definition, const TextBlock& block = {}) noe
   return true;
 }
 
-// A text on its way into a record: it goes to the place of the old one when that is large enough,
-// else a new block is there before anything changes.
+// A text about to enter a record. It overwrites the old text if that is large enough; otherwise a
+// new block is allocated before anything changes.
 class NewText {
  public:
-  // `text`, of `length` characters, is to replace what stands in a place of `capacity` bytes; null
-  // for no text. false when memory runs out.
+  // `text`, of `length` characters, will replace a text with room for `capacity` bytes; null for no
+  // text. False when out of memory.
   [[nodiscard]] bool prepare(const char* text, std::size_t length, std::size_t capacity) noexcept;
 
-  // Writes it over the old text, or into the new block and releases the old one, unless the list's
-  // text block holds that. Gives what stands there now, null for no text.
+  // Overwrites the old text, or fills the new block and releases the old text unless it lies in the
+  // list's text block. Returns the text now in place, null for no text.
   char* commit(char* old, const TextBlock& block) noexcept;
 
  private:

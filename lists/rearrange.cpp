@@ -1,5 +1,5 @@
-// Deleting, renaming and moving parameters: nothing here allocates, so after the checks nothing
-// fails.
+// Deleting, renaming and moving parameters. Nothing here allocates, so nothing fails after the
+// checks.
 #include <algorithm>
 #include <cstring>
 
@@ -14,7 +14,7 @@ using namespace tevpf;
 
 namespace {
 
-// The list and the place of the parameter in its name index.
+// Finds the list and the place of the parameter in its name index.
 TEVPF_STATUS find(const char* list_name, const char* param_name, TEVPF_LIST*& list,
                   std::int32_t& place) noexcept {
   PF_TRY(find_list(list_name, list));
@@ -52,7 +52,8 @@ TEVPF_STATUS TEV8R1_PF_modify_param_name(const char* list_name, const char* old_
   set_field(kept, new_name);
   const NamePlace wanted = search_others(*list, place, kept);
   if (wanted.found) return fail(PF_DUPLICATE, {"parameter ", new_name}, {"list ", list_name});
-  // An absent name leaves what every look-up of one leaves, here too, where that is a success.
+  // The look-up of an absent name always sets the error context, even here, where absence is
+  // success.
   static_cast<void>(fail(PF_NOPARAM, new_name));
 
   TEVPF_PARAM& param = list->param_ptr[list->index_ptr[place]];

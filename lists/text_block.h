@@ -1,8 +1,8 @@
-// One block for the texts that a list gets all at once, when it is opened or copied: a block for each
-// of them would take longer than all the rest.
+// One block for all texts that a list receives at once, when it is opened or copied. A separate
+// block for each text would take longer than everything else.
 //
-// A text in the block is overwritten while its successor fits, and never released alone; one that
-// does not fit becomes a block of its own.
+// A text in the block is overwritten if its replacement fits, and is never released alone; a
+// replacement that does not fit gets its own block.
 #pragma once
 
 #include <cstdint>
@@ -13,7 +13,7 @@
 namespace tevpf {
 
 struct TextBlock {
-  char* begin;  // null: there is none
+  char* begin;  // null: no block
   char* end;
 
   bool holds(const char* text) const noexcept {
@@ -23,15 +23,15 @@ struct TextBlock {
   }
 };
 
-// Releases a text that the block does not hold; null is fine.
+// Releases a text unless the block holds it; null is allowed.
 inline void release_text(const TextBlock& block, char* text) noexcept {
   if (!block.holds(text)) heap_free(text);
 }
 
-// Copies texts into a new block, one behind the other.
+// Copies texts into a new block, one after the other.
 class TextPacker {
  public:
-  // Makes the block. False when memory runs out.
+  // Allocates the block. False when out of memory.
   [[nodiscard]] bool reserve(std::int64_t bytes, TextBlock& block) noexcept {
     block = {};
     next_ = end_ = nullptr;
@@ -43,8 +43,8 @@ class TextPacker {
     return true;
   }
 
-  // The copy of a text, which takes `size` bytes with its terminator; one that does not fit gets a
-  // block of its own. Null when memory runs out.
+  // Copies a text of `size` bytes, terminator included; a text that does not fit gets its own
+  // block. Null when out of memory.
   [[nodiscard]] char* pack(const char* text, std::int64_t size) noexcept {
     if (size > end_ - next_)
       return static_cast<char*>(heap_copy(text, static_cast<std::uint64_t>(size)));
@@ -54,7 +54,7 @@ class TextPacker {
     return copy;
   }
 
-  // Gives the block back when it holds no text.
+  // Releases the block if it holds no text.
   void finish(TextBlock& block) const noexcept {
     if (next_ != block.begin) return;
     heap_free(block.begin);

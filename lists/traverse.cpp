@@ -16,7 +16,7 @@ void copy_text(char* out, const char* text) noexcept {
 }
 
 // Makes a parameter the current one and copies its definition into the caller's record, whose two
-// pointers lead to the caller's buffers and stay.
+// pointers refer to the caller's buffers and are kept.
 void deliver(TEVPF_LIST& list, std::int32_t position, TEVPF_PARAM_DEF& out) noexcept {
   const TEVPF_PARAM_DEF& definition = list.param_ptr[position].def;
   TEVPF_PARAM_DEF copy = definition;
@@ -52,7 +52,8 @@ inline TEVPF_STATUS step(TEVPF_LIST& list, char* name_out, void* value_out) noex
 
 using namespace tevpf;
 
-// Lists are walked by the million, one call a parameter: the usual case keeps nothing across a call.
+// Callers walk millions of parameters, one call for each: the common path keeps no values across a
+// call.
 TEVPF_STATUS TEV8R1_PF_get_next_param(const char* list_name, char* name_out,
                                       void* value_out) noexcept {
   TEVPF_LIST* const list = last_list(list_name);
@@ -74,7 +75,7 @@ TEVPF_STATUS TEV8R1_PF_get_prev_param_def(const char* list_name,
   TEVPF_LIST* list;
   PF_TRY(find_list(list_name, list));
   if (list->cur_param <= 0 || list->num_params == 0) return PF_NOMORE;
-  // A cursor that was left beyond the last parameter steps back to that one.
+  // A cursor past the last parameter steps back to the last one.
   deliver(*list, std::min(list->cur_param, list->num_params) - 1, *definition);
   return PF_NORMAL;
 }

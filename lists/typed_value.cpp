@@ -1,4 +1,4 @@
-// Values of parameters for callers that name the type they expect.
+// Parameter values for callers that state the expected type.
 #include "include/tevpf_access.h"
 #include "lists/find.h"
 #include "lists/param_record.h"

@@ -15,7 +15,7 @@ TEVPF_STATUS bad_type(std::int32_t type) noexcept {
   return fail(PF_BADTYPE, "parameter", Text(type));
 }
 
-// Bounds are inclusive and exact; what is not a number lies outside of any.
+// Bounds are inclusive and exact; NaN is out of range for any bounds.
 template <class T>
 TEVPF_STATUS change_number(TEVPF_PARAM_DEF& definition, T value) noexcept {
   auto& part = number_part<T>(definition);
@@ -45,7 +45,7 @@ template <class T>
 TEVPF_STATUS number_from_text(std::int32_t type, const char* text,
                               TEVPF_PARAM_DEF& definition) noexcept {
   auto& part = number_part<T>(definition);
-  T value = part.value;  // empty text may leave it
+  T value = part.value;  // empty text leaves a real or double unchanged
   PF_TRY(TEV8R1_from_char(type, text, &value));
   part.value = value;
   return PF_NORMAL;

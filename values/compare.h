@@ -1,8 +1,8 @@
-// How values are ordered and matched: every index, range check, uniqueness check and search
-// compares through here.
+// The order and equality of values: every index, range check, uniqueness check and search compares
+// through this file.
 //
-// A search prepares its key once (with_key) and then compares stored values with it, without a look
-// at the type at each step. The stored value is always the left side, so that only a key can be a
+// A search prepares its key once (with_key) and then compares stored values with it, without a type
+// check per comparison. The stored value is always the left operand, so only a key can be a
 // pattern.
 #pragma once
 
@@ -15,8 +15,8 @@
 
 namespace tevpf {
 
-// a against b: negative, 0 or positive. Reals and doubles that lie within the tolerance are equal,
-// and so is anything compared with what is not a number.
+// Compares a with b: negative, 0 or positive. Reals and doubles within the tolerance are equal, and
+// NaN is equal to everything.
 template <class T>
 int compare_numbers(T a, T b, [[maybe_unused]] double tolerance) noexcept {
   if constexpr (kIsFloating<T>) {
@@ -38,7 +38,7 @@ class NumberKey {
   NumberKey(const void* key, double tolerance) noexcept
       : key_(load<T>(key)), tolerance_(tolerance) {}
 
-  // The value stored at `place` against the key: negative, 0 or positive.
+  // Compares the value stored at `place` with the key: negative, 0 or positive.
   int compare(const unsigned char* place) const noexcept {
     return compare_numbers(load<T>(place), key_, tolerance_);
   }
@@ -56,15 +56,15 @@ class NumberKey {
     }
   }
 
-  // False when none of kCount values, a multiple of 4, equals the key; place(i) is where value i is
-  // stored. Whether a real lies below or above the key is a coin toss that no processor predicts, so
-  // there is no branch on a single value.
+  // False if none of kCount values equals the key; kCount is a multiple of 4, and value i is stored
+  // at place(i). Whether a real lies below or above the key is unpredictable for the branch
+  // predictor, so there is no branch per value.
   template <std::int32_t kCount, class Place>
   bool may_equal_one_of(const Place& place) const noexcept {
     if constexpr (kIsFloating<T>) {
       return !(tolerance_ >= 0) || is_near_one_of<kCount>(place);
     } else {
-      using Flag = std::make_unsigned_t<T>;  // as wide as a value: compilers make vectors of them
+      using Flag = std::make_unsigned_t<T>;  // as wide as a value, so that compilers vectorise
       Flag found = 0;
       for (std::int32_t i = 0; i < kCount; ++i) {
         found = static_cast<Flag>(found | Flag{equals(place(i))});
@@ -74,8 +74,8 @@ class NumberKey {
   }
 
  private:
-  // Counts in doubles, which every processor compares and selects two at a time, and in two sums by
-  // turns, so that an addition need not wait for the one before.
+  // Counts in doubles, which every processor compares and selects two at a time, with two
+  // alternating sums, so that an addition does not wait for the previous one.
   template <std::int32_t kCount, class Place>
   bool is_near_one_of(const Place& place) const noexcept {
     using Pair [[gnu::vector_size(2 * sizeof(double))]] = double;
@@ -95,20 +95,20 @@ class NumberKey {
   }
 
   T key_;
-  double tolerance_;  // of no use to integers
+  double tolerance_;  // unused for integers
 };
 
 inline constexpr std::size_t kHeadSize = 8;
 
-// The first eight bytes of a text as a number that orders as they do; zeros behind its terminator.
-// All eight bytes must be readable.
+// The first eight bytes of a text as a number with the same order; bytes after the terminator are
+// zero. All eight bytes must be readable.
 inline std::uint64_t wide_text_head(const unsigned char* text) noexcept {
   const std::uint64_t bytes = load_word(text);
   const std::uint64_t ends = zero_bytes(bytes);
-  return __builtin_bswap64(bytes & (ends ^ (ends - 1)));  // up to the first zero byte; all without
+  return __builtin_bswap64(bytes & (ends ^ (ends - 1)));  // up to the first zero byte, or all eight
 }
 
-// The same when nothing behind the terminator may be read.
+// The same, but reads nothing past the terminator.
 inline std::uint64_t text_head(const unsigned char* text) noexcept {
   std::uint64_t head = 0;
   for (std::size_t i = 0; i < kHeadSize && text[i] != 0; ++i) {
@@ -120,7 +120,8 @@ inline std::uint64_t text_head(const unsigned char* text) noexcept {
 // Whether a head holds its whole text, so that equal heads are equal texts.
 constexpr bool holds_whole_text(std::uint64_t head) noexcept { return (head & 0xFF) == 0; }
 
-// A text or pattern to search for. kWide: eight bytes may be read from the start of every value.
+// A text or pattern to search for. kWide: at least eight bytes are readable from the start of every
+// value.
 template <bool kWide>
 class TextKey {
  public:
@@ -129,7 +130,7 @@ class TextKey {
 
   explicit TextKey(const void* key) noexcept
       : pattern_(make_pattern(static_cast<const char*>(key))) {
-    // Of a prefix only its own bytes are compared, of a text the terminator too.
+    // For a prefix, only its own bytes are compared; for a text, the terminator too.
     const std::size_t compared = pattern_.length + (pattern_.prefix ? 0 : 1);
     if (compared < kHeadSize) head_mask_ = ~(~std::uint64_t{0} >> (8 * compared));
     head_ = text_head(static_cast<const unsigned char*>(key)) & head_mask_;
@@ -146,7 +147,7 @@ class TextKey {
     return compare_rest(place);
   }
   bool is_above(const unsigned char* place) const noexcept { return compare(place) < 0; }
-  // compare() == 0: without the order, what stands behind a terminator need not be cut off.
+  // compare() == 0. Without the order, bytes after a terminator need not be masked off.
   bool equals(const unsigned char* place) const noexcept {
     if constexpr (kWide) {
       if (((__builtin_bswap64(load<std::uint64_t>(place)) ^ head_) & head_mask_) != 0) return false;
@@ -162,12 +163,12 @@ class TextKey {
   }
 
   TextPattern pattern_;  // what follows the head
-  bool has_rest_;        // false: the head says it all
+  bool has_rest_;        // false: the head decides alone
   std::uint64_t head_;
   std::uint64_t head_mask_ = ~std::uint64_t{0};
 };
 
-// Steps from `first` over blocks of kCount values while none of a block can equal the key.
+// Skips blocks of kCount values from `first` on while no value of a block can equal the key.
 template <std::int32_t kCount, class T, class Place>
 std::int32_t skip_blocks(std::int32_t first, std::int32_t count, const NumberKey<T>& key,
                          const Place& place) noexcept {
@@ -177,14 +178,14 @@ std::int32_t skip_blocks(std::int32_t first, std::int32_t count, const NumberKey
   return at;
 }
 
-// The first position from `first` on whose value equals the key, `count` when there is none; place(at)
-// is where the value at a position is stored. Numbers are compared a long block at a time, then a short
-// one.
+// The first position from `first` on whose value equals the key, or `count` if none does; place(at)
+// is the address of the value at a position. Numbers are compared in long blocks first, then in
+// short ones.
 template <class Key, class Place>
 std::int32_t find_first(std::int32_t first, std::int32_t count, const Key& key,
                         const Place& place) noexcept {
 #ifdef TEVPF_TEST_HOOKS
-  constexpr std::int32_t kLong = 8;  // small tables too have blocks
+  constexpr std::int32_t kLong = 8;  // even small tables have blocks
 #else
   constexpr std::int32_t kLong = 64;
 #endif
@@ -197,7 +198,7 @@ std::int32_t find_first(std::int32_t first, std::int32_t count, const Key& key,
   return at;
 }
 
-// The same for values side by side.
+// The same for contiguous values.
 template <class T>
 std::int32_t find_in_line(const void* values, std::int32_t count, std::int32_t first,
                           const NumberKey<T>& key) noexcept {
@@ -206,8 +207,8 @@ std::int32_t find_in_line(const void* values, std::int32_t count, std::int32_t f
   });
 }
 
-// Calls f with the prepared key of a valid type. `readable` is how many bytes can be read from the
-// start of every stored value, or 0 when that is not known.
+// Calls f with the prepared key of a valid type. `readable` is the number of bytes readable from
+// the start of every stored value, or 0 if unknown.
 template <class F>
 decltype(auto) with_key(std::int32_t type, double tolerance, const void* key, std::int64_t readable,
                         F&& f) {

@@ -1,5 +1,5 @@
-// Values as text and text as values. Nothing here reads the locale but the white-space class and,
-// in formats that the caller brings, printf itself.
+// Converts values to text and text to values. The locale affects only the white-space class and,
+// for formats supplied by the caller, printf itself.
 #include <cctype>
 #include <cfloat>
 #include <charconv>
@@ -42,15 +42,15 @@ TEVPF_STATUS convert_integer(const char* text, std::int32_t type, std::size_t lo
 
 enum class Number { kNone, kOutOfRange, kEmpty, kValue };
 
-// Only what a number in range leaves behind it makes the text no number; one out of range is that
-// whatever follows. Numbers too small for full precision are out of range like those too large.
+// Trailing characters make a text invalid only if its number is in range; a number out of range is
+// reported as such whatever follows it. Subnormal numbers are out of range, as are those too large.
 Number parse_double(const char* text, double& value) noexcept {
   if (*text == '\0') return Number::kEmpty;
   const char* start = text;
   while (is_space(*start)) ++start;
   const bool negative = *start == '-';
   if (*start == '-' || *start == '+') ++start;
-  // Keeps infinities, what is not a number and a second sign from being read.
+  // Rejects infinities, NaN and a second sign.
   if (!is_digit(*start) && *start != '.') return Number::kNone;
 
   double magnitude = 0.0;
@@ -64,7 +64,7 @@ Number parse_double(const char* text, double& value) noexcept {
   return Number::kValue;
 }
 
-// As TEV8R1_convert_double, with the word that the type is called by in the error context.
+// As TEV8R1_convert_double, with the word for the type in the error context.
 TEVPF_STATUS convert_floating(const char* text, std::int32_t type, double& result) noexcept {
   switch (parse_double(text, result)) {
     case Number::kNone:
@@ -94,7 +94,7 @@ TEVPF_STATUS convert_into(void* destination, const char* text,
   return PF_NORMAL;
 }
 
-// Formats with the caller's format, which takes exactly this argument; gives the length.
+// Formats with the caller's format, which takes exactly this argument; returns the length.
 template <class Argument>
 std::int32_t print(char* destination, const char* format, Argument argument) noexcept {
   const int length = std::snprintf(nullptr, 0, format, argument);

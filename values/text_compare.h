@@ -6,15 +6,16 @@
 
 namespace tevpf {
 
-// What texts are compared with. Examined once, used for a whole search; it points to the text it
-// was made from.
+// The right operand of text comparisons. Built once for a whole search; it points to the text it
+// was made from and does not own it.
 struct TextPattern {
   const char* text;
-  std::size_t length;  // of the text; of a prefix: without the "*"
+  std::size_t length;  // of the text; for a prefix, without the "*"
   bool prefix;         // equals every text that starts with it
 };
 
-// A text whose first "*" is its last character is a prefix; every other "*" is a character.
+// A text whose first "*" is its last character is a prefix pattern; any other "*" is an ordinary
+// character.
 inline TextPattern make_pattern(const char* text) noexcept {
   const char* const star = std::strchr(text, '*');
   if (star != nullptr && star[1] == '\0') {
@@ -23,8 +24,8 @@ inline TextPattern make_pattern(const char* text) noexcept {
   return {text, std::strlen(text), false};
 }
 
-// Below 0, 0 or above 0 for a text before, equal to or after the pattern. Bytes are unsigned; a
-// text stands before its extensions.
+// Negative, 0 or positive if the text sorts before, equal to or after the pattern. Bytes compare as
+// unsigned; a text sorts before its extensions.
 inline int compare_text(const char* text, const TextPattern& pattern) noexcept {
   return pattern.prefix ? std::strncmp(text, pattern.text, pattern.length)
                         : std::strcmp(text, pattern.text);

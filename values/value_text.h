@@ -15,7 +15,8 @@ Text number_text(T value) noexcept {
   }
 }
 
-// A value by its type code. Points to a text value, which must outlive it.
+// The text of a value, given its type code. Points to a string value, which must outlive this
+// object.
 class ValueText {
  public:
   ValueText(std::int32_t type, const void* value) noexcept

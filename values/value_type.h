@@ -1,7 +1,8 @@
-// The five value types: the one place that knows them by their codes.
+// The five value types: maps their codes to properties and C++ types.
 //
-// What differs by a number is a table (value_type); what differs by code is one dispatch with a
-// typed tag (with_number); strings are the fifth type and always stand beside the four numbers.
+// Numeric differences are in a table (value_type); differences in code go through one dispatch with
+// a typed tag (with_number). Strings are the fifth type and are always handled separately from the
+// four number types.
 #pragma once
 
 #include <cstdint>
@@ -14,20 +15,20 @@
 namespace tevpf {
 
 struct ValueType {
-  std::int32_t size;         // bytes of a value; strings: 0, their width decides
+  std::int32_t size;         // bytes of a value; strings: 0, as their width decides
   std::int32_t alignment;    // of a value in a row
-  std::int32_t param_part;   // stored type part of a parameter; strings: length field alone
-  std::int32_t column_part;  // stored limits of a column
+  std::int32_t param_part;   // bytes of the stored type part of a parameter; strings: the length
+  std::int32_t column_part;  // bytes of a column's stored limits
   const char* word;          // in the error context of conversions
 };
 
-// In the order of the type codes, from PF_TYPE_INT on.
+// In the order of the type codes, starting at PF_TYPE_INT.
 inline constexpr ValueType kValueTypes[] = {
     {4, 4, 12, 8, "integer"}, {4, 4, 16, 12, "real"}, {0, 1, 4, 0, ""},
     {8, 8, 28, 20, "double"}, {2, 2, 6, 4, "short"},
 };
 
-// Tables of this order elsewhere have so many entries.
+// The number of entries of every table in this order.
 inline constexpr std::int32_t kValueTypeCount = std::size(kValueTypes);
 static_assert(PF_TYPE_INT + kValueTypeCount - 1 == PF_TYPE_SHORT);
 
@@ -35,12 +36,12 @@ constexpr bool is_value_type(std::int32_t type) noexcept {
   return type >= PF_TYPE_INT && type < PF_TYPE_INT + kValueTypeCount;
 }
 
-// The facts of a valid type.
+// The properties of a valid type.
 constexpr const ValueType& value_type(std::int32_t type) noexcept {
   return kValueTypes[type - PF_TYPE_INT];
 }
 
-// Bytes of one value of a valid type, in 64 bits whatever the width.
+// Bytes of one value of a valid type; 64 bits, so that no width overflows.
 constexpr std::int64_t value_size(std::int32_t type, std::int32_t width) noexcept {
   return type == PF_TYPE_STRING ? std::int64_t{width} + 1 : value_type(type).size;
 }
@@ -48,8 +49,8 @@ constexpr std::int64_t value_size(std::int32_t type, std::int32_t width) noexcep
 template <class T>
 inline constexpr bool kIsFloating = std::is_floating_point_v<T>;
 
-// Calls f with a value of the C++ type behind a number's type code: int32_t, float, double or
-// int16_t. The type must be one of the four numbers.
+// Calls f with a value of the C++ type for a number's type code: int32_t, float, double or int16_t.
+// The type must be one of the four numbers.
 template <class F>
 decltype(auto) with_number(std::int32_t type, F&& f) {
   switch (type) {
@@ -72,7 +73,7 @@ constexpr bool is_floating_type(std::int32_t type) noexcept {
   return type == PF_TYPE_REAL || type == PF_TYPE_DOUBLE;
 }
 
-// Values in rows and callers' buffers lie at any address.
+// Values in rows and callers' buffers may be unaligned.
 template <class T>
 T load(const void* place) noexcept {
   static_assert(std::is_trivially_copyable_v<T>);

@@ -1,5 +1,5 @@
-// The error context itself: the texts of the most recent failure. Written by core/base/status alone;
-// read by core/base/message and by the tests, which link the static library.
+// The error context: the two texts of the most recent failure. Only core/base/status writes it;
+// core/base/message and the tests, which link the static library, read it.
 #pragma once
 
 namespace tevpf {

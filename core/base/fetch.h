@@ -1,4 +1,4 @@
-// Asking for memory before it is needed.
+// Prefetches memory.
 #pragma once
 
 #include <cstddef>
@@ -6,10 +6,10 @@
 
 namespace tevpf {
 
-// For walks that go up through memory and are at `place`: asks for what they will come to, both ends of
-// so many bytes. The processor does so of itself, but not beyond a page. Behind the end of a block it
-// does no harm. As a function of its own it would have no effect that the compiler knows of, and be
-// left out.
+// Prefetches for a walk towards higher addresses that has reached `place`: the first and the last
+// of `bytes` bytes, a fixed distance ahead. The hardware prefetcher stops at page boundaries.
+// Prefetching past the end of a block is harmless. The function must be inlined: the compiler sees
+// no effect in a separate call and may remove it.
 [[gnu::always_inline]] inline void fetch_along(const void* place, std::size_t bytes = 1) noexcept {
   constexpr std::uintptr_t kAhead = 2048;
   const std::uintptr_t ahead = reinterpret_cast<std::uintptr_t>(place) + kAhead;

@@ -1,4 +1,4 @@
-// Blocks of the C runtime, and the exported helpers on raw memory.
+// Allocation from the C runtime, and the exported helpers for raw memory.
 #include "core/base/heap.h"
 
 #include <cstdlib>
@@ -32,9 +32,10 @@ bool must_fail(std::uint64_t bytes) noexcept {
 constexpr bool must_fail(std::uint64_t) noexcept { return false; }
 #endif
 
-// Asks for a large block in large pages: fresh memory then costs one fault for 2 MB instead of 512,
-// and rows reached at random hardly ever miss in the address cache. Only a hint. It covers every page that
-// the block touches: a mapping of which only a part is hinted at cannot be grown without copying it.
+// Requests huge pages for a large block: fresh memory then takes one page fault per 2 MB instead of
+// 512, and random row access rarely misses in the TLB. This is only a hint. It covers every page
+// that the block touches, because a mapping that is only partly advised cannot grow without being
+// copied.
 void* in_large_pages(void* block, [[maybe_unused]] std::size_t bytes) noexcept {
 #ifdef __linux__
   constexpr std::size_t kLarge = std::size_t{4} << 20;
@@ -48,7 +49,7 @@ void* in_large_pages(void* block, [[maybe_unused]] std::size_t bytes) noexcept {
   return block;
 }
 
-// Bytes of a block of count * size, at least one; 0 when no block can be that large.
+// The size in bytes of a block of count * size, at least 1; 0 if no block can be that large.
 std::size_t block_bytes(std::uint64_t count, std::uint64_t size) noexcept {
   if (count == 0 || size == 0) return 1;
   if (count > static_cast<std::uint64_t>(PTRDIFF_MAX) / size) return 0;
@@ -112,7 +113,7 @@ char* TEV8R1_strdup(const char* text) noexcept { return heap_copy(text); }
 
 TEVPF_STATUS TEV8R1_allocate_elem(std::int32_t count, std::int32_t increment, std::int32_t size,
                                   void** array, void** first_new_out) noexcept {
-  // A negative number asks for a block that cannot be had.
+  // Negative numbers describe a block that cannot be allocated.
   if (count < 0 || increment < 0 || size < 0) return fail_empty(PF_NOMEM);
   const auto entries = static_cast<std::uint64_t>(std::int64_t{count} + increment);
   const auto bytes = static_cast<std::uint64_t>(size);
@@ -125,7 +126,7 @@ TEVPF_STATUS TEV8R1_allocate_elem(std::int32_t count, std::int32_t increment, st
 
 TEVPF_STATUS TEV8R1_insert_index_value(std::int32_t* array, std::int32_t count,
                                        std::int32_t position, std::int32_t value) noexcept {
-  if (position < 0 || position > count) return PF_NORMAL;  // no such place
+  if (position < 0 || position > count) return PF_NORMAL;  // out of range: nothing to insert
   const auto behind = static_cast<std::size_t>(count - position);
   std::memmove(array + position + 1, array + position, behind * sizeof *array);
   array[position] = value;

@@ -1,6 +1,6 @@
 // A number is m * 2^e with m below 2^53, and 10^q is 5^q * 2^q. For |q| up to 27, 5^q fits 64 bits,
-// so that m * 2^e * 10^q is a product or a quotient of 128 bits at most, and rounding it needs no
-// estimate of an error.
+// so m * 2^e * 10^q is a product or quotient of at most 128 bits and is rounded exactly, without an
+// error estimate.
 #include "core/base/leading_digits.h"
 
 #include <bit>
@@ -62,12 +62,12 @@ std::uint64_t scaled(std::uint64_t m, int e, int q) noexcept {
 bool leading_digits(double number, std::int32_t count, LeadingDigits& out) noexcept {
   const auto bits = std::bit_cast<std::uint64_t>(number);
   const int biased = static_cast<int>(bits >> kMantissaBits);
-  if (biased == 0) return false;  // far below what 128 bits can scale
+  if (biased == 0) return false;  // subnormal: too small for 128 bits
   const int e = biased - kExponentBias;
   const std::uint64_t m =
       (bits & ((std::uint64_t{1} << kMantissaBits) - 1)) | (std::uint64_t{1} << kMantissaBits);
 
-  // floor(log10(2^b)) for |b| up to some hundreds; the number's own may be one more.
+  // floor(log10(2^b)), correct for |b| up to several hundred; that of the number may be one more.
   std::int32_t exponent = ((e + kMantissaBits) * 78913) >> 18;
   int q = count - 1 - exponent;
   if (q > kMostPower || q <= -kMostPower) return false;

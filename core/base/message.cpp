@@ -1,6 +1,6 @@
-// Statuses as people read them. The sentences stand in one table; for a status with several, the
-// first one decides whose condition the two texts meet. The conditions also keep out texts of an
-// earlier failure, which a refusal without texts of its own leaves behind.
+// Readable messages for statuses. All sentences are in one table. If a status has several, the
+// first whose condition holds for the two texts is used. The conditions also reject texts of an
+// earlier failure, which remain when a refusal writes no texts of its own.
 #include "include/tevpf_message.h"
 
 #include <algorithm>
@@ -18,7 +18,7 @@ struct StatusName {
   const char* name;
 };
 
-// In the order of their message numbers, from 1 on; 13 and 25 are no statuses.
+// In the order of their message numbers, starting at 1; 13 and 25 are unused.
 constexpr StatusName kNames[] = {
     {PF_NORMAL, "PF_NORMAL"},
     {PF_NEWFILE, "PF_NEWFILE"},
@@ -99,8 +99,8 @@ bool is_name_index_of(const Texts& texts) noexcept {
   return is_name_index(texts) && has_both(texts);
 }
 
-// {1} and {2} stand for the two texts; [1] and [2] for texts such as "column melting", whose name is
-// put in quotes.
+// {1} and {2} stand for the two texts; [1] and [2] for texts such as "column melting", whose name
+// is quoted.
 struct Sentence {
   TEVPF_STATUS status;
   Condition holds;
@@ -168,7 +168,7 @@ constexpr Sentence kSentences[] = {
     {PF_SEARCHSET, always, "rows cannot move while a search column is set"},
 };
 
-// A text into a caller's buffer: counts all of it, keeps what fits.
+// Writes a text into a caller's buffer: counts all characters, keeps those that fit.
 class Output {
  public:
   Output(char* buffer, std::size_t size) noexcept : buffer_(buffer), size_(size) {}
@@ -180,14 +180,14 @@ class Output {
   void put(std::string_view text) noexcept {
     for (const char c : text) put(c);
   }
-  // A text of any content, on one line.
+  // Escapes control characters, so that any text stays on one line.
   void put_visible(std::string_view text) noexcept {
     for (const char c : text) put_visible(static_cast<unsigned char>(c));
   }
   void put_hex(std::uint32_t number, int digits) noexcept {
     while (digits-- > 0) put("0123456789abcdef"[(number >> (4 * digits)) & 0xFU]);
   }
-  // Terminates the text and gives the length of all of it.
+  // Terminates the text and returns its full length, including what did not fit.
   std::size_t end() noexcept {
     if (size_ > 0) buffer_[std::min(length_, size_ - 1)] = '\0';
     return length_;
@@ -209,7 +209,7 @@ class Output {
   std::size_t length_ = 0;
 };
 
-// "column melting" as column 'melting', "elementX" as element 'X'; other texts as they are.
+// Writes "column melting" as column 'melting' and "elementX" as element 'X'; other texts unchanged.
 void put_named(Output& out, std::string_view text) noexcept {
   static constexpr std::string_view kKinds[] = {"list",      "table", "column",
                                                 "parameter", "value", "element"};

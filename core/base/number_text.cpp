@@ -1,5 +1,5 @@
-// std::to_chars knows no locale and gives printf's bytes, except that it does so on every platform.
-// Usual floating-point numbers take a faster way to the same bytes.
+// std::to_chars ignores the locale and writes the same bytes as printf, identically on every
+// platform. Common floating-point numbers take a faster path to the same bytes.
 #include "core/base/number_text.h"
 
 #include <algorithm>
@@ -28,7 +28,7 @@ char* write_exponent(char* out, std::int32_t exponent) noexcept {
   return write_decimal(out, size);
 }
 
-// Digits as "%g" has them: trailing zeros behind the point are left out.
+// Writes digits as "%g" does: without trailing zeros after the decimal point.
 char* write_digits(char* out, const LeadingDigits& number, std::int32_t precision) noexcept {
   char text[kMaxDecimal];
   const char* const all = write_decimal(text, static_cast<std::int64_t>(number.digits));
@@ -56,7 +56,7 @@ char* write_digits(char* out, const LeadingDigits& number, std::int32_t precisio
 }  // namespace
 
 char* write_decimal(char* out, std::int64_t number) noexcept {
-  const auto small = static_cast<std::int32_t>(number);  // 32-bit divisions are the cheaper ones
+  const auto small = static_cast<std::int32_t>(number);  // 32-bit divisions are cheaper
   if (small == number) return std::to_chars(out, out + kMaxDecimal, small).ptr;
   return std::to_chars(out, out + kMaxDecimal, number).ptr;
 }

@@ -5,13 +5,13 @@
 
 namespace tevpf {
 
-inline constexpr int kDefaultPrecision = 6;  // of "%g"; printf lets a negative one count as this
+inline constexpr int kDefaultPrecision = 6;  // of "%g", and for a negative precision
 
-// Largest precision that a number is written with.
+// The largest precision used; larger ones are reduced to it.
 inline constexpr int kMaxPrecision = 1100;
 
-// Room for any number that write_general writes with that precision: sign, digits, point, exponent
-// and the leading zeros of a small number.
+// Bytes for any number that write_general writes with that precision: sign, digits, decimal point,
+// exponent and the leading zeros of a small number.
 inline constexpr int kMaxNumberText = kMaxPrecision + 32;
 
 // Write a number at `out` without a terminator and return the end of the text.

@@ -10,7 +10,7 @@ namespace {
 
 constexpr std::uint32_t kBits = 64;
 
-// n entries below n that reach every number are a permutation. For few: one bit a number.
+// n entries below n that cover every number form a permutation. For small n: one bit per number.
 bool few_reach_all(const std::int32_t* entries, std::uint32_t count) noexcept {
   std::uint64_t reached = 0;
   for (std::uint32_t i = 0; i < count; ++i) {
@@ -21,8 +21,8 @@ bool few_reach_all(const std::int32_t* entries, std::uint32_t count) noexcept {
   return reached == ~std::uint64_t{0} >> (kBits - count);
 }
 
-// One byte a number: a plain store for each entry, none of which waits for the one before, as it
-// would where neighbours share a word.
+// One byte per number: each entry is a plain store that does not depend on the previous one, as it
+// would if numbers shared a word.
 bool reach_all(const std::int32_t* entries, std::uint32_t count, unsigned char* reached) noexcept {
   for (std::uint32_t i = 0; i < count; ++i) {
     const auto entry = static_cast<std::uint32_t>(entries[i]);

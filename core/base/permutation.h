@@ -1,4 +1,4 @@
-// Whether an index that a file holds is one.
+// Validates an index that was read from a file.
 #pragma once
 
 #include <cstdint>
@@ -6,8 +6,8 @@
 
 namespace tevpf {
 
-// Whether `entries` holds each of 0 .. count - 1 once. O(count); nothing when there is no memory to
-// tell.
+// Whether `entries` holds each of 0 .. count - 1 exactly once. O(count); std::nullopt when out of
+// memory.
 [[nodiscard]] std::optional<bool> is_permutation(const std::int32_t* entries,
                                                  std::int32_t count) noexcept;
 

@@ -1,4 +1,4 @@
-// Copies of a few bytes, which a call would cost more than.
+// Copies a few bytes inline, where a call would cost more than the copy.
 #pragma once
 
 #include <cstddef>
@@ -7,7 +7,7 @@
 
 namespace tevpf {
 
-// memcpy. From 16 up to 128 bytes go 16 at a time, the last ones over those before.
+// memcpy. From 16 to 128 bytes, copies 16 at a time; the last 16 may overlap those before.
 inline void copy_short(void* to, const void* from, std::int64_t count) noexcept {
   constexpr std::int64_t kStep = 16, kMost = 128;
   auto* const out = static_cast<unsigned char*>(to);

@@ -1,4 +1,4 @@
-// How operations fail: one status, and two short texts that say what failed and where.
+// How operations fail: with one status and two short texts that say what failed and where.
 //
 // Three ways, each visible where it happens:
 //   return fail(PF_BADPOS, Text(pos), Text(count));   writes both texts
@@ -12,7 +12,7 @@
 
 namespace tevpf {
 
-// A number as text, "%d" or "%g", in a buffer of its own.
+// A number as text, formatted with "%d" or "%g", in its own buffer.
 class Text {
  public:
   explicit Text(std::int32_t number) noexcept;
@@ -23,8 +23,7 @@ class Text {
   char buffer_[32];
 };
 
-// What goes into one of the two texts: a fixed word and what it is about, written one behind the
-// other.
+// The content of one of the two texts: a fixed word followed by its subject.
 struct Phrase {
   Phrase(const char* whole) noexcept : lead(whole), rest("") {}
   Phrase(const char* word, const char* subject) noexcept : lead(word), rest(subject) {}
@@ -34,20 +33,20 @@ struct Phrase {
   const char* rest;
 };
 
-// Writes both texts, cut to their sizes, and gives the status back.
+// Writes both texts, truncated to their sizes, and returns the status.
 [[nodiscard]] TEVPF_STATUS fail(TEVPF_STATUS status, Phrase item, Phrase value = "") noexcept;
 
-// Empties both texts and gives the status back.
+// Empties both texts and returns the status.
 [[nodiscard]] TEVPF_STATUS fail_empty(TEVPF_STATUS status) noexcept;
 
-// Writes the first text only; the second one stays as it was.
+// Writes only the first text and returns the status; the second text is unchanged.
 [[nodiscard]] TEVPF_STATUS fail_item(TEVPF_STATUS status, Phrase item) noexcept;
 
 void clear_error_context() noexcept;
 
 }  // namespace tevpf
 
-// Passes a failure on unchanged.
+// Returns a failure to the caller unchanged.
 #define PF_TRY(expr)                                                               \
   do {                                                                             \
     if (const TEVPF_STATUS pf_try_ = (expr); pf_try_ != PF_NORMAL) return pf_try_; \

@@ -1,4 +1,4 @@
-// Texts in the fixed fields of records: names, units, descriptions.
+// Texts in fixed-size fields of records: names, units, descriptions.
 #pragma once
 
 #include <bit>
@@ -21,14 +21,15 @@ void set_field(char (&field)[N], const char* text) noexcept {
   std::memset(field + length, 0, N - length);
 }
 
-// Gives a field that came from a file or a caller a terminator in its last byte when it has none.
-// Nothing else of it changes.
+// Terminates a field from a file or a caller in its last byte if it has no terminator. No other
+// byte changes.
 template <std::size_t N>
 void terminate_field(char (&field)[N]) noexcept {
   if (field[N - 1] != '\0' && std::memchr(field, '\0', N) == nullptr) field[N - 1] = '\0';
 }
 
-// Bytes of the text in a field that has a terminator, the terminator included. Eight bytes a step.
+// The size in bytes of the text in a terminated field, terminator included. Scans eight bytes per
+// step.
 template <std::size_t N>
 std::size_t text_bytes(const char (&field)[N]) noexcept {
   constexpr std::size_t kWord = sizeof(std::uint64_t), kLast = N - kWord;
@@ -40,8 +41,9 @@ std::size_t text_bytes(const char (&field)[N]) noexcept {
   return kLast + static_cast<std::size_t>(std::countr_zero(zeros)) / 8 + 1;
 }
 
-// Copies the text of such a field, of at most 24 bytes, with its terminator and nothing behind it.
-// strcpy, without the call. Two copies that may overlap take any size between one and two of them.
+// Copies the text of a terminated field of at most 24 bytes, with its terminator and nothing after
+// it. This is strcpy without the call. Two possibly overlapping copies of n bytes cover any size
+// from n to 2n.
 template <std::size_t N>
 void copy_field_text(char* to, const char (&field)[N]) noexcept {
   static_assert(N <= 24);
@@ -62,8 +64,8 @@ void copy_field_text(char* to, const char (&field)[N]) noexcept {
   }
 }
 
-// Whether a field holds exactly this text, which has fewer than 8 characters; false when it is
-// longer. Most names are short, and a call costs as much as eight steps.
+// Whether a field holds exactly this text; always false for texts of 8 or more characters. Most
+// names are short, and a call costs as much as eight steps.
 template <std::size_t N>
 bool holds_short_text(const char (&field)[N], const char* text) noexcept {
   static_assert(N >= 8);
@@ -76,7 +78,7 @@ bool holds_short_text(const char (&field)[N], const char* text) noexcept {
 
 inline bool starts_with_blank(const char* name) noexcept { return name[0] == ' '; }
 
-// Names of elements count as equal when as much of them as is kept is equal.
+// Element names are equal when the characters that are kept of them are equal.
 inline bool same_element_name(const char* a, const char* b) noexcept {
   return std::strncmp(a, b, TEVPF_NAME_SIZE - 1) == 0;
 }

@@ -1,4 +1,4 @@
-// The body of an element, taken off its front part by part.
+// The body of an element, consumed part by part from its front.
 #pragma once
 
 #include <algorithm>
@@ -11,7 +11,7 @@
 
 namespace tevpf {
 
-// Bytes in memory: takes parts off their front and never goes beyond their end.
+// Consumes bytes in memory from the front and never reads past their end.
 class ByteReader {
  public:
   ByteReader(const void* bytes, std::int64_t count) noexcept
@@ -19,7 +19,7 @@ class ByteReader {
 
   std::int64_t left() const noexcept { return end_ - next_; }
 
-  // The next `count` bytes; null when there are not so many.
+  // The next `count` bytes; null if fewer are left.
   [[nodiscard]] const unsigned char* take(std::int64_t count) noexcept {
     if (count < 0 || count > left()) return nullptr;
     const unsigned char* part = next_;
@@ -27,7 +27,7 @@ class ByteReader {
     return part;
   }
 
-  // A text with its terminator; null when there is none before the end.
+  // The next text with its terminator; null if no terminator is left.
   [[nodiscard]] const char* take_text() noexcept {
     const unsigned char* const text = next_;
     const unsigned char* const behind = end_of_text();
@@ -37,7 +37,8 @@ class ByteReader {
   }
 
  private:
-  // Behind the next terminator; null when there is none. Most texts are shorter than a call is long.
+  // The byte after the next terminator; null if no terminator is left. Most texts are so short that
+  // a call would cost more than the scan.
   const unsigned char* end_of_text() const noexcept {
     constexpr std::int64_t kWord = 8, kFew = 64;
     const unsigned char* at = next_;
@@ -53,37 +54,38 @@ class ByteReader {
   const unsigned char* end_;
 };
 
-// What taking one stored parameter or column off a body came to.
+// The result of parsing one stored parameter or column.
 enum class Parsed {
   kWhole,
-  kCutOff,       // it goes on behind the bytes at hand
-  kBroken,       // it contradicts itself, or the body ends inside it
-  kUnknownType,  // so that nobody knows its size
+  kCutOff,       // it continues past the buffered bytes
+  kBroken,       // it is inconsistent, or the body ends inside it
+  kUnknownType,  // its size cannot be determined
   kNoMemory,
 };
 
-// A whole body: in memory, or still in the stream and at hand only as far as it is read ahead, so
-// that a body of any length goes by without a block of its length, unless one text fills it.
+// A whole body, either in memory or in the stream and buffered only as far as it has been read
+// ahead. A streamed body of any length is processed without a block of its length, unless a single
+// text fills it.
 class Body {
  public:
   Body(const void* bytes, std::int32_t count) noexcept
       : bytes_(static_cast<const unsigned char*>(bytes)), left_(count) {}
   Body(Input& input, std::int32_t count) noexcept : input_(&input), left_(count) {}
 
-  // Bytes that are not taken yet, at hand or not.
+  // Bytes that are not consumed yet, buffered or not.
   std::int64_t left() const noexcept { return left_; }
 
-  // Those of them that are at hand, until more are fetched.
+  // The unconsumed bytes that are buffered; valid until more are fetched.
   ByteReader at_hand() const noexcept {
     if (input_ == nullptr) return {bytes_, left_};
     return {input_->unread(), std::min<std::int64_t>(left_, input_->buffered())};
   }
 
-  // Takes the next `count` bytes, few enough for any buffer; they stay until the body is
-  // touched again. Null when the body, or the stream, ends inside them.
+  // Consumes the next `count` bytes, few enough for any buffer; they stay valid until the body is
+  // used again. Null when the body, or the stream, ends inside them.
   [[nodiscard]] const unsigned char* take_fields(std::int32_t count) noexcept;
 
-  // Takes `count` of the bytes at hand.
+  // Consumes `count` of the buffered bytes.
   void take(std::int64_t count) noexcept {
     left_ -= count;
     if (input_ == nullptr) {
@@ -93,10 +95,10 @@ class Body {
     }
   }
 
-  // Takes all that is left. False when the stream ends inside it.
+  // Consumes the rest of the body. False when the stream ends inside it.
   [[nodiscard]] bool take_rest() noexcept;
 
-  // Gets more bytes to hand, which moves those that are. kPart: there are no more.
+  // Buffers more bytes, which moves those already buffered. kPart: there are no more.
   [[nodiscard]] Input::Got fetch_more() noexcept;
 
  private:

@@ -41,7 +41,7 @@ std::FILE* stream_of(int file, const char* mode) noexcept { return fdopen(file, 
 void close_descriptor(int file) noexcept { close(file); }
 #endif
 
-// A stream for a descriptor, which is closed when there is none to be had.
+// A stream for a descriptor. Closes the descriptor when no stream can be created.
 std::FILE* adopt(int file, const char* mode) noexcept {
   std::FILE* const stream = stream_of(file, mode);
   if (stream == nullptr) close_descriptor(file);
@@ -71,7 +71,7 @@ std::FILE* create_file(const char* name) noexcept {
 
 bool empty_file(std::FILE* stream) noexcept { return _chsize_s(_fileno(stream), 0) == 0; }
 
-// An open file is nobody else's to remove or replace there.
+// On Windows, nobody else can remove or replace an open file.
 void remove_own_file(const char* name, std::FILE* stream) noexcept {
   std::fclose(stream);
   std::remove(name);

@@ -1,5 +1,5 @@
-// Files on the disk as the library opens, makes and removes them: regular files only, and none that
-// somebody else has just put there is emptied or removed.
+// Opens, creates and removes files on disk: regular files only. A file that somebody else has just
+// put in place is neither emptied nor removed.
 #pragma once
 
 #include <cstdio>
@@ -8,18 +8,19 @@ namespace tevpf {
 
 enum class Access { kRead, kUpdate, kWrite };
 
-// Opens an existing regular file; its content stays. Null with errno set on failure; EINVAL for what is
-// no regular file (a pipe, a device, a folder), which is not waited for.
+// Opens an existing regular file; its content is kept. Null with errno set on failure; EINVAL if it
+// is not a regular file (a pipe, a device, a directory), and then the call does not block.
 [[nodiscard]] std::FILE* open_regular(const char* name, Access access) noexcept;
 
-// Makes an empty file for writing. Null with errno set on failure, EEXIST where there is a file already.
+// Creates an empty file for writing. Null with errno set on failure; EEXIST if the file already
+// exists.
 [[nodiscard]] std::FILE* create_file(const char* name) noexcept;
 
 // Empties a file that is open for writing; false with errno set on failure.
 [[nodiscard]] bool empty_file(std::FILE* stream) noexcept;
 
-// Removes a file that this process made: the name must still stand for the file behind the stream, which
-// is closed.
+// Closes the stream of a file that this process created and removes the file, provided that the
+// name still refers to it.
 void remove_own_file(const char* name, std::FILE* stream) noexcept;
 
 }  // namespace tevpf

@@ -9,11 +9,11 @@ namespace tevpf {
 
 namespace {
 #ifdef TEVPF_TEST_HOOKS
-constexpr std::size_t kReadAhead = 256;  // small files too go on behind it
+constexpr std::size_t kReadAhead = 256;  // even small files exceed it
 #else
 constexpr std::size_t kReadAhead = std::size_t{64} * 1024;
 #endif
-constexpr std::uint64_t kSmallClaim = std::uint64_t{64} * 1024;  // not worth asking what is left
+constexpr std::uint64_t kSmallClaim = std::uint64_t{64} * 1024;  // not worth checking
 constexpr std::uint64_t kMaxRead = std::uint64_t{1} << 30;       // fits size_t everywhere
 }  // namespace
 

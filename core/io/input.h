@@ -1,6 +1,5 @@
-// Where stored bytes come from: a stream, read once from front to back. What a file says about
-// itself is a claim; Input tells whether the rest of the stream can hold it, before anything is
-// allocated.
+// The source of stored bytes: a stream, read once from front to back. Sizes that a file states are
+// claims; Input checks whether the rest of the stream can hold them before anything is allocated.
 #pragma once
 
 #include <cstdint>
@@ -16,35 +15,36 @@ class Input {
   Input(const Input&) = delete;
   Input& operator=(const Input&) = delete;
 
-  // Gets a buffer, so that many small records arrive in few large reads: the stream is then read
-  // further than it is asked for. False when memory runs out.
+  // Allocates a buffer, so that many small records need few large reads. The stream is then read
+  // further than requested. False when out of memory.
   [[nodiscard]] bool read_ahead() noexcept;
 
-  // Reads up to `count` bytes and gives their number: fewer only at the end of the stream.
+  // Reads up to `count` bytes and returns how many were read: fewer only at the end of the stream.
   [[nodiscard]] std::uint64_t read(void* to, std::uint64_t count) noexcept;
 
-  // What is read ahead and not yet read.
+  // The bytes that are buffered and not yet consumed.
   const unsigned char* unread() const noexcept { return next_; }
   std::int64_t buffered() const noexcept { return end_ - next_; }
   void skip(std::int64_t count) noexcept { next_ += count; }
 
-  // True when the stream ended by an error.
+  // True when the stream ended with an error.
   [[nodiscard]] bool has_failed() const noexcept { return std::ferror(stream_) != 0; }
 
   enum class Claim {
-    kFits,      // so many bytes are left, or they are few
+    kFits,      // that many bytes are left, or the claim is small
     kTooLarge,  // fewer are left
-    kUnknown,   // the stream does not say; allocate step by step
+    kUnknown,   // the size of the stream is unknown; allocate step by step
   };
   [[nodiscard]] Claim weigh(std::uint64_t bytes) const noexcept;
 
   enum class Got { kAll, kPart, kNoMemory };
 
-  // Reads further ahead, into a larger buffer when this one is full, but of no more than `most` bytes,
-  // which are more than are read ahead. kPart: the stream has ended.
+  // Reads further ahead, into a larger buffer if this one is full. The buffer never exceeds `most`
+  // bytes, which must be more than are buffered now. kPart: the stream has ended.
   [[nodiscard]] Got fetch_more(std::int64_t most) noexcept;
 
-  // Reads a block of so many bytes, allocated as far as the stream holds them.
+  // Reads a block of `bytes` bytes. Allocates no more than the stream can hold; if its size is
+  // unknown, the block grows as data arrives.
   [[nodiscard]] Got read_block(std::uint64_t bytes, Owned<unsigned char>& out) noexcept;
 
  private:
@@ -53,7 +53,7 @@ class Input {
   std::FILE* stream_;
   Owned<unsigned char> buffer_;
   std::uint64_t room_ = 0;
-  const unsigned char* next_ = nullptr;  // what is read ahead
+  const unsigned char* next_ = nullptr;  // the buffered bytes: next_ .. end_
   const unsigned char* end_ = nullptr;
 };
 

@@ -26,7 +26,7 @@ namespace tevpf {
 
 namespace {
 
-constexpr char kSuffix[] = ".XXXXXX";  // of an image, behind the name of its file
+constexpr char kSuffix[] = ".XXXXXX";  // appended to the file's name for the image
 constexpr mode_t kModeBits = 07777;
 
 class Descriptor {
@@ -48,15 +48,15 @@ class Descriptor {
   int fd_;
 };
 
-// What is known of a file that can be replaced: it may be written in place, is a regular one, and
-// has no other name.
+// Gets the metadata of a file that can be replaced: it is writable, regular and has no other hard
+// link.
 bool describe(const char* path, struct stat& facts) noexcept {
   const Descriptor file(open(path, O_WRONLY | O_CLOEXEC | O_NONBLOCK));
   return file.get() >= 0 && fstat(file.get(), &facts) == 0 && S_ISREG(facts.st_mode) &&
          facts.st_nlink == 1;
 }
 
-// Owner first: changing it may take set-user-id bits of the mode away.
+// Sets the owner first: changing it may clear set-user-ID bits of the mode.
 bool take_over(int image, const struct stat& facts) noexcept {
   struct stat own;
   if (fstat(image, &own) != 0) return false;
@@ -65,20 +65,19 @@ bool take_over(int image, const struct stat& facts) noexcept {
   return fchmod(image, facts.st_mode & kModeBits) == 0;
 }
 
-// Some file systems cannot flush on demand; there is nothing to wait for then.
+// Some file systems do not support fsync; there is nothing to wait for then.
 bool is_flushed(int fd) noexcept {
   return fsync(fd) == 0 || errno == EINVAL || errno == ENOTSUP || errno == EROFS;
 }
 
-// The system does not allow a file beside this one, or in its place; nothing is wrong with the
-// disk.
+// The system does not allow a file next to this one, or replacing it; the disk is not at fault.
 bool may_be_written_plainly(int error_number) noexcept {
   return error_number == EACCES || error_number == EPERM || error_number == EROFS ||
          error_number == EBUSY || error_number == EXDEV || error_number == ENAMETOOLONG;
 }
 
-// So that the new name survives a power cut; the file is whole either way. A folder that may not be
-// read cannot be flushed.
+// Makes the new name survive a power failure; the file is whole either way. A folder without read
+// permission cannot be flushed.
 bool flush_folder(char* path) noexcept {
   *std::strrchr(path, '/') = '\0';
   const Descriptor folder(open(path[0] == '\0' ? "/" : path, O_RDONLY | O_DIRECTORY | O_CLOEXEC));
@@ -120,7 +119,7 @@ Replacement::Outcome Replacement::put_in_place() noexcept {
   if (std::rename(image_, target_) != 0) {
     const Outcome outcome =
         may_be_written_plainly(errno) ? Outcome::kNotPossible : Outcome::kFailed;
-    discard();  // it may hold the space that a plain write needs
+    discard();  // it may occupy the space that a plain write needs
     return outcome;
   }
   image_[0] = '\0';

@@ -5,8 +5,8 @@
 namespace tevpf {
 
 namespace {
-// A file system takes one long write faster than several short ones: ten thousand parameters leave at
-// once. What a small file leaves unused costs nothing, as it is never touched.
+// One long write is faster than several short ones: ten thousand parameters fit in one. The unused
+// part of the buffer costs nothing, because it is never touched.
 constexpr std::size_t kBuffer = std::size_t{1024} * 1024;
 constexpr std::uint64_t kMaxWrite = std::uint64_t{1} << 30;  // fits size_t everywhere
 }  // namespace

@@ -1,5 +1,5 @@
-// Where stored bytes go: a large buffer in front of a stream, so that many small records leave in
-// few large writes. Remembers that a write failed.
+// The destination of stored bytes: a large buffer in front of a stream, so that many small records
+// need few large writes. Remembers that a write failed.
 #pragma once
 
 #include <cstdint>
@@ -17,13 +17,13 @@ class Sink {
   Sink(const Sink&) = delete;
   Sink& operator=(const Sink&) = delete;
 
-  static constexpr std::size_t kMaxRecord = 512;  // what `record` can give room for
+  static constexpr std::size_t kMaxRecord = 512;  // the largest size that `record` accepts
 
-  // How far behind a record its caller may write, so that what varies in size is copied as if it
-  // were of the largest size.
+  // How many bytes past a record its caller may write, so that parts of varying size can be copied
+  // at their largest size.
   static constexpr std::size_t kSlack = 32;
 
-  // Room for a record of so many bytes, which the caller fills at once.
+  // Space for a record of `bytes` bytes, which the caller fills before the next call.
   [[nodiscard]] unsigned char* record(std::size_t bytes) noexcept {
     if (bytes + kSlack > room()) empty_buffer();
     unsigned char* place = buffer_ + used_;
@@ -43,7 +43,7 @@ class Sink {
     put(numbers, static_cast<std::uint64_t>(count) * sizeof *numbers);
   }
 
-  // Passes on what is left to the stream; false when any write has failed.
+  // Writes the rest of the buffer to the stream; false if any write has failed.
   [[nodiscard]] bool finish() noexcept;
 
  private:
@@ -54,7 +54,7 @@ class Sink {
 
   std::FILE* stream_;
   Owned<unsigned char> large_;
-  unsigned char small_[kMaxRecord + kSlack];  // instead, when memory is short
+  unsigned char small_[kMaxRecord + kSlack];  // used when large_ cannot be allocated
   unsigned char* buffer_;
   std::size_t size_;
   std::size_t used_ = 0;

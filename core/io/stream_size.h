@@ -1,4 +1,4 @@
-// How much of a stream is still to come.
+// The number of bytes left in a stream.
 #pragma once
 
 #include <cstdint>
@@ -6,8 +6,8 @@
 
 namespace tevpf {
 
-// Bytes between the place where the stream stands and the end of its file; -1 when it is not a
-// regular file and may go on for ever.
+// Bytes from the stream's position to the end of its file; -1 if it is not a regular file, which
+// may have no end.
 [[nodiscard]] std::int64_t stream_bytes_left(std::FILE* stream) noexcept;
 
 }  // namespace tevpf
