@@ -39,7 +39,8 @@ TEVPF_COLUMN& at(const ColumnArray& columns, std::int32_t i) noexcept {
   return columns[static_cast<std::size_t>(i)];
 }
 
-// Keeps the same search column when the array is replaced; `position` is its place in the array.
+// Replaces the column array. The search column stays the same column; `position` is its place in
+// the new array, -1 for none.
 void replace_columns(TEVPF_TABLE& table, ColumnArray columns, std::int32_t position) noexcept {
   heap_free(table.col_array);
   table.col_array = columns.release();
