@@ -26,7 +26,7 @@ inline constexpr char kDescriptionIndent[] =
 // How a value type appears in a definition.
 struct TypeText {
   const char* word;
-  std::int32_t digits;  // decimals of the bounds of reals and doubles
+  std::int32_t digits;  // digits of the bounds of reals and doubles
 };
 
 // In the order of the type codes, from PF_TYPE_INT on.

@@ -10,7 +10,7 @@ using namespace tevpf;
 
 namespace {
 
-constexpr std::int64_t kGrowth = 10;  // bytes per growth step of a block; visible in the caller's size
+constexpr std::int64_t kGrowth = 10;  // bytes per growth step; visible in the caller's size
 
 // The character that an escape letter stands for; an unknown letter stands for itself.
 char unescape_letter(char letter) noexcept {

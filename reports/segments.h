@@ -20,7 +20,7 @@ struct PageRules {
   std::int32_t first_limit;
   std::int32_t least_limit;
   std::int64_t most_dashes;  // in the rule under a segment's heading
-  bool keep_words;  // a piece of a row does not end before white space or with a backslash
+  bool keep_words;           // a piece of a row does not end before white space or with a backslash
 };
 
 inline constexpr PageRules kDumpPage = {130, 129, 113, 129, true};

@@ -1,4 +1,4 @@
-// The rows of a table. Only row_store.cpp knows how they are stored in row_data.
+// The rows of a table. Only row_store knows how they are stored in row_data.
 //
 // A row occupies one slot of the row block and stays there, whatever is inserted or deleted around
 // it. The sequence slots.order lists the slots in storage order. Slots of deleted rows are reused.

@@ -49,7 +49,7 @@ bool copy_columns(const TEVPF_TABLE& source, TEVPF_TABLE& copy) noexcept {
   copy.col_array = new_zeroed<TEVPF_COLUMN>(static_cast<std::uint64_t>(source.num_cols)).release();
   if (copy.col_array == nullptr) return false;
   while (copy.num_cols < source.num_cols) {
-    const std::int32_t i = copy.num_cols++;  // counted first, so that a half-built column is released too
+    const std::int32_t i = copy.num_cols++;  // counted first: a half-built column is released too
     if (!copy_column(source.col_array[i], source.num_rows, copy.col_array[i])) return false;
   }
   if (source.cur_col != nullptr) {
