@@ -1,5 +1,5 @@
 // A column's index: a sequence of row slots in ascending order of the column's value. Only
-// column_index.cpp changes it.
+// column_index changes it.
 //
 // Values are ordered by the comparison of values/compare. Among rows of equal value, a row inserted
 // later comes first. An index read from a file is accepted in any order; searches of it terminate,
