@@ -1,4 +1,4 @@
-// What the dumps of lists and of tables share when debug output is on.
+// Debug output shared by the dumps of lists and tables.
 #pragma once
 
 #include <cstdint>
@@ -7,7 +7,7 @@
 
 namespace tevpf {
 
-// The entries of an index, two a line, as debug output shows them.
+// Writes the entries of an index, two per line.
 inline void write_index_entries(TextOut& out, const std::int32_t* entries,
                                 std::int32_t count) noexcept {
   for (std::int32_t i = 0; i < count; ++i) {
@@ -20,7 +20,7 @@ inline void write_index_entries(TextOut& out, const std::int32_t* entries,
   }
 }
 
-// The address of a block as debug output shows it.
+// Writes the address of a block.
 inline std::uintptr_t address_of(const void* block) noexcept {
   return reinterpret_cast<std::uintptr_t>(block);
 }

@@ -1,5 +1,5 @@
-// Definitions of parameters and columns as the dumps show them: the fields that both have in
-// common, and the whole line of a column.
+// Definitions of parameters and columns in dumps: the fields that both share, and the complete line
+// of a column.
 #pragma once
 
 #include <cstdint>
@@ -13,7 +13,7 @@
 extern "C" {
 
 // Writes a column's definition as one line.
-//   PF_BADTYPE  no such value type; the line stays unfinished
+//   PF_BADTYPE  no such value type; the line is incomplete
 TEVPF_API TEVPF_STATUS TEV8R1_print_col_def(std::FILE* stream, const TEVPF_COLUMN* column) noexcept;
 }
 
@@ -21,12 +21,12 @@ namespace tevpf {
 
 inline constexpr char kNoValue[] = "@";  // stands for a field without a value
 inline constexpr char kDescriptionIndent[] =
-    "\t\t\t\t\t\t\t\t\t      ";  // to where descriptions start
+    "\t\t\t\t\t\t\t\t\t      ";  // up to the column where descriptions start
 
-// How definitions show a value type.
+// How a value type appears in a definition.
 struct TypeText {
   const char* word;
-  std::int32_t digits;  // of the bounds of reals and doubles
+  std::int32_t digits;  // digits of the bounds of reals and doubles
 };
 
 // In the order of the type codes, from PF_TYPE_INT on.
@@ -38,8 +38,8 @@ constexpr const TypeText& type_text(std::int32_t type) noexcept {
   return kTypeTexts[type - PF_TYPE_INT];
 }
 
-// The fields that lists and tables show alike: name and units; a number right-aligned (reals and
-// doubles with so many digits); precision, maximum and minimum.
+// The fields that lists and tables show in the same way: name and units; a right-aligned number
+// (reals and doubles with the given number of digits); precision, maximum and minimum.
 void write_name_and_units(TextOut& out, const char (&name)[TEVPF_NAME_SIZE],
                           const char (&units)[TEVPF_UNITS_SIZE]) noexcept;
 
@@ -52,7 +52,7 @@ void write_number(TextOut& out, T number, std::int32_t width, std::int32_t digit
   }
 }
 
-// The bounds part is that of a parameter or a column whose type is T.
+// Writes the bounds of a parameter or column of type T; `part` holds them.
 template <class T, class Part>
 void write_bounds(TextOut& out, std::int32_t type, const Part& part,
                   std::int32_t max_width) noexcept {
@@ -66,13 +66,13 @@ void write_bounds(TextOut& out, std::int32_t type, const Part& part,
   write_number<T>(out, part.min, 11, type_text(type).digits);
 }
 
-// The same fields for a string, which has none of them.
+// The same fields for a string, which has no bounds.
 void write_no_bounds(TextOut& out, std::int32_t max_width) noexcept;
 
 // What TEV8R1_print_col_def does.
 TEVPF_STATUS write_column_definition(TextOut& out, const TEVPF_COLUMN& column) noexcept;
 
-// The heading above such lines.
+// Writes the heading above column definitions.
 void write_definitions_heading(TextOut& out) noexcept;
 
 }  // namespace tevpf

@@ -6,7 +6,8 @@ namespace tevpf {
 
 namespace {
 
-// Characters of `rest` that go on the line, behind its last white space when it has one.
+// The number of characters of `rest` for this line: up to and including its last white space, if
+// any.
 std::size_t break_at(std::string_view rest, std::size_t most) noexcept {
   for (std::size_t k = most; k > 0; --k) {
     if (is_white(rest[k - 1]) && !is_white(rest[k])) return k;

@@ -10,9 +10,9 @@ using namespace tevpf;
 
 namespace {
 
-constexpr std::int64_t kGrowth = 10;  // bytes that a block grows by, visible in the caller's size
+constexpr std::int64_t kGrowth = 10;  // bytes per growth step; visible in the caller's size
 
-// The character that a letter stands for; a letter without a meaning stands for itself.
+// The character that an escape letter stands for; an unknown letter stands for itself.
 char unescape_letter(char letter) noexcept {
   const std::size_t place = kEscapeLetters.find(letter);
   return place == std::string_view::npos ? letter : kEscaped[place];
@@ -20,7 +20,7 @@ char unescape_letter(char letter) noexcept {
 
 bool is_octal(char digit) noexcept { return digit >= '0' && digit <= '7'; }
 
-// Reads one to three octal digits; of the number its low 8 bits count.
+// Reads one to three octal digits and keeps the low 8 bits of the number.
 char read_octal(const char*& from) noexcept {
   unsigned number = 0;
   for (int digits = 0; digits < 3 && is_octal(*from); ++digits) {
@@ -29,7 +29,8 @@ char read_octal(const char*& from) noexcept {
   return static_cast<char>(static_cast<unsigned char>(number));
 }
 
-// The size a block grows to, a step before each expansion that finds fewer than two bytes to spare.
+// The size that a block grows to: one step before each expansion that finds fewer than two spare
+// bytes.
 std::int64_t grown_size(std::int64_t size, std::int64_t used, std::int64_t expansions) noexcept {
   for (; expansions > 0; --expansions, ++used) {
     if (size - 1 <= used) size += kGrowth;
@@ -54,7 +55,7 @@ TEVPF_STATUS TEV8R1_remove_escape_chars(std::int32_t* size, char** buffer) noexc
     *size = static_cast<std::int32_t>(grown);
   }
 
-  // From the end backwards, so that each character moves once.
+  // Work backwards, so that each character moves only once.
   char* to = *buffer + length + expansions;
   for (const char* from = *buffer + length; to != from; --from, --to) {
     const char letter = escape_letter(*from);

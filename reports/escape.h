@@ -1,4 +1,4 @@
-// Control characters of texts as two-character backslash sequences, and back.
+// Converts control characters in texts to two-character backslash sequences, and back.
 #pragma once
 
 #include <cstdint>
@@ -8,11 +8,11 @@
 
 namespace tevpf {
 
-// The characters that are escaped, and the letters that stand for them behind a backslash.
+// The characters that are escaped, and the letters that follow the backslash for them.
 inline constexpr std::string_view kEscaped = "\b\t\n\v\f\r\\";
 inline constexpr std::string_view kEscapeLetters = "btnvfr\\";
 
-// By character, 0 for those that stand for themselves.
+// Indexed by character; 0 for characters that are not escaped.
 struct LetterTable {
   char of[256];
 };
@@ -29,7 +29,8 @@ constexpr char escape_letter(char character) noexcept {
   return kLetterTable.of[static_cast<unsigned char>(character)];
 }
 
-// Writes the escaped text at `out`, which has room for twice its length; gives the end of it.
+// Writes the escaped text to `out`, which has room for twice its length; returns the end of the
+// output.
 inline char* write_escaped(char* out, const char* text, std::int64_t length) noexcept {
   for (const char* end = text + length; text != end; ++text) {
     const char letter = escape_letter(*text);

@@ -1,4 +1,4 @@
-// The text of a whole file: its header values, then every list, then every table.
+// Dumps a whole file as text: its header values, then every list, then every table.
 #include <cstring>
 
 #include "core/file.h"
@@ -17,7 +17,7 @@ namespace {
 
 constexpr char kHeaderList[] = "TEVPF_FILE_HEADER";  // its parameters describe the file
 constexpr std::int32_t kHeaderWidth = 90;
-constexpr char kHeaderIndent[] = "\t\t\t\t      ";  // to where header values start
+constexpr char kHeaderIndent[] = "\t\t\t\t      ";  // up to the column where header values start
 constexpr char kElementEnd[] = "!\n\f\n";
 
 void write_header_value(TextOut& out, const TEVPF_PARAM_DEF& def) noexcept {

@@ -15,15 +15,15 @@ namespace tevpf {
 
 namespace {
 
-constexpr std::int32_t kValueField = 14;  // characters that numbers are right-aligned in
+constexpr std::int32_t kValueField = 14;  // width of the field in which numbers are right-aligned
 constexpr std::int32_t kStringWidth = 65;
-constexpr char kStringIndent[] = "\t\t\t\t\t\t\t       ";  // to where values start
+constexpr char kStringIndent[] = "\t\t\t\t\t\t\t       ";  // up to the column where values start
 constexpr std::int32_t kDescriptionWidth = 53;
 
-// Texts in their escaped form, in a block that grows with the longest of them.
+// Escapes texts into a block that grows to fit the longest of them.
 class EscapedText {
  public:
-  // False when memory runs out.
+  // False when out of memory.
   [[nodiscard]] bool reserve(std::uint64_t length) noexcept {
     if (2 * length <= room_) return true;
     block_ = new_array<char>(2 * length);
@@ -100,7 +100,7 @@ void ListWriter::write_number_value(const TEVPF_PARAM_DEF& def) noexcept {
   out_.print("  ");
 }
 
-// Behind the value, in front of a description: blanks up to its field, or the start of a line.
+// After the value and before a description: blanks up to its field, or the start of a new line.
 TEVPF_STATUS ListWriter::write_string_value(const TEVPF_PARAM_DEF& def,
                                             FirstLine& description) noexcept {
   const std::string_view text = def.part.str.value;

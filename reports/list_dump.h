@@ -1,4 +1,4 @@
-// The text of a list and its parameters.
+// Dumps a list and its parameters as text.
 #pragma once
 
 #include <cstdio>
@@ -9,13 +9,13 @@
 extern "C" {
 
 // Writes the list's dump.
-//   PF_NOMEM  what was written stays
+//   PF_NOMEM  the output written so far remains
 TEVPF_API TEVPF_STATUS TEV8R1_list_dump(const TEVPF_LIST* list, std::FILE* stream) noexcept;
 }
 
 namespace tevpf {
 
-// What TEV8R1_list_dump does.
+// Same as TEV8R1_list_dump, for an open stream buffer.
 [[nodiscard]] TEVPF_STATUS write_list(TextOut& out, const TEVPF_LIST& list) noexcept;
 
 }  // namespace tevpf

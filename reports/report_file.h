@@ -1,4 +1,4 @@
-// The text file that a report goes to.
+// The text file that a report is written to.
 #pragma once
 
 #include <cstdio>
@@ -8,8 +8,9 @@
 
 namespace tevpf {
 
-// Creates or empties the file, lets `body` write to it, and closes it; gives the body's status.
-//   PF_OPENFAIL  the path cannot be written; texts: the path, empty
+// Creates or truncates the file, lets `body` write to it, closes it, and returns the status of
+// `body`.
+//   PF_OPENFAIL  the path cannot be opened for writing; texts: the path, empty
 template <class Body>
 [[nodiscard]] TEVPF_STATUS write_report(const char* path, Body body) noexcept {
   std::FILE* const stream = std::fopen(path, "w");

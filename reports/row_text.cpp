@@ -15,9 +15,9 @@ namespace tevpf {
 
 namespace {
 
-// ---- What a column's format says
+// ---- Reading a column's format
 
-// Reads an optional minus sign and digits; saturates.
+// Reads an optional minus sign and digits; saturates on overflow.
 std::int32_t read_number(const char*& at, const char* end) noexcept {
   const bool negative = at != end && *at == '-';
   if (negative) ++at;
@@ -33,8 +33,9 @@ struct Format {
   std::int32_t precision;
 };
 
-// The width and the precision of a made format, which may be older than the column's definition:
-// "%12d", "%12.4g" or "%-12s". A column without one gets what its definition says.
+// The width and precision in a column's format: "%12d", "%12.4g" or "%-12s". The format may be
+// older than the definition. A column without a format gets its width and precision from the
+// definition.
 Format read_format(const TEVPF_COLUMN& column) noexcept {
   Format format = {display_width(column), kDefaultPrecision};
   if (column.def.type == PF_TYPE_REAL) format.precision = column.def.limits.f32.precision;
@@ -50,7 +51,7 @@ Format read_format(const TEVPF_COLUMN& column) noexcept {
 
 // ---- Cells by type
 
-// Moves what was written from `begin` to `end` to the right of a field of that width.
+// Right-aligns the text from `begin` to `end` in a field of that width.
 char* align_right(char* begin, char* end, std::int32_t width) noexcept {
   const std::int64_t blanks = width - (end - begin);
   if (blanks <= 0) return end;
@@ -83,8 +84,8 @@ char* write_number_cell(char* out, const char* value, const Cell& cell) noexcept
   return align_right(out, end, cell.width);
 }
 
-// An empty text shows a marker; one that ends in white space gets it behind, so that it can be
-// seen.
+// Writes a marker for an empty text, and after a text that ends in white space, so that the white
+// space can be seen.
 char* write_string_cell(char* out, const char* value, const Cell& cell) noexcept {
   const std::size_t length = strnlen(value, static_cast<std::size_t>(cell.length));
   if (length == 0) return align_left(out, write_marker(out), cell.empty_width);
@@ -95,7 +96,7 @@ char* write_string_cell(char* out, const char* value, const Cell& cell) noexcept
 
 char* write_nothing(char* out, const char*, const Cell&) noexcept { return out; }
 
-// The most characters that a cell can take.
+// The maximum number of characters in a cell.
 std::int64_t cell_room(const Cell& cell, std::int32_t type) noexcept {
   const std::int64_t padded = std::max(cell.width, cell.empty_width);
   if (type == PF_TYPE_STRING) return std::max(2 * std::int64_t{cell.length} + 2, padded);
@@ -112,8 +113,8 @@ std::int32_t heading_lead(const TEVPF_COLUMN& column) noexcept {
   return (display_width(column) - length) / 2;
 }
 
-// Writes the names of `count` columns, each in the middle of its display width, over blanks; gives
-// the length of the heading.
+// Writes the names of `count` columns over blanks, each centred in its display width; returns the
+// length of the heading.
 template <class ColumnAt>
 std::int64_t write_names(char* line, std::int32_t count, std::int32_t gap,
                          ColumnAt column_at) noexcept {

@@ -13,8 +13,8 @@ constexpr std::int32_t kTab = 8;
 
 std::int32_t tabs_of(std::int32_t segment) noexcept { return std::min(segment, 2); }
 
-// Takes columns from `next` on into a segment below the limit, at least one; gives its length, with
-// the gap behind its last column unless that is the last of all.
+// Puts columns from `next` on into a segment below the limit, at least one column. Returns the
+// segment's length, including the gap after its last column unless that is the last column of all.
 std::int64_t fill_segment(const RowText& rows, std::int32_t& next, std::int32_t limit) noexcept {
   const std::int32_t first = next;
   std::int64_t length = 0;
@@ -27,7 +27,7 @@ std::int64_t fill_segment(const RowText& rows, std::int32_t& next, std::int32_t 
   return length;
 }
 
-// A line can end before its segments do: behind its end there is nothing.
+// A line can be shorter than its segments: there are no characters after its end.
 char character_at(std::string_view line, std::int64_t place) noexcept {
   return place < std::ssize(line) ? line[static_cast<std::size_t>(place)] : '\0';
 }
@@ -76,8 +76,8 @@ void Segments::write_row(TextOut& out, std::string_view line) const noexcept {
   out.print(' ', Repeat{'\t', tabs_of(count_ - 1)}, line, '\n');
 }
 
-// A piece is as long as its segment, unless it would end in front of white space or with a
-// backslash: then it takes in more of the line, up to the page's width.
+// A piece is as long as its segment. If it would end before white space or with a backslash, it is
+// extended, as long as it stays below the page's width.
 std::int64_t Segments::piece_length(std::string_view rest, std::int32_t segment) const noexcept {
   const std::int64_t whole = lengths_[segment];
   const auto splits_badly = [rest](std::int64_t length) {

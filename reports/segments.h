@@ -1,6 +1,6 @@
-// Lines that are too wide for a page, cut into segments of whole columns. A segment's lines are
-// indented by a tab more than those of the segment before, by two at most, and may be so much
-// shorter.
+// Cuts lines that are too wide for a page into segments of whole columns. Each segment's lines are
+// indented one tab more than those of the previous segment, up to two tabs, and their maximum
+// length is reduced by that indent.
 #pragma once
 
 #include <cstdint>
@@ -12,15 +12,15 @@
 
 namespace tevpf {
 
-// How wide the pages of dumps and of listings are.
+// The page widths of dumps and listings.
 struct PageRules {
-  std::int32_t one_line;  // widest row that is not cut
-  // Segments stay below a limit, with their gap: the first below this one, each further one below 8
-  // less, but never less than the least.
+  std::int32_t one_line;  // the widest row that is not cut
+  // Each segment, including its gap, is shorter than a limit. The limit is first_limit for the
+  // first segment and 8 less for each further one, but at least least_limit.
   std::int32_t first_limit;
   std::int32_t least_limit;
-  std::int64_t most_dashes;  // of the rule under a segment's heading
-  bool keep_words;  // pieces of rows take in blanks and backslashes that stand at their end
+  std::int64_t most_dashes;  // in the rule under a segment's heading
+  bool keep_words;           // a piece of a row does not end before white space or with a backslash
 };
 
 inline constexpr PageRules kDumpPage = {130, 129, 113, 129, true};
@@ -28,8 +28,8 @@ inline constexpr PageRules kListingPage = {132, 131, 115, INT64_MAX, false};
 
 class Segments {
  public:
-  // One segment, or as many as the columns need when a row is wider than a line; false when memory
-  // runs out.
+  // Cuts a row into one segment, or into as many as needed when it is wider than a line. Returns
+  // false when out of memory.
   [[nodiscard]] bool cut(const RowText& rows, std::int64_t row_width,
                          const PageRules& rules) noexcept;
 
@@ -42,7 +42,7 @@ class Segments {
   const PageRules* rules_ = nullptr;
   std::int64_t row_width_ = 0;
   std::int32_t count_ = 1;
-  Owned<std::int64_t> lengths_;  // null while there is one segment of the whole row
+  Owned<std::int64_t> lengths_;  // null if one segment holds the whole row
 };
 
 }  // namespace tevpf

@@ -1,4 +1,4 @@
-// The text of a table with all its columns and rows.
+// Dumps a table with all its columns and rows as text.
 #pragma once
 
 #include <cstdio>
@@ -8,8 +8,8 @@
 
 extern "C" {
 
-// Writes the table's dump; makes its formats first when a column has none.
-//   PF_NOMEM  what was written stays
+// Writes the table's dump. If any column has no format, makes the formats of all columns first.
+//   PF_NOMEM  the output written so far remains
 TEVPF_API TEVPF_STATUS TEV8R1_table_dump(TEVPF_TABLE* table, std::FILE* stream) noexcept;
 }
 
@@ -18,9 +18,9 @@ namespace tevpf {
 // What TEV8R1_table_dump does.
 [[nodiscard]] TEVPF_STATUS write_table(TextOut& out, TEVPF_TABLE& table) noexcept;
 
-// ---- What dumps and listings of tables have in common
+// ---- Shared by dumps and listings of tables
 
-// Makes all formats, and with them the display width, when any column has none.
+// Makes all formats and the display width if any column has no format.
 void ensure_formats(TEVPF_TABLE& table) noexcept;
 
 void write_table_head(TextOut& out, const TEVPF_TABLE& table, std::int32_t columns,

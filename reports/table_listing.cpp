@@ -46,8 +46,9 @@ struct Request {
   return rows.take_all(table) ? TEVPF_STATUS{PF_NORMAL} : fail_empty(PF_NOMEM);
 }
 
-// The width that decides about segments: by the chosen names, a gap behind the last one included;
-// but the table's own display width when more columns were asked for than there are.
+// The width that decides whether rows are cut: the sum over the chosen columns, including a gap
+// after the last one, but the table's own display width when more columns were requested than
+// exist.
 std::int64_t total_width(const TEVPF_TABLE& table, const Request& request,
                          const RowText& rows) noexcept {
   if (request.count > table.num_cols) return table.dsp_wid;

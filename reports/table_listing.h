@@ -1,4 +1,4 @@
-// The listing of chosen columns and rows of a table.
+// Lists chosen columns and rows of a table.
 #pragma once
 
 #include <cstdint>

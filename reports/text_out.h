@@ -1,5 +1,5 @@
-// Where reports write: a large buffer in front of a C stream, into which texts and numbers are
-// formatted without printf. Write errors of the stream are not noticed here.
+// The output of reports: a large buffer in front of a C stream. Texts and numbers are formatted
+// into it without printf. Write errors of the stream are not detected here.
 #pragma once
 
 #include <concepts>
@@ -13,7 +13,7 @@
 
 namespace tevpf {
 
-// Numbers and texts in fields of at least `width` characters; longer ones widen their field.
+// Numbers and texts in fields of at least `width` characters; a longer one widens its field.
 struct Right {
   std::int64_t number;
   std::int32_t width;
@@ -36,7 +36,7 @@ struct Repeat {  // a count of 0 or less writes nothing
   std::int64_t count;
 };
 
-// The text of a record's field, which may fill the field without a terminator.
+// The text of a record's field, which has no terminator if the text fills the field.
 template <std::size_t N>
 std::string_view field_text(const char (&field)[N]) noexcept {
   return {field, strnlen(field, N)};
@@ -46,13 +46,13 @@ class TextOut {
  public:
   enum class Size { kLine, kReport };
 
-  // A report gets a large buffer if there is memory for it; else the one in the object serves.
+  // A report gets a large buffer if memory allows, else the buffer in the object is used.
   explicit TextOut(std::FILE* stream, Size size = Size::kReport) noexcept;
   ~TextOut() { flush(); }
   TextOut(const TextOut&) = delete;
   TextOut& operator=(const TextOut&) = delete;
 
-  // Writes its arguments one behind the other.
+  // Writes its arguments one after another.
   template <class... Parts>
   void print(const Parts&... parts) noexcept {
     (add(parts), ...);
@@ -61,7 +61,7 @@ class TextOut {
   void write(const char* text, std::int64_t length) noexcept;
   void flush() noexcept;
 
-  // Ends a line that goes on in the next one: a blank where people read along, else a backslash.
+  // The character that ends a continued line: a blank on standard output, else a backslash.
   char continuation() const noexcept { return stream_ == stdout ? ' ' : '\\'; }
 
  private:
@@ -91,7 +91,7 @@ class TextOut {
   void add(const General& field) noexcept;
   void add(const Repeat& run) noexcept;
 
-  // Room for `length` more characters, at most kLineBuffer.
+  // Makes room for `length` more characters, at most kLineBuffer.
   char* room_for(std::int64_t length) noexcept {
     if (room_ - used_ < length) flush();
     return buffer_ + used_;

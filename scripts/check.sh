@@ -1,5 +1,5 @@
 #!/usr/bin/env bash
-# check.sh [format|layers|tidy|cppcheck|shell...]: the static checks, all unless some are named.
+# check.sh [format|layers|tidy|cppcheck|shell...]: the static checks; all of them by default.
 set -euo pipefail
 cd "$(dirname "${BASH_SOURCE[0]}")/.."
 
@@ -20,8 +20,8 @@ check_tidy() {
     xargs -0 -n 1 -P "$(nproc)" clang-tidy --quiet --warnings-as-errors='*' -p build/dev
 }
 
-# Off: missingReturn (stumbles over `if constexpr`; the compiler watches for it) and uninitMemberVar
-# (buffers are left unset on purpose; the sanitizers watch their use).
+# Disabled: missingReturn (misreads `if constexpr`; the compiler checks it) and uninitMemberVar
+# (buffers are left uninitialized on purpose; the sanitizers check their use).
 check_cppcheck() {
   cmake --preset dev >/dev/null
   cppcheck --project=build/dev/compile_commands.json --std=c++20 --quiet --inline-suppr \

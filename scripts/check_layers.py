@@ -10,11 +10,11 @@ import pathlib
 import re
 import sys
 
-# From the bottom up; folders of one line do not know each other.
+# From bottom to top; folders on the same line do not depend on each other.
 LAYERS = [["include"], ["core/base"], ["core/sequence"], ["core/io"], ["core"], ["values"],
           ["lists", "tables"], ["reports"], ["include/tevpf"], ["tools"]]
 PUBLIC = {"include", "include/tevpf"}
-# These see the public headers alone, as any program does.
+# These use only the public headers, as any program does.
 OUTSIDE = {"include/tevpf", "tools"}
 
 ROOT = pathlib.Path(__file__).resolve().parent.parent

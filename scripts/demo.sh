@@ -1,5 +1,5 @@
 #!/usr/bin/env bash
-# demo.sh: installs what is missing, builds the library, and runs the example programs.
+# demo.sh: installs missing packages, builds the library, and runs the example programs.
 set -euo pipefail
 cd "$(dirname "${BASH_SOURCE[0]}")/.."
 

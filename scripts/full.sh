@@ -1,8 +1,8 @@
 #!/usr/bin/env bash
-# full.sh [SECONDS]: everything that is examined before a release: the static checks, all builds with all
-# tests, a save disturbed at each of its system calls, and each fuzz target for SECONDS (1800 unless
-# said otherwise). About 20 minutes and twice SECONDS on two cores. What fuzzing finds is kept in
-# build/fuzz/found; copied to tests/fuzz/corpus it is tested for ever.
+# full.sh [SECONDS]: all checks before a release: the static checks, all builds with all tests, a
+# save with a fault at each of its system calls, and each fuzz target for SECONDS (default 1800).
+# Takes about 20 minutes plus twice SECONDS on two cores. Inputs found by fuzzing are kept in
+# build/fuzz/found; copy them to tests/fuzz/corpus to test them in every run.
 set -euo pipefail
 cd "$(dirname "${BASH_SOURCE[0]}")/.."
 

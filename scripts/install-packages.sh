@@ -1,5 +1,5 @@
 #!/usr/bin/env bash
-# install-packages.sh GROUP...: installs the Debian packages of these groups that are missing.
+# install-packages.sh GROUP...: installs the missing Debian packages of these groups.
 # Groups: build tool test bench x86 windows fuzz lint
 set -euo pipefail
 
@@ -36,7 +36,7 @@ if ((EUID != 0)); then
   as_root=(sudo)
 fi
 
-# Waits for another package manager instead of failing on its lock, and retries a shaky network.
+# Waits for another package manager instead of failing on its lock, and retries network errors.
 apt() {
   "${as_root[@]}" env DEBIAN_FRONTEND=noninteractive apt-get -q -y \
     -o DPkg::Lock::Timeout=300 -o Acquire::Retries=3 "$@" </dev/null

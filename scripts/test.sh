@@ -1,6 +1,5 @@
 #!/usr/bin/env bash
-# test.sh [LEG...]: installs what is missing, builds, and runs all tests. The legs, all of them
-# unless some are named:
+# test.sh [LEG...]: installs missing packages, builds, and runs all tests. The legs, all by default:
 #   dev     64-bit debug build            asan    the same under address and UB sanitizers
 #   x86     32-bit x86 build              mingw   32-bit Windows cross-build, its DLL checked
 # The last lines are ctest's summary over all legs.
@@ -31,5 +30,5 @@ for leg in "${legs[@]}"; do
   echo "subdirs(../$leg)" >>build/all/CTestTestfile.cmake
 done
 
-# One run over the legs, so that there is one summary.
+# One ctest run over all legs, for a single summary.
 ctest --test-dir build/all --parallel "$jobs" --output-on-failure --no-tests=error --progress

@@ -9,7 +9,7 @@
 namespace tevpf {
 namespace {
 
-// The table's template of a type; makes the templates where there are none yet.
+// The table's template of a type; creates the templates if there are none.
 TEVPF_STATUS find_template(const char* table_name, std::int32_t type,
                            TEVPF_COL_DEF*& found) noexcept {
   TEVPF_TABLE* table = nullptr;

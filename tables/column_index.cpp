@@ -17,8 +17,8 @@ namespace {
 
 // ---- Places -------------------------------------------------------------------------------------
 
-// The values that a search probes, by position: of a bare array of entries, side by side, or of a column's
-// index.
+// The values that a search probes, by position: those of a contiguous array of entries, or of a
+// column's index.
 struct ValuesOfEntries {
   Values values;
   const std::int32_t* entries;
@@ -56,7 +56,7 @@ struct ValuesFrom {
   At at;
 };
 
-// The same as if the entry at a position were not there.
+// The same, with the entry at one position left out.
 template <class Some>
 struct WithoutOne {
   const Some& values;
@@ -74,20 +74,21 @@ struct Found {
 
 // ---- Searching ----------------------------------------------------------------------------------
 
-// Integers and texts are totally ordered: the first entry that is not less than the key.
+// Integers and texts are totally ordered: finds the first entry that is not less than the key.
 template <class Some, class Key>
 Found search_entries(const Some& values, std::int32_t count, const Key& key) noexcept
     requires(Key::kTotalOrder) {
   std::int32_t position = count;
-  // Behind all of them: rows that come in the order of their values.
+  // Check for a key after the last entry first: rows are often inserted in the order of their
+  // values.
   if (!key.is_above(values.at(count - 1))) {
     position = count_less(count, [&](std::int32_t at) { return key.is_above(values.at(at)); });
   }
   return {position, position < count && key.equals(values.at(position))};
 }
 
-// Reals and doubles: these probes and no others, because equality within a tolerance chains and what is
-// not a number equals everything.
+// Reals and doubles: exactly this sequence of probes is required, because equality within a
+// tolerance is not transitive and NaN equals everything.
 template <class Some, class Key>
 Found search_entries(const Some& values, std::int32_t count, const Key& key) noexcept {
   std::int32_t low = 0, high = count - 1;
@@ -95,7 +96,7 @@ Found search_entries(const Some& values, std::int32_t count, const Key& key) noe
     std::int32_t middle = low + (high - low) / 2;
     const int answer = key.compare(values.at(middle));
     if (answer == 0) {
-      // Back to the first equal one; the entry in front of `low` is less.
+      // Step back to the first equal entry; the entry before `low` is less.
       while (middle > low && key.equals(values.at(middle - 1))) --middle;
       return {middle, true};
     }
@@ -108,7 +109,8 @@ Found search_entries(const Some& values, std::int32_t count, const Key& key) noe
   return {low, false};
 }
 
-// A totally ordered column whose index is in blocks: along the keys that the blocks keep of integers.
+// A totally ordered column whose index is in blocks: uses the keys that the blocks keep for
+// integers.
 template <class Key>
 IndexPlace search_blocks(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
                          const Key& key) noexcept {
@@ -128,7 +130,7 @@ IndexPlace search_blocks(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
   return {place, found};
 }
 
-// Among all entries. Positions of reals in blocks are looked up probe by probe.
+// Searches all entries. Reals in blocks are looked up probe by probe.
 template <class Key>
 IndexPlace search_all(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
                       const Key& key) noexcept {
@@ -136,7 +138,7 @@ IndexPlace search_all(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
     if (column.index.blocks != nullptr) return search_blocks(table, column, key);
   }
   Found found;
-  if (column.index.items != nullptr) {  // the usual case, without a look at the state at each probe
+  if (column.index.items != nullptr) {  // the usual case: avoids checking the state at each probe
     const ValuesOfEntries values{values_of(table, column), column.index.items};
     found = search_entries(values, table.num_rows, key);
   } else {
@@ -147,11 +149,11 @@ IndexPlace search_all(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
 
 // ---- Searching along search keys ----------------------------------------------------------------
 
-// What a search costs, as so many rows looked at one after the other.
+// The cost of a search, in rows of a sequential scan.
 constexpr std::int64_t kRowsPerSearch = 256;
 
-// Integers from position `first` on: along the fences of all, then among the few values that they lead
-// to. Whoever searches wants the row, so the entries of these are prefetched.
+// Searches integers from position `first` on: the fences first, then the few values that they
+// select. The caller wants the row, so the entries of these values are prefetched.
 template <class T>
 Found search_along_fences(const ValuesInLine<T>& values, std::int32_t first, std::int32_t count,
                           const std::int32_t* entries, const NumberKey<T>& key) noexcept {
@@ -180,7 +182,7 @@ Found search_along_keys(const unsigned char* keys, std::int32_t first, std::int3
   }
 }
 
-// What TEV8R1_sort_comp compares: the column whose index was made last.
+// The column that TEV8R1_sort_comp compares by: the one whose index was built last.
 struct SortContext {
   Values values;
   std::int32_t type;
@@ -190,8 +192,8 @@ SortContext sort_context{{nullptr, 0}, PF_TYPE_INT, 0.0};
 
 // ---- Blocks -------------------------------------------------------------------------------------
 
-// A block of `room` entries, those from `used` on zero; room 0: none. False when there is no
-// memory.
+// Allocates a block of `room` entries, zeroed after the first `used`; with room 0, no block.
+// Returns false when out of memory.
 bool make_block(std::int64_t used, std::int64_t room, NewIndex& out) noexcept {
   out = NewIndex{};
   if (room <= 0) return true;
@@ -207,12 +209,12 @@ void fill_identity(std::int32_t* entries, std::int32_t count) noexcept {
   for (std::int32_t i = 0; i < count; ++i) entries[i] = i;
 }
 
-// ---- Passes over entries, written so that the compiler makes vectors of them --------------------
+// ---- Passes over entries, written so that the compiler vectorizes them --------------------------
 
 constexpr std::int32_t kBlock = 64;
 
-// Lowers by one every entry above `row` up to the entry that is `row`, and returns its position;
-// count when there is none.
+// Decrements every entry above `row` up to the entry equal to `row`, and returns its position, or
+// count if there is none.
 std::int32_t lower_up_to(std::int32_t* entries, std::int32_t count, std::int32_t row) noexcept {
   std::int32_t at = 0;
   for (; count - at >= kBlock; at += kBlock) {
@@ -225,7 +227,7 @@ std::int32_t lower_up_to(std::int32_t* entries, std::int32_t count, std::int32_t
   return at;
 }
 
-// Takes a row out of `count` entries, lowers those above it, and returns where it stood.
+// Removes a row from `count` entries, decrements the entries above it, and returns its position.
 std::int32_t remove_row(std::int32_t* entries, std::int32_t count, std::int32_t row) noexcept {
   const std::int32_t position = lower_up_to(entries, count, row);
   for (std::int32_t i = position; i < count - 1; ++i) {
@@ -235,7 +237,7 @@ std::int32_t remove_row(std::int32_t* entries, std::int32_t count, std::int32_t 
   return position;
 }
 
-// Whether the comparison of some entry's value with that of the next one passes the test.
+// Whether comparing any entry's value with the next one's passes the test.
 template <class Test>
 bool some_neighbours(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
                      const std::int32_t* entries, double tolerance, Test test) noexcept {
@@ -260,7 +262,7 @@ bool some_neighbours(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
   });
 }
 
-// The value as the key that blocks keep of it; null for texts, of which they keep none.
+// The value as the key that blocks keep for it; null for texts, for which blocks keep no keys.
 const void* key_of_value(const TEVPF_COLUMN& column, const void* value) noexcept {
   return column.def.type == PF_TYPE_STRING ? nullptr : value;
 }
@@ -371,8 +373,8 @@ IndexPlace find_in_index(const TEVPF_TABLE& table, TEVPF_COLUMN& column, std::in
                   });
 }
 
-// An entry stands among those of equal value, mostly near the first of them. Where many are equal, or
-// values have drifted within the tolerance, the sequence finds it.
+// An entry is among those of equal value, usually near the first. Where many are equal, or values
+// have drifted within the tolerance, the sequence finds it.
 SequencePlace entry_of(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
                        std::int32_t slot) noexcept {
   constexpr std::int32_t kNear = 16;

@@ -1,9 +1,9 @@
-// A column's index: the slots of the rows in ascending order of the column's value, as a sequence. The only
-// file that changes it.
+// A column's index: a sequence of row slots in ascending order of the column's value. Only
+// column_index changes it.
 //
-// Values are ordered by the comparison of values/compare; among rows of equal value a row inserted later
-// stands in front. A file's index is taken in whatever order it is; searches of it end, stay in bounds and
-// change nothing.
+// Values are ordered by the comparison of values/compare. Among rows of equal value, a row inserted
+// later comes first. An index read from a file is accepted in any order; searches of it terminate,
+// stay in bounds and change nothing.
 #pragma once
 
 #include <cstdint>
@@ -13,7 +13,7 @@
 
 namespace tevpf {
 
-// An index that no column owns yet.
+// An index that does not yet belong to a column.
 struct NewIndex {
   Owned<std::int32_t> entries;
   std::int32_t room = 0;  // entries that the block holds
@@ -21,43 +21,47 @@ struct NewIndex {
 
 // ---- Whole indexes ------------------------------------------------------------------------------
 
-// Builds the index of a column of that type, tolerance and offset over the rows of a settled table, with
-// room for `room` entries (at least num_rows; 0: no block is made); O(n log n). False when memory runs
-// out. The order is total: by exact value, what is not a number last, ties by row number.
+// Builds the index of a column of that type, tolerance and offset over the rows of a settled table,
+// with room for `room` entries (at least num_rows; 0: no block is allocated). O(n log n). Returns
+// false when out of memory. The order is total: by exact value, NaN last, ties by row number.
 [[nodiscard]] bool build_index(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
                                std::int64_t room, NewIndex& out) noexcept;
 
-// Lets TEV8R1_sort_comp speak of this column.
+// Makes TEV8R1_sort_comp compare by this column.
 void sort_from_now_on(const TEVPF_TABLE& table, const TEVPF_COLUMN& column) noexcept;
 
-// Entries 0, 1, 2 ... `count` - 1: the index of a column of a settled table whose values are all equal.
+// The entries 0, 1, 2 ... `count` - 1: the index of a column of a settled table whose values are
+// all equal.
 [[nodiscard]] bool make_identity_index(std::int32_t count, std::int64_t room,
                                        NewIndex& out) noexcept;
 
-// A copy of the index of a settled table, with room for just its rows.
+// Copies the index of a settled table; the copy has room for exactly its rows.
 [[nodiscard]] bool copy_index(const TEVPF_COLUMN& column, std::int32_t count,
                               NewIndex& out) noexcept;
 
-// Gives the column this index in place of the one it has; release_index leaves it with none.
+// Replaces the column's index with this one. release_index leaves the column without an index.
 void adopt_index(TEVPF_COLUMN& column, NewIndex index) noexcept;
 void release_index(TEVPF_COLUMN& column) noexcept;
 
-// Of a settled table: whether no entry's value is greater than its follower's, by the column's type and this tolerance.
+// For a settled table: whether no entry's value is greater than that of the next entry, by the
+// column's type and this tolerance.
 [[nodiscard]] bool is_index_in_order(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
                                      double tolerance) noexcept;
 
-// Of a settled table: whether two neighbours of the index hold equal values, by the column's type and tolerance.
+// For a settled table: whether two neighbouring entries hold equal values, by the column's type and
+// tolerance.
 [[nodiscard]] bool has_equal_neighbours(const TEVPF_TABLE& table, const std::int32_t* entries,
                                         const TEVPF_COLUMN& column) noexcept;
 
 // ---- Reading ------------------------------------------------------------------------------------
 
-// The slots in order of value, of a settled table; null when there are no entries.
+// The slots of a settled table in order of value; null when there are no entries.
 inline const std::int32_t* index_entries(const TEVPF_COLUMN& column) noexcept {
   return column.idx_ptr;
 }
 
-// The sequence that positions go through: the search column's index, or else storage order.
+// The sequence that positions refer to: the search column's index if there is one, else storage
+// order.
 inline const Sequence& traversal_of(const TEVPF_TABLE& table) noexcept {
   const TEVPF_COLUMN* const search = table.cur_col;
   return search != nullptr && is_indexed(*search) ? search->index : table.slots.order;
@@ -65,8 +69,8 @@ inline const Sequence& traversal_of(const TEVPF_TABLE& table) noexcept {
 
 // ---- Searching ----------------------------------------------------------------------------------
 
-// What a search comes to: whether a value equals the key, and the place of the first that does, else of
-// the first greater one.
+// The result of a search: whether a value equals the key, and the place of the first equal value,
+// or else of the first greater one.
 struct IndexPlace {
   SequencePlace place;
   bool found;
@@ -76,12 +80,13 @@ struct IndexPlace {
 [[nodiscard]] IndexPlace search_index(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
                                       const void* key) noexcept;
 
-// Searches all entries but the one at position `without`; places count as if it were not there.
+// Searches all entries except the one at position `without`; places count as if it were absent.
 [[nodiscard]] IndexPlace search_others(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
                                        std::int32_t without, const void* key) noexcept;
 
-// Searches the entries from position `first` on, for searches that callers ask for: a column that is
-// searched often gets search keys, with which steps cost a quarter in a table that is larger than the cache.
+// Searches the entries from position `first` on, for searches that callers request. A column that
+// is searched often gets search keys, which make each step about four times cheaper in a table
+// larger than the cache.
 [[nodiscard]] IndexPlace find_in_index(const TEVPF_TABLE& table, TEVPF_COLUMN& column,
                                        std::int32_t first, const void* key) noexcept;
 
@@ -89,9 +94,10 @@ struct IndexPlace {
 [[nodiscard]] SequencePlace entry_of(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
                                      std::int32_t slot) noexcept;
 
-// ---- Entries, as rows come and go ---------------------------------------------------------------
-// num_rows is the count before the change. Allocate first by column.index.make_ready_to_...; what follows
-// cannot fail.
+// ---- Entries, as rows are inserted, moved and deleted
+// --------------------------------------------
+// num_rows is the count before the change. Allocate first with column.index.make_ready_to_...; the
+// functions below cannot fail.
 
 // Inserts the slot of a row with that value.
 void insert_entry(const TEVPF_TABLE& table, TEVPF_COLUMN& column, SequencePlace place,
@@ -99,15 +105,15 @@ void insert_entry(const TEVPF_TABLE& table, TEVPF_COLUMN& column, SequencePlace 
 
 void erase_entry(const TEVPF_TABLE& table, TEVPF_COLUMN& column, SequencePlace place) noexcept;
 
-// Moves an entry to position `to` among the others, with its row's new value.
+// Moves an entry to position `to`, counted without the entry itself, with its row's new value.
 void move_entry(TEVPF_COLUMN& column, std::int32_t from, std::int32_t to,
                 const void* value) noexcept;
 
-// To be called when the value of a row changes and its entry stays.
+// Call this when a row's value changes and its entry stays in place.
 void note_value(const TEVPF_TABLE& table, TEVPF_COLUMN& column, std::int32_t slot,
                 const void* value) noexcept;
 
-// To be called when values may have changed without notice: drops what is kept of them.
+// Call this when values may have changed without notice: drops everything derived from them.
 void forget_values(TEVPF_TABLE& table) noexcept;
 
 }  // namespace tevpf

@@ -15,12 +15,12 @@
 namespace tevpf {
 namespace {
 
-// The stored place of a description counts from here.
+// The stored position of a description counts from here.
 constexpr std::int64_t kDescriptionBase = 41;
 
 TEVPF_STATUS bad_type(std::int32_t type) noexcept { return fail(PF_BADTYPE, "column", Text(type)); }
 
-// The bounds of a number column. A real's bounds that are not numbers are refused, a double's pass.
+// The bounds of a number column. NaN bounds are refused for a real and accepted for a double.
 template <class T>
 bool bounds_in_order(T min, T max) noexcept {
   if constexpr (std::is_same_v<T, float>) {

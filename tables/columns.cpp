@@ -1,5 +1,6 @@
-// Defining, deleting and moving columns. Each operation checks, acquires every block that it needs,
-// and only then changes the table, by steps that cannot fail. Redefining stands in redefine.cpp.
+// Defining, deleting and moving columns. Each operation checks first, then allocates every block
+// that it needs, and only then changes the table, in steps that cannot fail. redefine.cpp holds
+// redefinition.
 #include "tables/columns.h"
 
 #include <cstdio>
@@ -38,7 +39,8 @@ TEVPF_COLUMN& at(const ColumnArray& columns, std::int32_t i) noexcept {
   return columns[static_cast<std::size_t>(i)];
 }
 
-// The search column stays the same column when the array is replaced and it stands at `position`.
+// Replaces the column array. The search column stays the same column; `position` is its place in
+// the new array, -1 for none.
 void replace_columns(TEVPF_TABLE& table, ColumnArray columns, std::int32_t position) noexcept {
   heap_free(table.col_array);
   table.col_array = columns.release();
@@ -47,14 +49,15 @@ void replace_columns(TEVPF_TABLE& table, ColumnArray columns, std::int32_t posit
 
 // ---- Defining -----------------------------------------------------------------------------------
 
-// A column that is complete but not yet part of its table, and what the table gets for it.
+// A column that is complete but not yet part of its table, and the storage that the table gets for
+// it.
 struct NewColumn {
   TEVPF_COLUMN record{};
-  Layout layout;             // of the table with it
+  Layout layout;             // of the table including this column
   std::int32_t stored_size;  // bytes that btf grows by
   Owned<char> description;
   NewIndex index;
-  ColumnArray larger;  // the column array with more slots, when the present one is full
+  ColumnArray larger;  // the column array with more slots, if the present one is full
 };
 
 bool acquire_column_slot(const TEVPF_TABLE& table, ColumnArray& larger) noexcept {
@@ -68,7 +71,7 @@ bool acquire_column_slot(const TEVPF_TABLE& table, ColumnArray& larger) noexcept
   return true;
 }
 
-// Completes the record and places it in the row; nothing of the table changes.
+// Completes the record and places it in the row; the table does not change.
 TEVPF_STATUS construct_new_column(const TEVPF_TABLE& table, const TEVPF_COL_DEF& definition,
                                   NewColumn& column) noexcept {
   TEVPF_COLUMN& record = column.record;
@@ -92,8 +95,8 @@ TEVPF_STATUS construct_new_column(const TEVPF_TABLE& table, const TEVPF_COL_DEF&
   return PF_NORMAL;
 }
 
-// Room in the table for the column's record, index, values and default value. What stays of it
-// after a failure does not show.
+// Allocates room in the table for the column's record, index, values and default value. Room left
+// after a failure is not visible to callers.
 bool acquire_room(TEVPF_TABLE& table, NewColumn& column) noexcept {
   const TEVPF_COL_DEF& def = column.record.def;
   if (!acquire_column_slot(table, column.larger)) return false;
@@ -104,7 +107,7 @@ bool acquire_room(TEVPF_TABLE& table, NewColumn& column) noexcept {
   return widen_default_row(table, column.layout.row_wid, column.record.offset, def);
 }
 
-// The bytes that a new column has in every row; null: zeros.
+// The bytes of a new column in every row; null means zeros.
 const unsigned char* initial_value(const TEVPF_COL_DEF& def, unsigned char (&buffer)[8]) noexcept {
   if (def.type == PF_TYPE_STRING) return nullptr;
   put_min(buffer, def);
@@ -130,7 +133,7 @@ void append_column(TEVPF_TABLE& table, NewColumn column) noexcept {
   set_layout(table, column.layout);
 }
 
-// Gives a column the next place of a new layout and notes which bytes of a row move there; returns
+// Gives a column the next place in a new layout and notes which bytes of a row move there. Returns
 // the new number of runs.
 std::int32_t place_again(Layout& layout, TEVPF_COLUMN& column, Run* runs,
                          std::int32_t num_runs) noexcept {
@@ -142,7 +145,7 @@ std::int32_t place_again(Layout& layout, TEVPF_COLUMN& column, Run* runs,
 
 // ---- Deleting -----------------------------------------------------------------------------------
 
-// Lays out the columns but one afresh; the runs are what moves where in a row.
+// Lays out all columns except one; the runs say which bytes of a row move where.
 Layout lay_out_without(TEVPF_TABLE& table, std::int32_t deleted, Run* runs,
                        std::int32_t& num_runs) noexcept {
   Layout layout;
@@ -153,7 +156,7 @@ Layout lay_out_without(TEVPF_TABLE& table, std::int32_t deleted, Run* runs,
   return layout;
 }
 
-// Takes the record out of the array; the search column stays the same column.
+// Removes the record from the array; the search column stays the same column.
 void remove_record(TEVPF_TABLE& table, std::int32_t position) noexcept {
   TEVPF_COLUMN* const record = table.col_array + position;
   release_column(*record);
@@ -167,7 +170,7 @@ void remove_record(TEVPF_TABLE& table, std::int32_t position) noexcept {
   }
 }
 
-// The last column takes all rows with it, and with them what the cursor could point at.
+// Deleting the last column deletes all rows, so the cursor has no row to point at.
 void drop_all_rows(TEVPF_TABLE& table) noexcept {
   set_layout(table, Layout{});
   adopt_default_row(table, nullptr);
@@ -178,17 +181,17 @@ void drop_all_rows(TEVPF_TABLE& table) noexcept {
 
 // ---- Moving -------------------------------------------------------------------------------------
 
-// A table's columns in another order, and the storage that this order needs.
+// A table's columns in a new order, and the storage that this order needs.
 struct Reordered {
   ColumnArray columns;
   Owned<Run> runs;
   std::int32_t num_runs = 0;
   Layout layout;
-  Owned<unsigned char> rows;  // none without rows
+  Owned<unsigned char> rows;  // null without rows
   Owned<unsigned char> default_row;
 };
 
-// Where a column stands once the one at `from` has moved to `to`.
+// The position of a column after the one at `from` has moved to `to`.
 std::int32_t moved_position(std::int32_t position, std::int32_t from, std::int32_t to) noexcept {
   if (position == from) return to;
   if (from < position && position <= to) return position - 1;

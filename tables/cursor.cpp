@@ -31,7 +31,7 @@ std::int32_t slot_in_blocks(TEVPF_TABLE& table, std::int32_t position) noexcept 
 
 using namespace tevpf;
 
-// The row can be written through the pointers that these two hand out.
+// Callers can write the row through the pointers that these two functions return.
 
 TEVPF_STATUS TEV8R1_get_next_row_ptr(TEVPF_TABLE* table, void** row_ptr_out,
                                      int32_t* row_number_out) noexcept {
@@ -51,8 +51,8 @@ TEVPF_STATUS TEV8R1_get_cur_row_ptr(TEVPF_TABLE* table, void** row_ptr_out,
   return PF_NORMAL;
 }
 
-// Rows are read by the million, one call each. The usual case calls nothing, so that nothing has to be
-// kept across a call.
+// Callers read millions of rows, one call each. The usual case makes no calls, so the compiler does
+// not have to save any registers.
 TEVPF_STATUS TEV8R1_PF_get_next_row(const char* table_name, void* row_out) noexcept {
   TEVPF_TABLE* const table = last_table(table_name);
   return table != nullptr ? step(*table, row_out) : find_and_step(table_name, row_out);

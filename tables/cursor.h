@@ -1,4 +1,4 @@
-// The table's cursor: the position of the current row and of the next one.
+// The table's cursor: the positions of the current row and of the next one.
 #pragma once
 
 #include <cstdint>
@@ -10,9 +10,9 @@
 
 extern "C" {
 
-// The row at position next_row, and its row number. Without a next row: null, and the position.
-// Always PF_NORMAL. Values that no index covers may be written through the pointer, of both
-// operations, until the table is searched again.
+// The row at position next_row, and its row number. If there is no next row: null, and the
+// position. Always PF_NORMAL. Through the pointers returned by both operations, callers may write
+// values that no index covers, until the next search of the table.
 TEVPF_API TEVPF_STATUS TEV8R1_get_next_row_ptr(TEVPF_TABLE* table, void** row_ptr_out,
                                                std::int32_t* row_number_out) noexcept;
 
@@ -35,11 +35,11 @@ inline std::int32_t row_number_at(const TEVPF_TABLE& table, std::int32_t positio
   return row_number_of(table, traversal.at(position));
 }
 
-// How many positions ahead rows are prefetched while they are read in another order than they lie in.
+// How many positions ahead rows are prefetched when they are not read in storage order.
 inline constexpr std::int32_t kRowsAhead = 12;
 
-// Prefetches a row some positions ahead. As a function of its own it would have no effect that the compiler
-// knows of, and be left out.
+// Prefetches a row some positions ahead. Must be inlined: as a separate function it would have no
+// effect known to the compiler, which would drop the call.
 [[gnu::always_inline]] inline void fetch_ahead(const TEVPF_TABLE& table,
                                                std::int32_t position) noexcept {
   const Sequence& traversal = traversal_of(table);
@@ -49,10 +49,11 @@ inline constexpr std::int32_t kRowsAhead = 12;
   __builtin_prefetch(row + table.row_wid - 1);
 }
 
-// The slot at a position in blocks; counts the read. Out of line, so that the usual case stays short.
+// The slot at a position in a sequence of blocks; counts the read. Out of line to keep the usual
+// case short.
 std::int32_t slot_in_blocks(TEVPF_TABLE& table, std::int32_t position) noexcept;
 
-// The slot at a position, for reading the row there.
+// The slot at a position, for reading its row.
 inline std::int32_t read_slot(TEVPF_TABLE& table, std::int32_t position) noexcept {
   const Sequence& traversal = traversal_of(table);
   if (traversal.items != nullptr) return traversal.items[position];

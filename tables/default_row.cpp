@@ -80,7 +80,7 @@ TEVPF_STATUS TEV8R1_init_row_defaults(TEVPF_TABLE* table) noexcept {
 TEVPF_STATUS TEV8R1_adjust_default(void** dft_row, std::int32_t row_wid,
                                    const TEVPF_COL_DEF* definition, std::int32_t size,
                                    std::int32_t offset) noexcept {
-  (void)size;  // follows from the definition
+  (void)size;  // implied by the definition
   const auto bytes = static_cast<std::uint64_t>(row_wid);
   void* row = *dft_row == nullptr ? heap_zeroed(bytes, 1) : heap_resize(*dft_row, bytes, 1);
   if (row == nullptr) return fail_empty(PF_NOMEM);

@@ -1,5 +1,6 @@
-// The default row: one row of the table's layout that holds every column's min, strings the empty
-// text, until a caller sets other values. Bytes without a value are zero in rows that are made here.
+// The default row: one row in the table's layout that holds every column's min, or the empty text
+// for strings, until a caller sets other values. In rows created here, bytes that belong to no
+// value are zero.
 #pragma once
 
 #include "core/base/heap.h"
@@ -8,32 +9,33 @@
 extern "C" {
 
 // Writes every column's min, or zeros over a whole string, into the default row.
-//   PF_BADTYPE  a column of no known type was passed over
+//   PF_BADTYPE  a column of an unknown type was skipped
 TEVPF_API TEVPF_STATUS TEV8R1_init_row_defaults(TEVPF_TABLE* table) noexcept;
 }
 
 namespace tevpf {
 
-// Puts the definition's min, or the empty text, at the place of a value.
+// Stores the definition's min, or the empty text, as the value at a given place.
 void put_min(unsigned char* place, const TEVPF_COL_DEF& definition) noexcept;
 
-// Gives a table whose columns stand a default row of the minimums in place of the one it has; false
-// when memory runs out, and then it keeps that.
+// Replaces the default row of a table whose columns are complete with a row of minimums. Returns
+// false when out of memory, and the table keeps its default row.
 [[nodiscard]] bool make_default_row(TEVPF_TABLE& table) noexcept;
 
-// Makes the default row where there is none yet: a table whose loading has failed has columns, but
-// gets a default row only when an operation needs it. False when memory runs out.
+// Creates the default row if there is none: a table whose loading failed has columns, but gets a
+// default row only when an operation needs it. Returns false when out of memory.
 [[nodiscard]] bool ensure_default_row(TEVPF_TABLE& table) noexcept;
 
-// Widens the default row from row_wid to new_wid bytes, or makes the first one, and puts the min of a
-// new column at `offset`. Bytes that were there stay, the others are zero. False when memory runs out.
+// Widens the default row from row_wid to new_wid bytes, or creates the first one, and stores the
+// min of a new column at `offset`. Existing bytes are kept; the others are zero. Returns false when
+// out of memory.
 [[nodiscard]] bool widen_default_row(TEVPF_TABLE& table, std::int64_t new_wid, std::int64_t offset,
                                      const TEVPF_COL_DEF& definition) noexcept;
 
-// The same as make_default_row with a block of row_wid zeros that is already there.
+// Like make_default_row, but uses a given block of row_wid zeros.
 void adopt_minimums(TEVPF_TABLE& table, Owned<unsigned char> zeroed) noexcept;
 
-// Replaces the default row by another block, or by none.
+// Replaces the default row with another block, or with none.
 void adopt_default_row(TEVPF_TABLE& table, Owned<unsigned char> row) noexcept;
 
 }  // namespace tevpf

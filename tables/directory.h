@@ -11,7 +11,7 @@ TEVPF_API TEVPF_STATUS TEV8R1_get_table_array_pos(const TEVPF_TABLE* table,
 TEVPF_API TEVPF_STATUS TEV8R1_create_table(TEVPF_ELEM_HEADER header,
                                            TEVPF_TABLE** table_out) noexcept;
 
-// Appends a record that the caller fills in, its name included.
+// Appends a record; the caller fills it in, including its name.
 TEVPF_API TEVPF_STATUS TEV8R1_insert_table(TEVPF_TABLE** table_out) noexcept;
 TEVPF_API TEVPF_STATUS TEV8R1_free_table(TEVPF_TABLE* table) noexcept;
 }
@@ -23,12 +23,13 @@ inline TEVPF_TABLE* as_table(TEVPF_ELEM_HEADER* element) noexcept {
   return reinterpret_cast<TEVPF_TABLE*>(element);
 }
 
-// The table that was found last if it has this name, of fewer than 8 characters; else null.
+// The table found by the last lookup, if it has this name and the name is shorter than 8
+// characters; else null.
 inline TEVPF_TABLE* last_table(const char* name) noexcept {
   return as_table(last_element(PF_ELEM_TABLE, name));
 }
 
-// Finds a table of the current file by its exact name, in whatever state it is.
+// Finds a table of the current file by its exact name, whatever state it is in.
 //   PF_NOFILE  no file is current; texts empty
 //   PF_NOELEM  no such table; texts: "table", the name
 [[nodiscard]] TEVPF_STATUS find_table(const char* name, TEVPF_TABLE*& table) noexcept;

@@ -55,7 +55,7 @@ TEVPF_STATUS TEV8R1_make_table_format(TEVPF_TABLE* table) noexcept {
     status = TEV8R1_make_col_format(&table->col_array[i], &width);
     sum += std::int64_t{width} + kColumnGap;
   }
-  // No gap behind the last column, but room for a terminator.
+  // No gap after the last column, but room for a terminator.
   if (table->num_cols > 0) sum += 1 - kColumnGap;
   table->dsp_wid = static_cast<std::int32_t>(std::clamp<std::int64_t>(sum, INT32_MIN, INT32_MAX));
   return status;

@@ -1,4 +1,4 @@
-// Display formats: how wide a column and a row are shown, and the printf format of a column's
+// Display formats: the display widths of columns and rows, and the printf format of a column's
 // values.
 #pragma once
 
@@ -8,13 +8,13 @@
 
 extern "C" {
 
-// Writes the column's display width, and its format.
-//   PF_BADTYPE  no such value type: the format stays
+// Sets the column's display width and format.
+//   PF_BADTYPE  no such value type; the format is unchanged
 TEVPF_API TEVPF_STATUS TEV8R1_make_col_format(TEVPF_COLUMN* column,
                                               std::int32_t* width_out) noexcept;
 
-// Remakes the formats of all columns and the table's display width; the status is the last
-// column's.
+// Rebuilds the formats of all columns and the table's display width; returns the last column's
+// status.
 TEVPF_API TEVPF_STATUS TEV8R1_make_table_format(TEVPF_TABLE* table) noexcept;
 }
 

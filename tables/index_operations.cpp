@@ -1,5 +1,5 @@
-// The operations on indexes that are exported by themselves. They take records as callers outside see them,
-// so they settle the table first.
+// Index operations that are exported individually. They work on records as outside callers see
+// them, so they settle the table first.
 #include "tables/column_index.h"
 #include "tables/columns.h"
 #include "tables/row_store.h"
@@ -29,7 +29,8 @@ TEVPF_STATUS TEV8R1_check_unique_values(TEVPF_TABLE* table, TEVPF_COLUMN* column
   return PF_NORMAL;
 }
 
-// The row stands where its number says already, or will; an index without room for it is left as it is.
+// The row is already stored at its row number, or will be. An index without room for it is
+// unchanged.
 TEVPF_STATUS TEV8R1_update_indexes(TEVPF_TABLE* table, const void* row,
                                    int32_t row_number) noexcept {
   if (!settle(*table)) return PF_NORMAL;

@@ -1,5 +1,5 @@
-// What callers need to know about columns to build rows: definitions, names, places. All that is
-// handed out is the caller's own.
+// What callers need to know about columns to build rows: definitions, names, positions. The caller
+// owns everything that is returned.
 #include "core/base/heap.h"
 #include "core/base/status.h"
 #include "core/base/text_field.h"
@@ -10,7 +10,7 @@
 namespace tevpf {
 namespace {
 
-// Hands out one entry a column, in column order; without columns only the count of 0.
+// Returns one entry per column, in column order; without columns, only a count of 0.
 template <class Entry, class Fill>
 TEVPF_STATUS hand_out_columns(const char* table_name, std::int32_t* count_out, Entry** entries_out,
                               Fill fill) noexcept {

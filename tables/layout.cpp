@@ -15,7 +15,7 @@ std::int64_t place_column(Layout& layout, std::int32_t type, std::int64_t size) 
   const std::int32_t unit = is_number_type(type) ? value_type(type).alignment : 1;
   if (unit > 1) layout.mod = std::max(layout.mod, static_cast<std::int16_t>(unit));
 
-  // The padding behind the last value is taken back, so that a small value may fit into it.
+  // Take back the padding after the last value, so that a small value may fit into it.
   const std::int64_t offset =
       aligned(layout.row_wid - std::max<std::int16_t>(layout.extra_bytes, 0), unit);
   const std::int64_t end = offset + size;

@@ -1,7 +1,8 @@
-// How columns lie in a row: one behind the other in column order, each at the first suitably
-// aligned byte behind the value before it; the row ends on a multiple of its alignment unit.
+// How columns are laid out in a row: in column order, each at the first suitably aligned byte after
+// the previous value. The row ends on a multiple of its alignment unit.
 //
-// Widths are 64-bit here: what does not fit a table's 32 bits is refused before anything changes.
+// Widths are 64-bit here: a width that does not fit the table's 32 bits is refused before anything
+// changes.
 #pragma once
 
 #include <cstdint>
@@ -11,7 +12,7 @@
 
 extern "C" {
 
-// The layout step on a table's own figures: places a value of `size` bytes behind a row of row_wid
+// The layout step on a table's own fields: places a value of `size` bytes after a row of row_wid
 // bytes; the row then has row_wid + *pad_out + size bytes. Always PF_NORMAL.
 TEVPF_API TEVPF_STATUS TEV8R1_adjust_col(std::int32_t row_wid, std::int32_t type, std::int32_t size,
                                          std::int16_t* extra_bytes, std::int16_t* mod,
@@ -22,7 +23,7 @@ namespace tevpf {
 
 inline constexpr std::int64_t kMaxRowWidth = INT32_MAX;
 
-// A row in the making; starts empty.
+// A row under construction; starts empty.
 struct Layout {
   std::int64_t row_wid = 0;
   std::int16_t mod = 0;
@@ -37,17 +38,17 @@ inline std::int64_t place_column(Layout& layout, const TEVPF_COL_DEF& def) noexc
   return place_column(layout, def.type, value_size(def.type, def.width));
 }
 
-// Bytes of a column's value in a row of a table, where it is known to fit.
+// The size in bytes of a column's value in a table's row, known to fit 32 bits.
 inline std::int32_t column_size(const TEVPF_COLUMN& column) noexcept {
   return static_cast<std::int32_t>(value_size(column.def.type, column.def.width));
 }
 
-// The layout that the table's figures describe, and the way back.
+// Converts between the table's fields and the layout that they describe.
 Layout layout_of(const TEVPF_TABLE& table) noexcept;
 void set_layout(TEVPF_TABLE& table, const Layout& layout) noexcept;
 
-// Lays the columns out afresh: offsets, row width, mod and padding. True when any offset or the row
-// width has changed. The row is known to fit.
+// Recomputes the layout of the columns: offsets, row width, mod and padding. Returns true if any
+// offset or the row width has changed. The row is known to fit.
 bool lay_out_columns(TEVPF_TABLE& table) noexcept;
 
 }  // namespace tevpf

@@ -1,4 +1,4 @@
-// Redefining a column: all checks come first, then every block that is needed, then the change.
+// Redefines a column: all checks first, then the allocation of every block needed, then the change.
 #include <cstring>
 #include <utility>
 
@@ -22,11 +22,11 @@
 namespace tevpf {
 namespace {
 
-// What a redefinition puts in the place of what the column has.
+// What a redefinition replaces in the column.
 struct Redefinition {
-  TEVPF_COLUMN record;  // the column as it will be, its blocks aside
+  TEVPF_COLUMN record;  // the redefined column, without its blocks
   Owned<char> description;
-  bool new_index = false;  // `index` takes the place of the column's
+  bool new_index = false;  // whether `index` replaces the column's index
   NewIndex index;
   Owned<unsigned char> default_row;
   std::int64_t btf;
@@ -47,7 +47,7 @@ TEVPF_STATUS check_string_width(const TEVPF_TABLE& table, std::int32_t old_width
   return new_width < 1 ? PF_BADWIDTH : PF_NORMAL;
 }
 
-// Row width with the column at `position` redefined.
+// The row width after redefining the column at `position`.
 std::int64_t redefined_row_width(const TEVPF_TABLE& table, std::int32_t position,
                                  const TEVPF_COL_DEF& definition) noexcept {
   Layout layout;
@@ -57,7 +57,7 @@ std::int64_t redefined_row_width(const TEVPF_TABLE& table, std::int32_t position
   return layout.row_wid;
 }
 
-// Whether the definition may take the column's place; gives the width of a row with it.
+// Whether the definition may replace the column's; returns the resulting row width.
 TEVPF_STATUS check_redefinition(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
                                 const TEVPF_COL_DEF& definition, std::int64_t& row_wid) noexcept {
   PF_TRY(check_new_name(table, column.def.name, definition.name));
@@ -68,15 +68,15 @@ TEVPF_STATUS check_redefinition(const TEVPF_TABLE& table, const TEVPF_COLUMN& co
   } else {
     const TEVPF_STATUS status =
         TEV8R1_check_column_values(&table, column.offset, definition, column.tolerance);
-    if (definition.width < 1) return PF_BADWIDTH;  // over a value out of range, whose texts stay
+    if (definition.width < 1) return PF_BADWIDTH;  // overrides PF_RANGE, whose texts stay
     PF_TRY(status);
   }
   row_wid = redefined_row_width(table, column_position(table, &column), definition);
   return row_wid > kMaxRowWidth ? row_too_wide(definition) : PF_NORMAL;
 }
 
-// The index as the redefinition leaves it: built when it is switched on, and built anew when a
-// finer tolerance puts entries out of order. Uniqueness is judged under the old tolerance.
+// The index after the redefinition: built when indexing is switched on, and rebuilt when a finer
+// tolerance puts entries out of order. Uniqueness is checked under the old tolerance.
 TEVPF_STATUS prepare_index(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
                            Redefinition& next) noexcept {
   const TEVPF_COL_DEF& def = next.record.def;
@@ -135,7 +135,7 @@ void apply(TEVPF_TABLE& table, TEVPF_COLUMN& column, Redefinition next) noexcept
   }
   table.header.btf = static_cast<std::int32_t>(next.btf);
 
-  // With rows every offset comes out as before.
+  // In a table with rows the offsets never change here.
   if (lay_out_columns(table)) give_up_spare_rows(table);
   adopt_minimums(table, std::move(next.default_row));
   if (width_changed && library.interactive != 0) (void)TEV8R1_make_table_format(&table);

@@ -1,5 +1,5 @@
-// Rows for callers that share a table with others: they are read through the table's cursor and search
-// column, which are then as before.
+// Row access for callers that share a table. Rows are read through the table's cursor and search
+// column, which are restored afterwards.
 #include <algorithm>
 
 #include "core/base/status.h"
@@ -13,7 +13,7 @@ using namespace tevpf;
 
 namespace {
 
-// Lends a table's cursor and search column for the length of a scope.
+// Saves a table's cursor and search column, and restores them at the end of the scope.
 class BorrowedCursor {
  public:
   BorrowedCursor(TEVPF_TABLE& table, TEVPF_COLUMN* order) noexcept
@@ -40,7 +40,7 @@ TEVPF_STATUS check_request(const TEVPF_TABLE& table, std::int32_t first, std::in
                                    : fail(PF_BADARG, Text(row_size), Text(table.row_wid));
 }
 
-// The column whose order is asked for, null for a null name.
+// The column that determines the requested order; null for a null name.
 TEVPF_STATUS find_order(const TEVPF_TABLE& table, const char* name, TEVPF_COLUMN*& column) {
   column = nullptr;
   if (name == nullptr) return PF_NORMAL;

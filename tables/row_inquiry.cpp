@@ -1,4 +1,4 @@
-// Figures of a table, the check of a single value, and interactive mode.
+// Table properties, the check of a single value, and interactive mode.
 #include "core/base/status.h"
 #include "core/library.h"
 #include "tables/column_record.h"

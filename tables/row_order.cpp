@@ -11,8 +11,7 @@
 namespace tevpf {
 namespace {
 
-// Numbers as unsigned keys in the order of their values; 0.0 and -0.0 are one value, and what is
-// not a number stands behind everything.
+// Maps numbers to unsigned keys in the same order; 0.0 and -0.0 are one value, and NaN comes last.
 std::uint32_t sort_key(std::int32_t value) noexcept {
   return static_cast<std::uint32_t>(value) ^ 0x80000000u;
 }
@@ -39,7 +38,7 @@ void sort_entries(Entry* entries, std::int32_t count, Less less) noexcept {
   if (!std::is_sorted(entries, entries + count, less)) std::sort(entries, entries + count, less);
 }
 
-// A key of 32 bits and its row make one number.
+// A 32-bit key and its row number form one 64-bit number.
 template <class T>
 bool sort_rows_by_short_key(const Values& values, std::int32_t count, std::int32_t* out) noexcept {
   const auto keys = new_array<std::uint64_t>(static_cast<std::uint64_t>(count));
@@ -53,7 +52,7 @@ bool sort_rows_by_short_key(const Values& values, std::int32_t count, std::int32
   return true;
 }
 
-// Keys of 64 bits; `rest` orders two rows of equal keys (below 0, 0, above 0).
+// 64-bit keys; `rest` compares two rows with equal keys (below 0, 0, above 0).
 template <class KeyOf, class Rest>
 bool sort_rows_by_long_key(std::int32_t count, std::int32_t* out, KeyOf key_of,
                            Rest rest) noexcept {

@@ -1,4 +1,4 @@
-// Rows in the order of a column's values, as a new index has them.
+// Sorts rows by a column's values, in the order of a new index.
 #pragma once
 
 #include <cstdint>
@@ -7,9 +7,8 @@
 
 namespace tevpf {
 
-// Puts the numbers of all rows into `out`, ordered by a column of that type and offset; O(n log n).
-// The order is total: by exact value, what is not a number last, ties by row number. False when
-// memory runs out.
+// Writes all row numbers to `out`, ordered by a column of that type and offset; O(n log n). The
+// order is total: by exact value, NaN last, ties by row number. Returns false when out of memory.
 [[nodiscard]] bool sort_rows(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
                              std::int32_t* out) noexcept;
 

@@ -11,8 +11,8 @@
 namespace tevpf {
 namespace {
 
-// Gives `count` fields of `size` bytes, a row apart, a terminator in their last byte where they have
-// none.
+// Terminates `count` fields of `size` bytes, one per row, in their last byte if they have no
+// terminator.
 void end_texts(unsigned char* field, std::int64_t size, std::int64_t count,
                std::int64_t row_wid) noexcept {
   const auto bytes = static_cast<std::size_t>(size);
@@ -75,7 +75,7 @@ void insert_row(TEVPF_TABLE& table, std::int32_t row_number, const void* row) no
 
 void erase_row(TEVPF_TABLE& table, std::int32_t row_number) noexcept {
   RowSlots& slots = table.slots;
-  // The last row of an identity: the slot behind the rows is the next one anyway.
+  // The last row of an identity order: the slot after the rows is the next one anyway.
   if (slots.order.is_identity()) return;
   slots.free[slots.num_free++] = slot_of(table, row_number);
   slots.order.erase(table.num_rows, slots.order.place_at(row_number));
@@ -103,7 +103,8 @@ void adopt_rows(TEVPF_TABLE& table, Owned<unsigned char> rows, std::int64_t byte
   table.slots.bytes = bytes;
 }
 
-// Rows in another order than their slots are cache misses: some are prefetched while one is copied.
+// Reading rows out of slot order causes cache misses, so later rows are prefetched while one is
+// copied.
 void copy_rows_to(const TEVPF_TABLE& table, unsigned char* out) noexcept {
   constexpr std::int32_t kAhead = 8;
   const std::int64_t row_wid = table.row_wid;
@@ -170,7 +171,7 @@ std::int32_t add_run(Run* runs, std::int32_t count, Run value) noexcept {
 
 void compact_rows(unsigned char* rows, std::int64_t num_rows, std::int64_t old_wid,
                   std::int64_t new_wid, const Run* runs, std::int32_t num_runs) noexcept {
-  // Every byte is written at or before the place of the next byte to be read.
+  // Every byte is written at or before the position of the next byte to be read.
   for (std::int64_t n = 0; n < num_rows; ++n) {
     const unsigned char* from = rows + n * old_wid;
     unsigned char* to = rows + n * new_wid;

@@ -23,7 +23,7 @@ namespace {
 
 constexpr std::int32_t kMaxFreeRows = std::numeric_limits<std::int16_t>::max();
 
-// ---- Rows that callers hand in ------------------------------------------------------------------
+// ---- Rows from callers --------------------------------------------------------------------------
 
 bool all_texts_end(const TEVPF_TABLE& table, const unsigned char* row) noexcept {
   for (std::int32_t i = 0; i < table.num_cols; ++i) {
@@ -35,8 +35,8 @@ bool all_texts_end(const TEVPF_TABLE& table, const unsigned char* row) noexcept 
   return true;
 }
 
-// A caller's row, safe to read: the row itself when all its texts end within their fields, else a
-// copy in which they do.
+// A caller's row, safe to read: the row itself if every text ends within its field, else a copy in
+// which it does.
 class GivenRow {
  public:
   GivenRow(const TEVPF_TABLE& table, const void* row) noexcept
@@ -47,7 +47,7 @@ class GivenRow {
     if (copy_) end_texts(table, copy_.get(), 1);
     row_ = copy_.get();
   }
-  const unsigned char* get() const noexcept { return row_; }  // null: memory ran out
+  const unsigned char* get() const noexcept { return row_; }  // null: out of memory
 
  private:
   const unsigned char* row_;
@@ -60,8 +60,8 @@ void copy_row(const TEVPF_TABLE& table, const void* from, void* to) noexcept {
 
 // ---- Slots --------------------------------------------------------------------------------------
 
-// Makes room for the documented number of further rows: the initial increment for a table without rows, else
-// the later one; at most as many as free_rows can count.
+// Makes room for the documented number of additional rows: the initial increment for a table
+// without rows, else the later one; never more than free_rows can count.
 TEVPF_STATUS make_space(TEVPF_TABLE& table) noexcept {
   const std::int32_t most = std::numeric_limits<std::int32_t>::max() - table.num_rows;
   const std::int32_t wanted = table.num_rows == 0 ? library.alloc_initial : library.alloc_increment;
@@ -73,8 +73,9 @@ TEVPF_STATUS make_space(TEVPF_TABLE& table) noexcept {
 
 // ---- Insertion and removal ----------------------------------------------------------------------
 
-// What an operation found out about the index of each column: places or positions, of which nothing changes
-// before the operation does. Few columns are indexed, so a small array holds them; else there is a block.
+// What an operation found in each column's index: places or positions. The indexes do not change
+// before the operation changes them. Few columns are indexed, so a small array usually suffices; a
+// larger table gets a block.
 template <class T>
 class PerColumn {
  public:
@@ -83,7 +84,7 @@ class PerColumn {
     if (table.num_cols > kFew) block_ = new_array<T>(static_cast<std::uint64_t>(table.num_cols));
     values_ = table.num_cols > kFew ? block_.get() : few_;
   }
-  bool exists() const noexcept { return values_ != nullptr; }  // false: memory ran out
+  bool exists() const noexcept { return values_ != nullptr; }  // false: out of memory
   T& operator[](std::int32_t column) noexcept { return values_[column]; }
   const T* get() const noexcept { return values_; }
 
@@ -96,8 +97,8 @@ class PerColumn {
 
 using Places = PerColumn<SequencePlace>;
 
-// Finds the places of a row's values in all indexes, those that the value checks have found apart, and
-// allocates what inserting there can need.
+// Finds the places of a row's values in all indexes, reusing those that the value checks have
+// found, and allocates what the insertions may need.
 bool prepare_entries(TEVPF_TABLE& table, const unsigned char* row, const InsertionPoints& points,
                      Places& places) noexcept {
   const std::int32_t slot = next_slot(table);
@@ -126,7 +127,7 @@ void note_change(TEVPF_TABLE& table) noexcept {
   table.reads = 0;
 }
 
-// The numbers of rows run from 0 to num_rows: PF_END_POS and beyond append.
+// Row numbers run from 0 to num_rows: PF_END_POS and anything greater append.
 TEVPF_STATUS add_row(TEVPF_TABLE& table, const void* row, std::int32_t row_number) noexcept {
   const GivenRow given(table, row);
   if (given.get() == nullptr) return fail_empty(PF_NOMEM);
@@ -148,7 +149,7 @@ TEVPF_STATUS add_row(TEVPF_TABLE& table, const void* row, std::int32_t row_numbe
   return PF_NORMAL;
 }
 
-// Finds the entries of a stored row in all indexes.
+// Finds a stored row's entries in all indexes.
 void find_entries(const TEVPF_TABLE& table, std::int32_t slot, Places& places) noexcept {
   for (std::int32_t i = 0; i < table.num_cols; ++i) {
     const TEVPF_COLUMN& column = table.col_array[i];
@@ -182,15 +183,15 @@ TEVPF_STATUS delete_row(TEVPF_TABLE& table, std::int32_t slot, std::int32_t row_
 
 // ---- Moves and replacement ----------------------------------------------------------------------
 
-// Where an entry stands and where it goes to, among the others.
+// Where an entry is and where it moves to, counted without the entry itself.
 struct EntryMove {
   std::int32_t from;
   std::int32_t to;
 };
 using Moves = PerColumn<EntryMove>;
 
-// Finds where the entry of a stored row goes when its value becomes that of `row`, and allocates what moving
-// it can need.
+// Finds where a stored row's entry goes when its value becomes that of `row`, and allocates what
+// the move may need.
 bool prepare_move(const TEVPF_TABLE& table, TEVPF_COLUMN& column, std::int32_t slot,
                   const unsigned char* row, EntryMove& move) noexcept {
   move.from = entry_of(table, column, slot).position;
@@ -198,8 +199,8 @@ bool prepare_move(const TEVPF_TABLE& table, TEVPF_COLUMN& column, std::int32_t s
   return column.index.make_ready_to_move(table.num_rows, move.from, move.to);
 }
 
-// A row that moves leaves its place in every index and comes back in front of those of equal value, under
-// the same checks as a new one.
+// A moved row leaves its place in every index and is reinserted before the rows of equal value,
+// under the same checks as a new row.
 TEVPF_STATUS move_row(TEVPF_TABLE& table, std::int32_t from, std::int32_t to) noexcept {
   Moves moves(table);
   PerColumn<std::int32_t> positions(table);
@@ -281,7 +282,7 @@ TEVPF_STATUS TEV8R1_get_space(TEVPF_TABLE* table) noexcept {
   const std::int16_t free_rows = table->free_rows;
   if (!settle(*table)) return fail_empty(PF_NOMEM);
   PF_TRY(make_space(*table));
-  if (settle(*table)) return PF_NORMAL;  // with room in the indexes, too
+  if (settle(*table)) return PF_NORMAL;  // including room in the indexes
   table->free_rows = free_rows;
   return fail_empty(PF_NOMEM);
 }

@@ -1,4 +1,4 @@
-// Rows found by value, and one column's values of all rows.
+// Finding rows by value, and reading one column's values of all rows.
 #include <algorithm>
 #include <cstring>
 
@@ -23,8 +23,8 @@ namespace {
 constexpr std::int8_t kExact = 0;
 constexpr std::int8_t kNearest = 1;
 
-// The first position from `first` on whose row has a value equal to the key, walking through a sequence;
-// `count` when there is none. At the speed of memory.
+// The first position from `first` on whose row has a value equal to the key, by a linear scan
+// through a sequence; `count` if there is none. The scan runs at memory speed.
 template <class Key>
 std::int32_t walk(const Values& values, std::int32_t count, const Sequence& through,
                   std::int32_t first, const Key& key) noexcept {
@@ -46,7 +46,7 @@ std::int32_t walk(const Values& values, std::int32_t count, const Sequence& thro
   });
 }
 
-// Along search keys, which lie in storage order.
+// Scans search keys, which are in storage order.
 std::int32_t walk_along_keys(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
                              const unsigned char* keys, const Sequence& traversal,
                              std::int32_t first, const void* key) noexcept {
@@ -64,8 +64,8 @@ std::int32_t walk_for_key(TEVPF_TABLE& table, TEVPF_COLUMN& column, std::int32_t
                           const void* key) noexcept {
   const Sequence& order = table.slots.order;
   const Sequence& traversal = traversal_of(table);
-  // The keys of an indexed column follow its own index, not the traversal; those of the others are found by
-  // row number.
+  // An indexed column's keys follow its own index, not the traversal; other columns' keys are
+  // ordered by row number.
   const bool may_have_keys = is_number_type(column.def.type) && !is_indexed(column) &&
                              (order.is_identity() || &traversal == &order);
   if (may_have_keys) {
@@ -83,8 +83,8 @@ std::int32_t walk_for_key(TEVPF_TABLE& table, TEVPF_COLUMN& column, std::int32_t
   return position;
 }
 
-// The position from `first` on whose row has the key, or in nearest mode, which acts on the search
-// column only, the next greater value.
+// The position from `first` on whose row has the key. In nearest mode, which affects only the
+// search column, the next greater value also matches.
 TEVPF_STATUS find_position(TEVPF_TABLE& table, TEVPF_COLUMN& column, std::int8_t mode,
                            const void* key, std::int32_t first, std::int32_t& position) noexcept {
   bool found = false;
@@ -128,7 +128,7 @@ TEVPF_STATUS TEV8R1_PF_get_row_by_value(const char* table_name, int8_t mode,
   return PF_NORMAL;
 }
 
-// The value is copied from where it is stored: no row is delivered, so the cursor never moves.
+// The value is copied from where it is stored: no row is returned, so the cursor does not move.
 TEVPF_STATUS TEV8R1_PF_get_value(const char* table_name, const char* column_name, const void* key,
                                  void* value_out) noexcept {
   TEVPF_TABLE* table;

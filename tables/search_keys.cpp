@@ -9,10 +9,10 @@
 namespace tevpf {
 namespace {
 
-// Gathering takes about as long as the searches before it have taken: 5 ms in both with a million rows
-// that lie in the order of their keys, a twentieth of it with ten thousand, and beyond a million both
-// grow. So keys that the next change drops again cost about as much time as was spent without them.
-// Small tables lie in the cache anyway.
+// Gathering takes about as long as the searches before it have taken: both take 5 ms with a million
+// rows stored in key order, a twentieth of that with ten thousand, and more beyond a million. So
+// keys that the next change drops at once add about as much time as was spent without them. Small
+// tables fit the cache anyway.
 #ifdef TEVPF_TEST_HOOKS
 constexpr std::int64_t kEffortBeforeKeys = 1;
 constexpr std::int32_t kRowsWorthKeys = 4;
@@ -22,7 +22,7 @@ constexpr std::int32_t kRowsWorthKeys = 1024;
 #endif
 static_assert(kRowsWorthKeys >= kFenceStep, "who searches along fences need not ask for one");
 
-// An index can name the row that is about to be added, ahead of the row itself: a value for it too.
+// An index can name the row about to be added before the row itself exists; it needs a value too.
 constexpr std::int32_t kRowToCome = 1;
 
 unsigned char* gather_by_row(const TEVPF_TABLE& table, const TEVPF_COLUMN& column) noexcept {
@@ -56,7 +56,7 @@ const unsigned char* search_keys(const TEVPF_TABLE& table, TEVPF_COLUMN& column,
   const std::int32_t count = table.num_rows;
   const std::int64_t enough = std::max<std::int64_t>(kEffortBeforeKeys, count);
   if (count < kRowsWorthKeys || column.keys.effort < enough) return nullptr;
-  column.keys.effort = 0;  // not again at once when there are none to be had
+  column.keys.effort = 0;  // do not retry at once when out of memory
   if (index == nullptr) {
     column.keys.values = gather_by_row(table, column);
   } else {

@@ -1,6 +1,6 @@
-// A column's values side by side, kept while the column is searched often: in the order of its index,
-// or without one in the order of the rows. What is searched then comes densely out of memory, and
-// without a step through the index at each probe. For columns of numbers.
+// A contiguous copy of a column's values, kept while the column is searched often: in index order,
+// or in row order if the column has no index. A search then reads contiguous memory and does not go
+// through the index at each probe. For number columns only.
 #pragma once
 
 #include <cstdint>
@@ -10,27 +10,28 @@
 
 namespace tevpf {
 
-// Of integers in the order of an index, the last value of every so many stands once more behind all the
-// values: such fences fit the cache where the values do not, and lead to one or two lines of it.
+// For integers in index order, the last of every kFenceStep values is repeated after all the
+// values. These fences fit the cache where the values do not, and narrow a search to one or two
+// cache lines of values.
 #ifdef TEVPF_TEST_HOOKS
-inline constexpr std::int32_t kFenceStep = 3;  // small tables too have fences
+inline constexpr std::int32_t kFenceStep = 3;  // small enough that small tables have fences too
 #else
 inline constexpr std::int32_t kFenceStep = 16;
 #endif
 constexpr std::int32_t fence_count(std::int32_t values) noexcept { return values / kFenceStep; }
 
-// The values, if they are there or it is time for them: as soon as searches since the last change have
-// cost about what gathering costs. Null else, and when memory is short. `index`: the column's, null when
-// it has none.
+// The values, if they exist or should now be gathered: that is, once searches since the last change
+// have cost about as much as gathering. Otherwise null, also when out of memory. `index` is the
+// column's index, null if it has none.
 [[nodiscard]] const unsigned char* search_keys(const TEVPF_TABLE& table, TEVPF_COLUMN& column,
                                                const std::int32_t* index) noexcept;
 
-// Counts a search that cost as much as looking at so many rows one after the other.
+// Counts a search that cost as much as scanning this many rows.
 inline void count_search(TEVPF_COLUMN& column, std::int64_t rows) noexcept {
   if (column.keys.values == nullptr) column.keys.effort += rows;
 }
 
-// To be called when the column's values or its index change, and when the table's rows do.
+// Call this when the column's values, its index or the table's rows change.
 inline void drop_search_keys(TEVPF_COLUMN& column) noexcept {
   if (column.keys.values != nullptr) heap_free(column.keys.values);
   column.keys = {};

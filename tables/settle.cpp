@@ -34,7 +34,7 @@ bool flatten_indexes(TEVPF_TABLE& table, std::int32_t room) noexcept {
   return true;
 }
 
-// The row number of each slot.
+// The row number of the row in each slot.
 Owned<std::int32_t> number_slots(const TEVPF_TABLE& table) noexcept {
   auto numbers = new_array<std::int32_t>(static_cast<std::uint64_t>(table.num_rows) +
                                          static_cast<std::uint64_t>(table.slots.num_free));
@@ -45,7 +45,7 @@ Owned<std::int32_t> number_slots(const TEVPF_TABLE& table) noexcept {
   return numbers;
 }
 
-// Puts the rows into storage order; the indexes are flat.
+// Moves the rows into storage order; the indexes are flat.
 bool order_rows(TEVPF_TABLE& table, std::int32_t room) noexcept {
   const std::int64_t bytes = std::int64_t{room} * table.row_wid;
   auto rows = new_array<unsigned char>(static_cast<std::uint64_t>(bytes));
@@ -77,8 +77,8 @@ TEVPF_STATUS find_settled_table(const char* name, TEVPF_TABLE*& table) noexcept 
   return settle(*table) ? TEVPF_STATUS{PF_NORMAL} : fail_empty(PF_NOMEM);
 }
 
-// Reading a row through blocks costs some tens of nanoseconds more, settling about a hundred a row. Without
-// memory the table stays as it is until as many reads later.
+// Reading a row through blocks costs some tens of nanoseconds more; settling costs about a hundred
+// per row. When out of memory, the table stays unsettled until as many more reads.
 void count_reads(TEVPF_TABLE& table, std::int64_t rows) noexcept {
   constexpr std::int64_t kReadsPerRow = 4;
   table.reads += rows;

@@ -21,10 +21,10 @@ namespace tevpf {
 
 namespace {
 
-// Rows are read in parts that the cache holds while their texts are looked at.
+// Rows are read in chunks that fit the cache while their texts are checked.
 constexpr std::int64_t kBatchBytes = std::int64_t{256} * 1024;
 
-// Takes one stored column off the body. Its description is left where it is in the body.
+// Parses one stored column of the body. Its description stays in the body.
 Parsed parse_column(ByteReader& body, TEVPF_COLUMN& column) noexcept {
   column = {};
   const unsigned char* fields = body.take(stored_size(kColumnFields));
@@ -48,14 +48,14 @@ Parsed parse_column(ByteReader& body, TEVPF_COLUMN& column) noexcept {
   return found ? Parsed::kWhole : Parsed::kBroken;
 }
 
-// Places a column in the row and tells whether it lies where the file says.
+// Places a column in the row and returns whether its offset matches the file.
 bool lies_as_stated(Layout& layout, const TEVPF_COLUMN& column) noexcept {
   if (column.def.type == PF_TYPE_STRING && column.def.width < 0) return false;
   return place_column(layout, column.def) == column.offset && layout.row_wid <= kMaxRowWidth;
 }
 
-// Whether the columns fill the body and the row, up to the first one of an unknown type, whose
-// sizes nobody knows.
+// Whether the columns fill the body and the row. The check stops at the first column of an unknown
+// type, because the sizes from there on are unknown.
 bool is_well_formed(ByteReader body, std::int32_t num_cols, std::int32_t row_wid) noexcept {
   if (num_cols > body.left() / stored_size(kColumnFields)) return false;  // whatever their types
   Layout layout;
@@ -87,7 +87,7 @@ TEVPF_STATUS build_column(TEVPF_TABLE& table, ByteReader& body, Layout& layout) 
   return PF_NORMAL;
 }
 
-// Builds the columns. What a failure leaves is a table of fewer columns.
+// Builds the columns. After a failure the table has the columns built so far.
 TEVPF_STATUS build_columns(TEVPF_TABLE& table, ByteReader body, std::int32_t num_cols) noexcept {
   Owned<TEVPF_COLUMN> columns = new_array<TEVPF_COLUMN>(static_cast<std::uint64_t>(num_cols));
   if (!columns) return fail_empty(PF_NOMEM);
@@ -102,8 +102,8 @@ TEVPF_STATUS build_columns(TEVPF_TABLE& table, ByteReader body, std::int32_t num
   return status;
 }
 
-// Reads a column's index of `count` entries. One that is none is left out, to be built from the
-// rows.
+// Reads a column's index of `count` entries. An index that is not a permutation of the rows is
+// dropped; it is built from the rows later.
 TEVPF_STATUS read_index(TEVPF_COLUMN& column, std::int32_t count, Input& input) noexcept {
   Owned<unsigned char> block;
   const auto bytes = static_cast<std::uint64_t>(count) * sizeof(std::int32_t);
@@ -130,7 +130,7 @@ TEVPF_STATUS read_indexes(TEVPF_TABLE& table, std::int32_t num_rows, Input& inpu
   return PF_NORMAL;
 }
 
-// Reads the rows straight into their storage.
+// Reads the rows directly into their storage.
 TEVPF_STATUS read_rows(TEVPF_TABLE& table, std::int32_t num_rows, Input& input) noexcept {
   const std::int64_t bytes = std::int64_t{num_rows} * table.row_wid;
   const Input::Claim claim = input.weigh(static_cast<std::uint64_t>(bytes));
@@ -161,7 +161,7 @@ TEVPF_STATUS build_missing_indexes(TEVPF_TABLE& table) noexcept {
   return PF_NORMAL;
 }
 
-// Reads what follows the body. A failure leaves a table without rows.
+// Reads what follows the body. After a failure the table has no rows.
 TEVPF_STATUS read_contents(TEVPF_TABLE& table, std::int32_t num_rows, Input& input) noexcept {
   TEVPF_STATUS status = read_indexes(table, num_rows, input);
   if (status == PF_NORMAL) status = read_rows(table, num_rows, input);
@@ -191,8 +191,8 @@ TEVPF_STATUS build_table(const TEVPF_ELEM_HEADER& header, Body in_memory, Input&
   if (num_cols == 0) return PF_NORMAL;
   PF_TRY(build_columns(*table, body, num_cols));
   if (head.num_rows > 0) PF_TRY(read_contents(*table, head.num_rows, input));
-  // Last, because it alone may be larger than the file: no block of that size for a file that is
-  // refused.
+  // Last, because only this block may be larger than the file: a refused file must not cause an
+  // allocation of that size.
   return make_default_row(*table) ? TEVPF_STATUS{PF_NORMAL} : fail_empty(PF_NOMEM);
 }
 

@@ -8,15 +8,16 @@
 
 extern "C" {
 
-// Creates a table from its header and its header.btf bytes of body; what follows the body comes from the
-// stream. A table whose body is in order stays in the directory in the state it reached.
+// Creates a table from its header and its body of header.btf bytes; what follows the body is read
+// from the stream. If the body is valid, the table stays in the directory in the state it reached,
+// even after a failure.
 TEVPF_API TEVPF_STATUS TEV8R1_format_table(TEVPF_ELEM_HEADER header, const void* body,
                                            std::FILE* stream) noexcept;
 }
 
 namespace tevpf {
 
-// As ElementKind::read has it.
+// See ElementKind::read.
 [[nodiscard]] TEVPF_STATUS build_table(const TEVPF_ELEM_HEADER& header, Body body,
                                        Input& input) noexcept;
 

@@ -1,7 +1,9 @@
 // The stored fields of tables and columns.
 //
-//   table    the element's header, kTableFields, the columns, the index of each indexed column, the rows
-//   column   kColumnFields, the first column_part bytes of `limits`, [the description and its terminator]
+//   table    the element's header, kTableFields, the columns, the index of each indexed column, the
+//            rows
+//   column   kColumnFields, the first column_part bytes of `limits`, [the description and its
+//            terminator]
 #pragma once
 
 #include "core/stored_form.h"
@@ -22,7 +24,7 @@ inline constexpr Field kColumnFields[] = {
     {offsetof(TEVPF_COLUMN, def.type), 4},
     {offsetof(TEVPF_COLUMN, def.name), TEVPF_NAME_SIZE},
     {offsetof(TEVPF_COLUMN, def.units), TEVPF_UNITS_SIZE},
-    {offsetof(TEVPF_COLUMN, desc_flag), 1},  // in the place of desc_byte
+    {offsetof(TEVPF_COLUMN, desc_flag), 1},  // stored in place of desc_byte
     {offsetof(TEVPF_COLUMN, def.spare_byte), 1},
     {offsetof(TEVPF_COLUMN, def.idx_flag), 1},
     {offsetof(TEVPF_COLUMN, def.unq_flag), 1},

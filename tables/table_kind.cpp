@@ -1,4 +1,4 @@
-// Tables, as the core knows them.
+// The table kind: how the core handles tables.
 #include "core/element_kind.h"
 #include "tables/directory.h"
 #include "tables/settle.h"
@@ -13,7 +13,7 @@ const ElementKind table_kind = {
     .lead = "table ",
     .record_size = sizeof(TEVPF_TABLE),
     .smallest_body = kTableHead,
-    .streams_body = false,  // its columns are gone through twice
+    .streams_body = false,  // its columns are read twice
     .start = [](TEVPF_ELEM_HEADER& element) noexcept { as_table(&element)->cur_row = -1; },
     .reserve = [](TEVPF_ELEM_HEADER&) noexcept { return true; },
     .copy =

@@ -1,4 +1,4 @@
-// Whole tables: their release and their copy.
+// Releasing and copying whole tables.
 #include <cstring>
 #include <utility>
 
@@ -13,7 +13,7 @@
 namespace tevpf {
 namespace {
 
-// What the table owns besides its record.
+// Releases what the table owns, except its record.
 void release_body(TEVPF_TABLE& table) noexcept {
   for (std::int32_t i = 0; table.col_array != nullptr && i < table.num_cols; ++i) {
     release_column(table.col_array[i]);
@@ -49,7 +49,7 @@ bool copy_columns(const TEVPF_TABLE& source, TEVPF_TABLE& copy) noexcept {
   copy.col_array = new_zeroed<TEVPF_COLUMN>(static_cast<std::uint64_t>(source.num_cols)).release();
   if (copy.col_array == nullptr) return false;
   while (copy.num_cols < source.num_cols) {
-    const std::int32_t i = copy.num_cols++;  // counted first: half a column is released too
+    const std::int32_t i = copy.num_cols++;  // counted first: a half-built column is released too
     if (!copy_column(source.col_array[i], source.num_rows, copy.col_array[i])) return false;
   }
   if (source.cur_col != nullptr) {
@@ -65,7 +65,7 @@ bool copy_default_row(const TEVPF_TABLE& source, TEVPF_TABLE& copy) noexcept {
   return copy.dft_row != nullptr;
 }
 
-// The storage behind the figures of a table; without columns there is none but of rows without
+// Copies the blocks of a table. A table without columns has no blocks, except for rows of zero
 // bytes.
 bool copy_storage(const TEVPF_TABLE& source, TEVPF_TABLE& copy) noexcept {
   if (source.num_rows > 0 && !copy_rows(source, copy)) return false;

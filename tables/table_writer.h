@@ -1,4 +1,4 @@
-// Tables in their stored form, written.
+// Writes tables in their stored form.
 #pragma once
 
 #include <cstdio>
@@ -8,7 +8,7 @@
 
 extern "C" {
 
-//   PF_OPENFAIL  not everything could be written; texts: the name of the table
+//   PF_OPENFAIL  the table could not be written completely; texts: the name of the table
 //   PF_BADTYPE   an unknown value type; texts: "column", the type
 TEVPF_API TEVPF_STATUS TEV8R1_store_table(std::FILE* stream, TEVPF_TABLE* table) noexcept;
 }

@@ -26,7 +26,7 @@ TEVPF_STATUS check_range(const TEVPF_COLUMN& column, const void* value) noexcept
   return fail(PF_RANGE, ValueText(column.def.type, value).c_str());
 }
 
-// The refusal of a value that the row of that number holds.
+// The refusal of a duplicate value; `row_number` names the row that holds it.
 TEVPF_STATUS duplicate(const TEVPF_COLUMN& column, const void* value,
                        std::int32_t row_number) noexcept {
   library.dup_row = row_number;
@@ -34,8 +34,8 @@ TEVPF_STATUS duplicate(const TEVPF_COLUMN& column, const void* value,
               {"column ", column.def.name});
 }
 
-// The check of one value. For a unique column `place` is where the value belongs, or stands already; then
-// `holder` is the slot of its row.
+// Checks one value. For a unique column, `place` is where the value belongs or already stands; in
+// the latter case `holder` is the slot of its row.
 TEVPF_STATUS check_value(const TEVPF_TABLE& table, const TEVPF_COLUMN& column, const void* value,
                          SequencePlace& place, std::int32_t& holder) noexcept {
   PF_TRY(check_range(column, value));

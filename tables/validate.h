@@ -1,4 +1,4 @@
-// Whether a value may be stored in a column: inside its bounds, and new to a unique column.
+// Whether a value may be stored in a column: within its bounds, and unique in a unique column.
 #pragma once
 
 #include <cstdint>
@@ -7,32 +7,33 @@
 
 extern "C" {
 
-// Checks one value of the column's type. PF_DUPLICATE leaves the row that holds it in
-// library.dup_row.
+// Checks one value of the column's type. On PF_DUPLICATE, library.dup_row is the row that holds the
+// value.
 TEVPF_API TEVPF_STATUS TEV8R1_validate_value(const TEVPF_TABLE* table, const TEVPF_COLUMN* column,
                                              const void* value) noexcept;
 }
 
 namespace tevpf {
 
-// Where the checks of a row found that its values belong in the indexes of the unique columns, in
-// column order, so that inserting the row need not search there again. Valid until an index changes.
+// The places of a row's values in the indexes of the unique columns, in column order, as found by
+// the checks, so that inserting the row need not search again. Valid until an index changes.
 struct InsertionPoints {
-  static constexpr std::int32_t kMost = 16;  // columns beyond are searched again
+  static constexpr std::int32_t kMost = 16;  // columns beyond these are searched again
   std::int32_t count = 0;
   SequencePlace place[kMost];
 };
 
-// Whose equal values a check of a row accepts.
+// Holders for check_row: no row, or any row.
 inline constexpr std::int32_t kNobody = -1;
 inline constexpr std::int32_t kAnybody = -2;
 
-// Checks every value of a row, in column order. A unique value that `holder` holds already (a slot, kNobody
-// or kAnybody) passes; the error context of the duplicate stays.
+// Checks every value of a row, in column order. A duplicate value passes if `holder` holds it (a
+// slot, kNobody or kAnybody), but leaves the error context of the duplicate set.
 [[nodiscard]] TEVPF_STATUS check_row(const TEVPF_TABLE& table, const unsigned char* row,
                                      std::int32_t holder, InsertionPoints& points) noexcept;
 
-// The same as if the row in a slot were not in the table. `positions`: of its entry in each column's index.
+// The same, ignoring the row in a slot. `positions` gives the position of its entry in each
+// column's index.
 [[nodiscard]] TEVPF_STATUS check_row_without(const TEVPF_TABLE& table, const unsigned char* row,
                                              std::int32_t slot,
                                              const std::int32_t* positions) noexcept;
