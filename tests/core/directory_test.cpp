@@ -182,6 +182,21 @@ TEST_F(DirectoryTest, NamesAreCutAndComparedAsTheyAreKept) {
   EXPECT_EQ(std::string(name, TEVPF_NAME_SIZE), "x" + std::string(19, '\0'));
 }
 
+// Callers outside append records and name them afterwards, among so many that names are hashed.
+TEST_F(DirectoryTest, RecordsNamedAfterwardsAreFound) {
+  for (int i = 0; i < 40; ++i) {
+    const std::string name = "N" + std::to_string(i);
+    if (i % 3 == 0) {
+      TEVPF_LIST* list;
+      ASSERT_EQ(TEV8R1_insert_list(&list), PF_NORMAL);
+      std::strcpy(list->header.elem_name, name.c_str());
+    } else {
+      ASSERT_EQ(TEV8R1_PF_create_elem(name.c_str(), "", PF_ELEM_LIST), PF_NORMAL);
+    }
+    for (int k = 0; k <= i; ++k) EXPECT_EQ(kKinds[0].find("N" + std::to_string(k)), k);
+  }
+}
+
 TEST_F(DirectoryTest, RefusalsSayWhyAndChangeNothing) {
   ASSERT_EQ(TEV8R1_PF_create_elem("A", "a", PF_ELEM_LIST), PF_NORMAL);
   std::int32_t pos = 7;

@@ -45,6 +45,32 @@ TEST_F(ListRules, SizesBeyond31BitsAreRefusedBeforeAnythingChanges) {
   EXPECT_EQ(record.free_params, 0);
 }
 
+// Names of every length: what stands behind the terminator is the caller's, in the buffer and in the field.
+TEST_F(ListRules, NamesAreWrittenUpToTheirTerminator) {
+  for (std::size_t length = 1; length < TEVPF_NAME_SIZE; ++length) {
+    const std::string name(length, static_cast<char>('a' + length));
+    TEVPF_PARAM_DEF def = to_c({PF_TYPE_INT, name});
+    ASSERT_EQ(TEV8R1_PF_add_param("list", &def, PF_END_POS), PF_NORMAL);
+    std::fill(def.name + length + 1, std::end(def.name), '#');
+    ASSERT_EQ(TEV8R1_PF_modify_param_def("list", def), PF_NORMAL);
+    const auto stored = [&] {
+      return std::string(list("list").param_ptr[length - 1].def.name, 20);
+    };
+    EXPECT_EQ(stored(), std::string(def.name, 20));
+    def.name[length - 1] = '*';  // selects, and leaves the name
+    def.name[length] = '\0';
+    if (length > 1) {
+      ASSERT_EQ(TEV8R1_PF_modify_param_def("list", def), PF_NORMAL);
+      EXPECT_EQ(stored(), name + '\0' + std::string(19 - length, '#'));
+    }
+    char out[TEVPF_NAME_SIZE];
+    std::fill_n(out, sizeof out, '~');
+    std::int32_t value;
+    ASSERT_EQ(TEV8R1_PF_get_next_param("list", out, &value), PF_NORMAL);
+    EXPECT_EQ(std::string(out, sizeof out), name + '\0' + std::string(19 - length, '~'));
+  }
+}
+
 TEST_F(ListRules, StoredSizes) {
   std::int32_t bytes = -1;
   EXPECT_EQ(TEV8R1_calc_param_bytes(PF_TYPE_STRING, "abc", 5, &bytes), PF_NORMAL);

@@ -341,6 +341,15 @@ TEST_F(TableRules, SearchesOfAnIndexOutOfOrderEnd) {
   EXPECT_EQ(std::pair(order(0), order(1)), before);
 }
 
+// The width of a definition is not the business of this check: it judges values alone.
+TEST_F(TableRules, ColumnValuesAreJudgedWhateverTheWidth) {
+  define({col("n", kInt)});
+  for (const char* n : {"5", "7"}) EXPECT_EQ(add({n}), PF_NORMAL);
+  const TEVPF_COL_DEF narrow = col("n", kInt, 0, {0, 6});
+  expect_answer(TEV8R1_check_column_values(&settled(), 0, narrow, 0), PF_RANGE, {"7", ""});
+  expect_answer(redefine("n", narrow), PF_BADWIDTH, {"7", ""});
+}
+
 TEST_F(TableRules, SlotsAreCountedUpToTheLargestCount) {
   define({indexed(col("a", kInt))});
   for (const char* n : {"0", "1", "2"}) EXPECT_EQ(add({n}), PF_NORMAL);
