@@ -79,7 +79,7 @@ inline const char* broken_slots(const TEVPF_TABLE& table) {
   const std::int64_t used = std::int64_t{table.num_rows} + slots.num_free;
   const std::int64_t room = std::max(used, std::int64_t{table.num_rows} + table.free_rows);
   if (slots.bytes < room * table.row_wid) return "no room for the rows";
-  std::vector<bool> seen(used);
+  std::vector<bool> seen(static_cast<std::size_t>(used));
   const auto is_new = [&](int slot) {
     const bool fits = slot >= 0 && slot < used && !seen[slot];
     if (fits) seen[slot] = true;
