@@ -403,16 +403,8 @@ void erase_entry(const TEVPF_TABLE& table, TEVPF_COLUMN& column, SequencePlace p
   if (table.num_rows == 1) column.index.clear();
 }
 
-void move_entry(TEVPF_COLUMN& column, std::int32_t from, std::int32_t to,
-                const void* value) noexcept {
-  column.index.move(from, to, key_of_value(column, value));
-}
-
-void note_value(const TEVPF_TABLE& table, TEVPF_COLUMN& column, std::int32_t slot,
-                const void* value) noexcept {
-  SequenceBlocks* const blocks = column.index.blocks;
-  if (blocks == nullptr || blocks->key_size == 0) return;
-  blocks->set_key(entry_of(table, column, slot), value);
+void move_entry(TEVPF_COLUMN& column, EntryMove move, const void* value) noexcept {
+  column.index.move(move.from, move.to, key_of_value(column, value));
 }
 
 void forget_values(TEVPF_TABLE& table) noexcept {

@@ -105,13 +105,15 @@ void insert_entry(const TEVPF_TABLE& table, TEVPF_COLUMN& column, SequencePlace 
 
 void erase_entry(const TEVPF_TABLE& table, TEVPF_COLUMN& column, SequencePlace place) noexcept;
 
-// Moves an entry to position `to`, counted without the entry itself, with its row's new value.
-void move_entry(TEVPF_COLUMN& column, std::int32_t from, std::int32_t to,
-                const void* value) noexcept;
+// Where an entry is, and where it moves to, counted without the entry itself.
+struct EntryMove {
+  std::int32_t from;
+  std::int32_t to;
+};
 
-// Call this when a row's value changes and its entry stays in place.
-void note_value(const TEVPF_TABLE& table, TEVPF_COLUMN& column, std::int32_t slot,
-                const void* value) noexcept;
+// Moves an entry, whose row gets this value. An entry that stays in place needs no call: blocks
+// keep only integers beside their slots, and equal integers are the same.
+void move_entry(TEVPF_COLUMN& column, EntryMove move, const void* value) noexcept;
 
 // Call this when values may have changed without notice: drops everything derived from them.
 void forget_values(TEVPF_TABLE& table) noexcept;

@@ -183,11 +183,6 @@ TEVPF_STATUS delete_row(TEVPF_TABLE& table, std::int32_t slot, std::int32_t row_
 
 // ---- Moves and replacement ----------------------------------------------------------------------
 
-// Where an entry is and where it moves to, counted without the entry itself.
-struct EntryMove {
-  std::int32_t from;
-  std::int32_t to;
-};
 using Moves = PerColumn<EntryMove>;
 
 // Finds where a stored row's entry goes when its value becomes that of `row`, and allocates what
@@ -203,17 +198,16 @@ bool prepare_move(const TEVPF_TABLE& table, TEVPF_COLUMN& column, std::int32_t s
 // under the same checks as a new row.
 TEVPF_STATUS move_row(TEVPF_TABLE& table, std::int32_t from, std::int32_t to) noexcept {
   Moves moves(table);
-  PerColumn<std::int32_t> positions(table);
-  if (!moves.exists() || !positions.exists()) return fail_empty(PF_NOMEM);
+  if (!moves.exists()) return fail_empty(PF_NOMEM);
   const std::int32_t slot = slot_of(table, from);
   const unsigned char* const row = row_at(table, slot);
   for (std::int32_t i = 0; i < table.num_cols; ++i) {
     TEVPF_COLUMN& column = table.col_array[i];
-    if (!is_indexed(column)) continue;
-    if (!prepare_move(table, column, slot, row, moves[i])) return fail_empty(PF_NOMEM);
-    positions[i] = moves[i].from;
+    if (is_indexed(column) && !prepare_move(table, column, slot, row, moves[i])) {
+      return fail_empty(PF_NOMEM);
+    }
   }
-  if (library.interactive == 0) PF_TRY(check_row_without(table, row, slot, positions.get()));
+  if (library.interactive == 0) PF_TRY(check_moved_row(table, slot, moves.get()));
   Sequence& order = table.slots.order;
   const std::int32_t target = std::clamp(to, 0, table.num_rows - 1);
   if (!order.make_ready_to_move(table.num_rows, from, target)) return fail_empty(PF_NOMEM);
@@ -221,7 +215,7 @@ TEVPF_STATUS move_row(TEVPF_TABLE& table, std::int32_t from, std::int32_t to) no
   note_change(table);
   for (std::int32_t i = 0; i < table.num_cols; ++i) {
     TEVPF_COLUMN& column = table.col_array[i];
-    if (is_indexed(column)) move_entry(column, moves[i].from, moves[i].to, row + column.offset);
+    if (is_indexed(column)) move_entry(column, moves[i], row + column.offset);
   }
   order.move(from, target);
   return PF_NORMAL;
@@ -248,12 +242,8 @@ TEVPF_STATUS replace_row(TEVPF_TABLE& table, std::int32_t slot, const unsigned c
   note_change(table);
   for (std::int32_t i = 0; i < table.num_cols; ++i) {
     TEVPF_COLUMN& column = table.col_array[i];
-    if (!is_indexed(column)) continue;
-    if (moves[i].from >= 0) {
-      move_entry(column, moves[i].from, moves[i].to, row + column.offset);
-    } else {
-      note_value(table, column, slot, row + column.offset);
-    }
+    const bool moves_entry = is_indexed(column) && moves[i].from >= 0;
+    if (moves_entry) move_entry(column, moves[i], row + column.offset);
   }
   copy_row(table, row, stored);
   return PF_NORMAL;

@@ -66,19 +66,20 @@ TEVPF_STATUS check_row(const TEVPF_TABLE& table, const unsigned char* row, std::
   return PF_NORMAL;
 }
 
-TEVPF_STATUS check_row_without(const TEVPF_TABLE& table, const unsigned char* row,
-                               std::int32_t slot, const std::int32_t* positions) noexcept {
+TEVPF_STATUS check_moved_row(const TEVPF_TABLE& table, std::int32_t slot,
+                             const EntryMove* moves) noexcept {
   const std::int32_t own_number = row_number_of(table, slot);
   for (std::int32_t i = 0; i < table.num_cols; ++i) {
     const TEVPF_COLUMN& column = table.col_array[i];
-    const unsigned char* const value = row + column.offset;
+    const unsigned char* const value = row_at(table, slot) + column.offset;
     PF_TRY(check_range(column, value));
     if (!is_unique(column)) continue;
-    const IndexPlace found = search_others(table, column, positions[i], value);
+    const std::int32_t own = moves[i].from;
+    const IndexPlace found = search_others(table, column, own, value);
     if (!found.found) continue;
     const std::int32_t at = found.place.position;
-    const std::int32_t holder = column.index.at(at < positions[i] ? at : at + 1);
-    const std::int32_t number = row_number_of(table, holder);
+    const std::int32_t number = row_number_of(table, column.index.at(at < own ? at : at + 1));
+    // Row numbers count as if the row had been taken out.
     return duplicate(column, value, number > own_number ? number - 1 : number);
   }
   return PF_NORMAL;

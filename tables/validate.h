@@ -3,6 +3,7 @@
 
 #include <cstdint>
 
+#include "tables/column_index.h"
 #include "tables/table.h"
 
 extern "C" {
@@ -32,10 +33,9 @@ inline constexpr std::int32_t kAnybody = -2;
 [[nodiscard]] TEVPF_STATUS check_row(const TEVPF_TABLE& table, const unsigned char* row,
                                      std::int32_t holder, InsertionPoints& points) noexcept;
 
-// The same, ignoring the row in a slot. `positions` gives the position of its entry in each
-// column's index.
-[[nodiscard]] TEVPF_STATUS check_row_without(const TEVPF_TABLE& table, const unsigned char* row,
-                                             std::int32_t slot,
-                                             const std::int32_t* positions) noexcept;
+// The same for a stored row that moves, ignoring the row itself. `moves` has the position of its
+// entry in each column's index.
+[[nodiscard]] TEVPF_STATUS check_moved_row(const TEVPF_TABLE& table, std::int32_t slot,
+                                           const EntryMove* moves) noexcept;
 
 }  // namespace tevpf
