@@ -20,7 +20,12 @@ struct Argument {
   const char* value;   // what stands behind an option, null for flags
   const char* help;
   Member member;
+  std::string (*check)(const std::string& text) = nullptr;  // gives what is wrong
 };
+
+std::string counted_from_one(const std::string& text) {
+  return text == "0" ? "rows are counted from 1" : "";
+}
 
 const Argument kArguments[] = {
     {"FILE", nullptr, nullptr, "The parameter file", &Arguments::file},
@@ -34,18 +39,17 @@ const Argument kArguments[] = {
     {"-o", "-o,--output", "OUT", "Write to OUT instead of standard output", &Arguments::output},
     {"--columns", "--columns", "A,B,...", "Show these columns, in this order", &Arguments::columns},
     {"--sort", "--sort", "COLUMN", "Show rows in the order of this column", &Arguments::sort},
-    {"--from", "--from", "ROW", "First row to show, counted from 1", &Arguments::from},
-    {"--to", "--to", "ROW", "Last row to show", &Arguments::to},
+    {"--from", "--from", "ROW", "First row to show, counted from 1", &Arguments::from,
+     counted_from_one},
+    {"--to", "--to", "ROW", "Last row to show", &Arguments::to, counted_from_one},
+    {"--rows", "--rows", "N", "Rows to show of each list or table, 1000 if not given",
+     &Arguments::rows},
     {"--json", "--json", nullptr, "Write JSON", &Arguments::json},
     {"--names", "--names", nullptr, "Print the names of the elements alone", &Arguments::names},
     {"--list", "--list", nullptr, "The name is that of a list", &Arguments::list},
     {"--table", "--table", nullptr, "The name is that of a table", &Arguments::table},
     {"--force", "--force", nullptr, "Write a dump that is far longer than FILE", &Arguments::force},
 };
-
-std::string counted_from_one(const std::string& text) {
-  return text == "0" ? "rows are counted from 1" : "";
-}
 
 void declare(CLI::App& app, const Argument& argument, bool required, Arguments& into) {
   std::visit(
@@ -61,9 +65,7 @@ void declare(CLI::App& app, const Argument& argument, bool required, Arguments& 
           CLI::Option* option = app.add_option(argument.option, target, argument.help);
           option->option_text(argument.value);
           option->allow_extra_args(false);  // one value each time it is given
-          if constexpr (std::is_same_v<decltype(target), std::size_t&>) {
-            option->check(counted_from_one);
-          }
+          if (argument.check != nullptr) option->check(argument.check);
         }
       },
       argument.member);

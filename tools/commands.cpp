@@ -12,6 +12,7 @@ constexpr Command kCommands[] = {
     {"dump", "Write the text dump of FILE, or of one element",
      "FILE [ELEMENT] -o --list --table --force", run_dump},
     {"export", "Write a list or a table as CSV", "FILE ELEMENT -o --list --table", run_export},
+    {"report", "Write FILE as a page of HTML, with figures", "FILE -o --rows", run_report},
     {"import", "Add the rows of a CSV file to a table, made when it is not there", "FILE TABLE CSV",
      run_import},
     {"check", "Say whether FILE is in order, or what is wrong and where", "FILE", run_check},

@@ -16,6 +16,7 @@ struct Arguments {
   std::string file, element, parameter, value, new_name, csv, output, sort;
   std::vector<std::string> columns;
   std::size_t from = 0, to = 0;  // 0: not given
+  std::size_t rows = 1000;
   bool json = false, names = false, list = false, table = false, force = false;
 
   Kind kind() const {
@@ -41,6 +42,7 @@ ExitStatus run_import(const Arguments& arguments);
 ExitStatus run_info(const Arguments& arguments);
 ExitStatus run_mv(const Arguments& arguments);
 ExitStatus run_new(const Arguments& arguments);
+ExitStatus run_report(const Arguments& arguments);
 ExitStatus run_rm(const Arguments& arguments);
 ExitStatus run_set(const Arguments& arguments);
 ExitStatus run_show(const Arguments& arguments);

@@ -27,20 +27,6 @@ Parsed parse_number(std::string_view text, Value& value) {
   return Parsed::kValue;
 }
 
-bool is_whole_range(const tevpf::Bounds& bounds) {
-  return std::visit(
-      [&](const auto& min) {
-        using T = std::decay_t<decltype(min)>;
-        if constexpr (std::is_same_v<T, std::string>) {
-          return true;
-        } else {
-          return min <= std::numeric_limits<T>::lowest() &&
-                 std::get<T>(bounds.max) >= std::numeric_limits<T>::max();
-        }
-      },
-      bounds.min);
-}
-
 }  // namespace
 
 bool is_floating(Type type) { return type == Type::float32 || type == Type::float64; }
@@ -96,13 +82,51 @@ bool is_nan(const Value& value) {
   return std::visit([](const auto& v) { return v != v; }, value);
 }
 
+double as_number(const Value& value) {
+  return std::visit(
+      [](const auto& v) -> double {
+        if constexpr (std::is_same_v<std::decay_t<decltype(v)>, std::string>) {
+          return std::nan("");
+        } else {
+          return v;
+        }
+      },
+      value);
+}
+
+bool is_open_below(const tevpf::Bounds& bounds) {
+  return std::visit(
+      [](const auto& min) {
+        using T = std::decay_t<decltype(min)>;
+        if constexpr (std::is_same_v<T, std::string>) {
+          return true;
+        } else {
+          return min <= std::numeric_limits<T>::lowest();
+        }
+      },
+      bounds.min);
+}
+
+bool is_open_above(const tevpf::Bounds& bounds) {
+  return std::visit(
+      [](const auto& max) {
+        using T = std::decay_t<decltype(max)>;
+        if constexpr (std::is_same_v<T, std::string>) {
+          return true;
+        } else {
+          return max >= std::numeric_limits<T>::max();
+        }
+      },
+      bounds.max);
+}
+
 bool comes_before(const Value& a, const Value& b) {
   if (is_nan(a) || is_nan(b)) return !is_nan(a) && is_nan(b);
   return a < b;
 }
 
 std::string bounds_text(const std::optional<tevpf::Bounds>& bounds, const std::string& units) {
-  if (!bounds || is_whole_range(*bounds)) return {};
+  if (!bounds || (is_open_below(*bounds) && is_open_above(*bounds))) return {};
   return exact_text(bounds->min) + " to " + exact_text(bounds->max) +
          (units.empty() ? "" : " " + visible(units));
 }

@@ -29,6 +29,13 @@ std::string display_text(const Value& value, std::int32_t precision);
 
 bool is_nan(const Value& value);
 
+// A number as a double, which holds all of them exactly; a text is not a number.
+double as_number(const Value& value);
+
+// Whether a bound says no more than what the type can hold.
+bool is_open_below(const tevpf::Bounds& bounds);
+bool is_open_above(const tevpf::Bounds& bounds);
+
 // Numbers by size, what is not a number last; texts by their bytes. Both values are of one type.
 bool comes_before(const Value& a, const Value& b);
 
