@@ -27,13 +27,15 @@ std::string px(double length) {
 
 std::string drawing(const char* look, double height, const std::string& title,
                     const std::string& shapes) {
-  return std::string("<svg class=\"") + look + "\" role=\"img\" width=\"" + px(kWidth) +
-         "\" height=\"" + px(height) + "\"><title>" + title + "</title>" + shapes + "</svg>";
+  return html_tag(
+             "svg",
+             {{"class", look}, {"role", "img"}, {"width", px(kWidth)}, {"height", px(height)}}) +
+         "<title>" + title + "</title>" + shapes + "</svg>";
 }
 
 std::string line(const char* look, double from, double to, double y) {
-  return std::string("<path class=\"") + look + "\" d=\"M" + px(from) + " " + px(y) + "H" + px(to) +
-         "\"/>";
+  return html_tag("path", {{"class", look}, {"d", "M" + px(from) + " " + px(y) + "H" + px(to)}}) +
+         "</path>";
 }
 
 }  // namespace
@@ -46,7 +48,9 @@ std::string bounds_figure(double value, double min, double max, const std::strin
   return drawing(
       "bar", kBarHeight, std::to_string(std::lround(part * 100)) + " % of the way from " + bounds,
       line("track", left, right, middle) + line("part", left, place, middle) +
-          "<circle class=\"mark\" cx=\"" + px(place) + "\" cy=\"" + px(middle) + "\" r=\"3.5\"/>");
+          html_tag("circle",
+                   {{"class", "mark"}, {"cx", px(place)}, {"cy", px(middle)}, {"r", "3.5"}}) +
+          "</circle>");
 }
 
 std::string histogram_figure(const Histogram& histogram, const std::string& range) {
@@ -62,11 +66,12 @@ std::string histogram_figure(const Histogram& histogram, const std::string& rang
     shapes += "M" + px(static_cast<double>(bin) * step) + " " + px(kBinHeight - 1) + "v-" + height +
               "h" + width + "v" + height + "z";
   }
-  return drawing(
-      "bins", kBinHeight,
-      range + (counts.size() == 1 ? "" : " in " + grouped(counts.size()) + " bins") + ", at most " +
-          counted_in_groups(most, "value") + (counts.size() == 1 ? "" : " in one"),
-      "<path class=\"counts\" d=\"" + shapes + "\"/>" + line("floor", 0, kWidth, kBinHeight - 0.5));
+  return drawing("bins", kBinHeight,
+                 range + (counts.size() == 1 ? "" : " in " + grouped(counts.size()) + " bins") +
+                     ", at most " + counted_in_groups(most, "value") +
+                     (counts.size() == 1 ? "" : " in one"),
+                 html_tag("path", {{"class", "counts"}, {"d", shapes}}) + "</path>" +
+                     line("floor", 0, kWidth, kBinHeight - 0.5));
 }
 
 }  // namespace tool

@@ -40,16 +40,27 @@ std::string html_text(std::string_view text) {
   return result;
 }
 
+std::string html_tag(std::string_view name, std::initializer_list<HtmlAttribute> attributes) {
+  std::string tag = "<";
+  tag += name;
+  for (const HtmlAttribute& attribute : attributes) {
+    tag += ' ';
+    tag += attribute.name;
+    tag += "=\"" + attribute.value + '"';
+  }
+  return tag += '>';
+}
+
 std::string html_cell(std::string_view text) { return "<td>" + html_text(text) + "</td>"; }
 
 std::string html_cell(const Value& value, std::int32_t precision) {
   if (const auto* text = std::get_if<std::string>(&value)) return html_cell(*text);
   const std::string shown = display_text(value, precision);
   const std::string exact = exact_text(value);
-  return (is_nan(value)    ? "<td class=\"n none\">"
-          : shown == exact ? "<td class=\"n\">"
-                           : "<td class=\"n\" title=\"" + exact + "\">") +
-         shown + "</td>";
+  const std::string begin = is_nan(value)    ? html_tag("td", {{"class", "n none"}})
+                            : shown == exact ? html_tag("td", {{"class", "n"}})
+                                             : html_tag("td", {{"class", "n"}, {"title", exact}});
+  return begin + shown + "</td>";
 }
 
 std::string grouped(std::size_t count) {
@@ -70,8 +81,12 @@ std::string counted_in_groups(std::size_t count, std::string_view noun) {
 }
 
 std::string html_heading(std::string_view name, std::string_view units, bool is_number) {
-  return std::string("<th scope=\"col\"") + (is_number ? " class=\"n\">" : ">") + html_text(name) +
-         (units.empty() ? "" : " <span class=\"unit\">[" + html_text(units) + "]</span>") + "</th>";
+  const std::string unit = units.empty() ? ""
+                                         : " " + html_tag("span", {{"class", "unit"}}) + "[" +
+                                               html_text(units) + "]</span>";
+  const std::string begin = is_number ? html_tag("th", {{"scope", "col"}, {"class", "n"}})
+                                      : html_tag("th", {{"scope", "col"}});
+  return begin + html_text(name) + unit + "</th>";
 }
 
 }  // namespace tool

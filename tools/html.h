@@ -3,6 +3,7 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <initializer_list>
 #include <string>
 #include <string_view>
 
@@ -12,6 +13,13 @@ namespace tool {
 
 // A text made visible, in which nothing is markup: for content and for attributes in double quotes.
 std::string html_text(std::string_view text);
+
+// An opening tag. Values of attributes are HTML already.
+struct HtmlAttribute {
+  std::string_view name;
+  std::string value;
+};
+std::string html_tag(std::string_view name, std::initializer_list<HtmlAttribute> attributes);
 
 // A cell of a table. A number has the digits of its precision, and all of them in its title where
 // these are fewer.

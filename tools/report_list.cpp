@@ -1,4 +1,6 @@
 // The section of a list: its parameters, and where their values lie within the bounds.
+#include <algorithm>
+
 #include "figures.h"
 #include "html.h"
 #include "report_section.h"
@@ -46,7 +48,7 @@ void write_list_section(Output& output, const Section& section) {
     output.write("<p class=\"none\">" + caption + "</p>\n" + kSectionEnd);
     return;
   }
-  output.write(table_begin(section, "rows", caption, kHead, Rows::kSortable));
+  output.write(table_begin({heading_id(section), section.id + "-rows", caption, kHead, true}));
   for (std::size_t i = 0; i < shown; ++i) output.write(row_of(list.at(i)));
   output.write(std::string(kTableEnd) + kSectionEnd);
 }

@@ -12,22 +12,26 @@ namespace tool {
 struct Section {
   const tevpf::File& file;
   const tevpf::Element& element;
-  std::string id;         // in the page, and the beginning of other ids
+  std::string id;         // in the page; ids of its parts start with it
   std::size_t most_rows;  // to show
 };
 
 void write_list_section(Output& output, const Section& section);
 void write_table_section(Output& output, const Section& section);
 
-// Kind, name and description, and what closes the section.
+// Down to the description of the element. The heading's id is heading_id(section).
 std::string section_begin(const Section& section);
 constexpr const char* kSectionEnd = "</section>\n";
+std::string heading_id(const Section& section);
 
-// A table in its pane, down to its head; `head`: the headings, `part`: its id within the section.
-// Sortable ones have a filter in front.
-enum class Rows { kFixed, kSortable };
-std::string table_begin(const Section& section, const std::string& part, const std::string& caption,
-                        const std::string& head, Rows rows);
+// A table down to the beginning of its body. Rows that can be sorted have a filter, too.
+struct HtmlTable {
+  std::string heading_id;  // of the heading above it
+  std::string id;          // of its caption
+  std::string caption, head;
+  bool is_sortable = false;
+};
+std::string table_begin(const HtmlTable& table);
 constexpr const char* kTableEnd = "</tbody>\n</table></div>\n";
 
 // "118 rows" or "The first 100 of 118 rows".

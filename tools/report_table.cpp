@@ -98,8 +98,8 @@ void write_columns(Output& output, const Section& section, const tevpf::Table& t
                    const std::vector<tevpf::Column>& columns) {
   const std::vector<Summary> summaries = summaries_of(table, columns);
   const std::vector<Histogram> histograms = histograms_of(table, columns, summaries);
-  output.write(table_begin(section, "columns", counted_in_groups(columns.size(), "column"),
-                           kColumnsHead, Rows::kFixed));
+  output.write(table_begin({heading_id(section), section.id + "-columns",
+                            counted_in_groups(columns.size(), "column"), kColumnsHead}));
   for (std::size_t c = 0; c < columns.size(); ++c) {
     output.write(column_row(columns[c], summaries[c], histograms[c]));
   }
@@ -118,7 +118,7 @@ void write_rows(Output& output, const Section& section, const tevpf::Table& tabl
   for (const tevpf::Column& column : columns) {
     head += html_heading(column.name(), column.units(), !is_text(column));
   }
-  output.write(table_begin(section, "rows", caption, head, Rows::kSortable));
+  output.write(table_begin({heading_id(section), section.id + "-rows", caption, head, true}));
   std::size_t number = 0;
   for (const tevpf::RowView row : table) {
     if (++number > count) break;
