@@ -38,6 +38,12 @@ std::string line(const char* look, double from, double to, double y) {
          "</path>";
 }
 
+// One bar of a histogram, as a part of a path.
+std::string upright(double left, double width, double height) {
+  return "M" + px(left) + " " + px(kBinHeight - 1) + "v-" + px(height) + "h" + px(width) + "v" +
+         px(height) + "z";
+}
+
 }  // namespace
 
 std::string bounds_figure(double value, double min, double max, const std::string& bounds) {
@@ -61,15 +67,14 @@ std::string histogram_figure(const Histogram& histogram, const std::string& rang
   for (std::size_t bin = 0; bin < counts.size(); ++bin) {
     if (counts[bin] == 0) continue;
     const double part = static_cast<double>(counts[bin]) / static_cast<double>(most);
-    const std::string height = px(std::max(part * (kBinHeight - 2), 1.0));  // a pixel for a few
-    const std::string width = px(step - kGap);
-    shapes += "M" + px(static_cast<double>(bin) * step) + " " + px(kBinHeight - 1) + "v-" + height +
-              "h" + width + "v" + height + "z";
+    const double height = std::max(part * (kBinHeight - 2), 1.0);  // a pixel for a few
+    shapes += upright(static_cast<double>(bin) * step, step - kGap, height);
   }
-  return drawing("bins", kBinHeight,
-                 range + (counts.size() == 1 ? "" : " in " + grouped(counts.size()) + " bins") +
-                     ", at most " + counted_in_groups(most, "value") +
-                     (counts.size() == 1 ? "" : " in one"),
+  const bool is_one = counts.size() == 1;
+  const std::string title = range + (is_one ? "" : " in " + grouped(counts.size()) + " bins") +
+                            ", at most " + counted_in_groups(most, "value") +
+                            (is_one ? "" : " in one");
+  return drawing("bins", kBinHeight, title,
                  html_tag("path", {{"class", "counts"}, {"d", shapes}}) + "</path>" +
                      line("floor", 0, kWidth, kBinHeight - 0.5));
 }

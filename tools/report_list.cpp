@@ -10,10 +10,13 @@ namespace tool {
 namespace {
 
 const char* const kHead =
-    "<th scope=\"col\">Name</th><th scope=\"col\" class=\"n\">Value</th><th "
-    "scope=\"col\">Units</th>"
-    "<th scope=\"col\" class=\"n\">Min</th><th scope=\"col\" class=\"plain\">Within</th>"
-    "<th scope=\"col\" class=\"n\">Max</th><th scope=\"col\">Description</th>";
+    "<th scope=\"col\">Name</th>"
+    "<th scope=\"col\" class=\"n\">Value</th>"
+    "<th scope=\"col\">Units</th>"
+    "<th scope=\"col\" class=\"n\">Min</th>"
+    "<th scope=\"col\" class=\"plain\">Within</th>"
+    "<th scope=\"col\" class=\"n\">Max</th>"
+    "<th scope=\"col\">Description</th>";
 
 // The bar between the bounds, for values that have both of them.
 std::string place_of(const tevpf::Parameter& p) {
