@@ -1,5 +1,7 @@
 #include "list_relation.h"
 
+#include <charconv>
+#include <cmath>
 #include <string_view>
 
 #include "refusal.h"
@@ -47,6 +49,18 @@ class ListCursor : public Cursor {
   std::optional<Parameter> parameter_;
 };
 
+// A real as the double that its shortest text stands for: 0.1, not 0.10000000149011612. Values of a list
+// are few, and compared with what people write.
+void deliver_shortest(sqlite3_context* context, const tevpf::Value& value) {
+  const float* const real = std::get_if<float>(&value);
+  if (real == nullptr || !std::isfinite(*real)) return sql::deliver(context, value);
+  char text[32];
+  const char* const end = std::to_chars(text, text + sizeof text, *real).ptr;
+  double number = 0;
+  std::from_chars(text, end, number);
+  sql::deliver(context, number);
+}
+
 void ListCursor::deliver(sqlite3_context* context, int column) const {
   const Parameter& p = *parameter_;
   switch (column) {
@@ -55,10 +69,11 @@ void ListCursor::deliver(sqlite3_context* context, int column) const {
     case kType:
       return sql::deliver(context, std::string_view(tevpf::to_string(p.type())));
     case kValue:
-      return sql::deliver(context, p.value());
+      return deliver_shortest(context, p.value());
     case kMinimum:
     case kMaximum:
-      if (p.bounds()) sql::deliver(context, column == kMinimum ? p.bounds()->min : p.bounds()->max);
+      if (p.bounds())
+        deliver_shortest(context, column == kMinimum ? p.bounds()->min : p.bounds()->max);
       return;
     case kUnits:
       return sql::deliver(context, std::string_view(p.units()));
@@ -115,15 +130,17 @@ tevpf::Value empty_value(Type type) {
 }
 
 void set_bounds(Parameter& parameter, sqlite3_value* min, sqlite3_value* max,
-                const std::string& subject) {
+                const std::string& name) {
   if (parameter.type() == Type::string) {
     if (is_given(min) || is_given(max)) {
-      throw tevpf::Error(PF_BADTYPE, subject, "string", subject + " is a string and has no bounds");
+      throw tevpf::Error(PF_BADTYPE, "parameter " + name, "string",
+                         "'" + name + "': a string has no bounds");
     }
     return;
   }
   const auto side = [&](sqlite3_value* given, const tevpf::Value& else_value) {
-    return is_given(given) ? to_cell(given, parameter.type(), subject) : tevpf::Cell(else_value);
+    return is_given(given) ? to_cell(given, parameter.type(), "parameter", name)
+                           : tevpf::Cell(else_value);
   };
   const tevpf::Bounds old = *parameter.bounds();
   parameter.bounds(side(min, old.min), side(max, old.max));
@@ -148,14 +165,14 @@ Parameter changed(Values values, const Parameter* old) {
                                             : type_of(values[kValue]);
   const bool is_same_type = old != nullptr && old->type() == type;
   Parameter result = is_same_type ? *old : retyped(values, type, old);
-  const std::string subject = "parameter " + result.name();
+  const std::string name = result.name();
   if (sqlite3_value_nochange(values[kName]) == 0) result.name(text_of(values[kName]));
   if (!is_same_type && sqlite3_value_nochange(values[kValue]) != 0) {
     result.value(old->value());
   } else if (sqlite3_value_nochange(values[kValue]) == 0) {
-    result.value(to_cell(values[kValue], type, subject));
+    result.value(to_cell(values[kValue], type, "parameter", name));
   }
-  set_bounds(result, values[kMinimum], values[kMaximum], subject);
+  set_bounds(result, values[kMinimum], values[kMaximum], name);
   if (sqlite3_value_nochange(values[kUnits]) == 0) result.units(text_of(values[kUnits]));
   if (is_given(values[kPrecision])) result.precision(digits_of(values[kPrecision]));
   if (sqlite3_value_nochange(values[kDescription]) == 0) {
@@ -170,7 +187,7 @@ Parameter changed(Values values, const Parameter* old) {
 
 std::string ListRelation::declaration() const {
   return "CREATE TABLE list(name TEXT NOT NULL, type TEXT NOT NULL, value, minimum, maximum, "
-         "units TEXT NOT NULL DEFAULT '', precision INTEGER, description TEXT NOT NULL DEFAULT '')";
+         "units TEXT, precision INTEGER, description TEXT)";
 }
 
 void ListRelation::plan(sqlite3_index_info& info) const {

@@ -28,14 +28,13 @@ class Unchecked {
   Unchecked& operator=(const Unchecked&) = delete;
 };
 
-// SQLite gives columns of these types the affinity of integers, reals and texts. What is left out of an
-// INSERT gets the default row's value where it cannot be NULL.
-std::string column_type(const Field& field, const Row& defaults, std::size_t column) {
+// SQLite gives columns of these types the affinity of integers, reals and texts.
+std::string column_type(const Field& field) {
   switch (field.type) {
     case Type::int32:
-      return " INTEGER NOT NULL DEFAULT " + std::to_string(defaults.get<std::int32_t>(column));
+      return " INTEGER NOT NULL";
     case Type::int16:
-      return " SMALLINT NOT NULL DEFAULT " + std::to_string(defaults.get<std::int16_t>(column));
+      return " SMALLINT NOT NULL";
     case Type::float32:
       return " REAL";
     case Type::float64:
@@ -43,7 +42,7 @@ std::string column_type(const Field& field, const Row& defaults, std::size_t col
     case Type::string:
       break;
   }
-  return " VARCHAR(" + std::to_string(field.size - 1) + ") NOT NULL DEFAULT ''";
+  return " VARCHAR(" + std::to_string(field.size - 1) + ")";
 }
 
 }  // namespace
@@ -59,10 +58,9 @@ TableRelation::TableRelation(SharedFile& file, const tevpf::Table& table)
 std::string TableRelation::declaration() const {
   std::string text = "CREATE TABLE rows(";
   if (shape_.fields.empty()) return text + "nothing HIDDEN)";
-  const Row defaults = table_.new_row();
   for (std::size_t i = 0; i < shape_.fields.size(); ++i) {
     const Field& field = shape_.fields[i];
-    text += (i == 0 ? "" : ", ") + identifier(field.sql_name) + column_type(field, defaults, i);
+    text += (i == 0 ? "" : ", ") + identifier(field.sql_name) + column_type(field);
   }
   return text + ")";
 }
@@ -89,7 +87,7 @@ void TableRelation::fill(Row& row, Values values) const {
   for (std::size_t i = 0; i < shape_.fields.size(); ++i) {
     if (sqlite3_value_nochange(values[i]) != 0) continue;
     const Field& field = shape_.fields[i];
-    row.set(i, to_cell(values[i], field.type, "column " + field.name));
+    row.set(i, to_cell(values[i], field.type, "column", field.name));
   }
 }
 

@@ -43,14 +43,16 @@ std::size_t sequence_size(std::string_view text) {
 
 }  // namespace
 
-tevpf::Cell to_cell(sqlite3_value* value, tevpf::Type type, const std::string& subject) {
+tevpf::Cell to_cell(sqlite3_value* value, tevpf::Type type, const char* kind,
+                    const std::string& name) {
   const bool is_text = type == tevpf::Type::string;
   const bool is_floating = type == tevpf::Type::float32 || type == tevpf::Type::float64;
   switch (is_text ? sqlite3_value_type(value) : sqlite3_value_numeric_type(value)) {
     case SQLITE_NULL:
       if (is_floating) return std::numeric_limits<double>::quiet_NaN();
-      throw tevpf::Error(PF_BADTYPE, subject, tevpf::to_string(type),
-                         subject + " is of type " + tevpf::to_string(type) + " and cannot be NULL");
+      if (is_text) break;
+      throw tevpf::Error(PF_BADTYPE, kind + (" " + name), tevpf::to_string(type),
+                         "'" + name + "': NULL is no integer");
     case SQLITE_INTEGER:
       if (!is_text) return static_cast<std::int64_t>(sqlite3_value_int64(value));
       break;

@@ -10,10 +10,11 @@
 namespace sql {
 
 // As SQLite itself would store the value in a column of such numbers or texts: "12" becomes 12, 12
-// becomes "12". A text is not copied: the Cell lives as long as the value.
-//   subject  "column melting", as the library's messages name it
-// Throws tevpf::Error for NULL where a number or text must be, and for fractions in place of integers.
-tevpf::Cell to_cell(sqlite3_value* value, tevpf::Type type, const std::string& subject);
+// becomes "12". NULL is the empty text. A text is not copied: the Cell lives as long as the value.
+//   kind, name  what it is for: "column" and its name
+// Throws tevpf::Error for NULL in place of an integer.
+tevpf::Cell to_cell(sqlite3_value* value, tevpf::Type type, const char* kind,
+                    const std::string& name);
 
 // A text as it is, NULL as the empty one.
 std::string_view text_of(sqlite3_value* value);

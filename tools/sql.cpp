@@ -135,14 +135,12 @@ class Results {
 
 void run_all(sql::Database& database, std::string_view statements, Results& results) {
   for (int number = 1; !statements.empty(); ++number) {
-    const bool is_first = number == 1;
     try {
       Statement statement = database.prepare(statements);
       statement.columns() > 0 ? results.write(statement) : static_cast<void>(statement.step());
     } catch (const sql::Error& error) {
-      const bool is_alone = is_first && trimmed(statements).empty();
-      throw sql::Error((is_alone ? "" : "statement " + std::to_string(number) + ": ") +
-                       error.what());
+      if (number == 1) throw;
+      throw sql::Error("statement " + std::to_string(number) + ": " + error.what());
     }
   }
   if (database.is_in_transaction()) throw sql::Error("BEGIN without COMMIT");
