@@ -36,7 +36,14 @@ std::vector<Record*> elements(std::int32_t type) {
   return all;
 }
 auto lists() { return elements<TEVPF_LIST>(PF_ELEM_LIST); }
-auto tables() { return elements<TEVPF_TABLE>(PF_ELEM_TABLE); }
+
+// Tables with rows that fit a buffer: a file may ask for rows of gigabytes as long as it has none.
+auto tables() {
+  constexpr std::int32_t kWidestRow = 1 << 24;
+  std::vector<TEVPF_TABLE*> all = elements<TEVPF_TABLE>(PF_ELEM_TABLE);
+  std::erase_if(all, [](const TEVPF_TABLE* table) { return table->row_wid > kWidestRow; });
+  return all;
+}
 
 void read_list(const char* list) {
   std::int32_t type, value_size, desc_size, position;
