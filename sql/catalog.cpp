@@ -6,8 +6,8 @@
 #include <variant>
 #include <vector>
 
+#include "files.h"
 #include "guard.h"
-#include "module.h"
 #include "names.h"
 #include "values.h"
 

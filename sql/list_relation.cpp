@@ -5,7 +5,6 @@
 #include <string_view>
 
 #include "refusal.h"
-#include "shared_file.h"
 #include "values.h"
 
 namespace sql {
@@ -219,8 +218,8 @@ void ListRelation::refuse(const tevpf::Error& error, std::size_t number) const {
 void ListRelation::note(Change::Kind kind, RowIds::Id id, std::size_t number,
                         const Parameter* before) {
   ++version_;
-  file_.note({kind, this, id, number,
-              before == nullptr ? nullptr : std::make_unique<const BeforeParameter>(*before)});
+  journal_.note({kind, this, id, number,
+                 before == nullptr ? nullptr : std::make_unique<const BeforeParameter>(*before)});
 }
 
 Parameter ListRelation::at(std::size_t number) const {
@@ -234,7 +233,7 @@ Parameter ListRelation::at(std::size_t number) const {
 
 RowIds::Id ListRelation::insert(Values values, bool replaces) {
   const std::size_t number = size();
-  const std::size_t mark = file_.changes();
+  const std::size_t mark = journal_.size();
   try {
     const Parameter parameter = changed(values, nullptr);
     if (replaces) {
@@ -242,7 +241,7 @@ RowIds::Id ListRelation::insert(Values values, bool replaces) {
     }
     list_.add(parameter);
   } catch (const tevpf::Error& error) {
-    file_.undo_to(mark);
+    journal_.undo_to(mark);
     refuse(error, number);
   }
   const RowIds::Id id = ids_.add();
@@ -264,7 +263,7 @@ void ListRelation::replace(const Parameter& old, const Parameter& changed) {
 
 void ListRelation::update(RowIds::Id id, Values values, bool replaces) {
   std::size_t number = number_of(id);
-  const std::size_t mark = file_.changes();
+  const std::size_t mark = journal_.size();
   try {
     const Parameter old = at(number);
     const Parameter parameter = changed(values, &old);
@@ -276,7 +275,7 @@ void ListRelation::update(RowIds::Id id, Values values, bool replaces) {
     replace(old, parameter);
     note(Change::Kind::replaced, id, number, &old);
   } catch (const tevpf::Error& error) {
-    file_.undo_to(mark);
+    journal_.undo_to(mark);
     refuse(error, number);
   }
 }

@@ -6,11 +6,9 @@
 
 namespace sql {
 
-class SharedFile;
-
 class ListRelation : public Relation {
  public:
-  ListRelation(SharedFile& file, tevpf::List list) : file_(file), list_(std::move(list)) {}
+  ListRelation(Journal& journal, tevpf::List list) : journal_(journal), list_(std::move(list)) {}
 
   std::string declaration() const override;
   void plan(sqlite3_index_info& info) const override;
@@ -30,7 +28,7 @@ class ListRelation : public Relation {
   [[noreturn]] void refuse(const tevpf::Error& error, std::size_t number) const;
   void note(Change::Kind kind, RowIds::Id id, std::size_t number, const tevpf::Parameter* before);
 
-  SharedFile& file_;
+  Journal& journal_;
   tevpf::List list_;
 };
 

@@ -235,8 +235,8 @@ int rollback(sqlite3_vtab* table) {
 
 int savepoint(sqlite3_vtab* table, int number) {
   return locked(table, [=](Link& link, Lock&) {
-    link.marks.resize(static_cast<std::size_t>(number) + 1, link.file->changes());
-    link.marks.back() = link.file->changes();
+    link.marks.resize(static_cast<std::size_t>(number) + 1, link.file->journal().size());
+    link.marks.back() = link.file->journal().size();
   });
 }
 
@@ -245,7 +245,7 @@ int release(sqlite3_vtab*, int) { return SQLITE_OK; }
 int rollback_to(sqlite3_vtab* table, int number) {
   return locked(table, [=](Link& link, Lock&) {
     const auto place = static_cast<std::size_t>(number);
-    if (place < link.marks.size()) link.file->undo_to(link.marks[place]);
+    if (place < link.marks.size()) link.file->journal().undo_to(link.marks[place]);
   });
 }
 

@@ -1,22 +1,12 @@
 // The virtual-table module "tevpf", and the tables that list what a file holds.
 #pragma once
 
-#include <functional>
 #include <memory>
-#include <string>
 
-#include "shared_file.h"
+#include "files.h"
 #include "sqlite.h"
 
 namespace sql {
-
-// Where the files that SQL names come from.
-struct Files {
-  // Called with the library locked; throws Refusal.
-  std::function<std::shared_ptr<SharedFile>(const std::string& name)> find;
-  // What tevpf_elements and tevpf_columns list when no file is named; empty: one must be named.
-  std::string usual;
-};
 
 // Adds to a connection:
 //   module tevpf(FILE, ELEMENT [, 'list' | 'table'])   for CREATE VIRTUAL TABLE

@@ -7,30 +7,13 @@
 #include <span>
 #include <string>
 
+#include "journal.h"
 #include "row_ids.h"
 #include "sqlite.h"
 
 namespace sql {
 
 using Values = std::span<sqlite3_value*>;
-
-// What was where a change was made, to undo it with.
-struct Before {
-  Before() = default;
-  Before(const Before&) = delete;
-  Before& operator=(const Before&) = delete;
-  virtual ~Before() = default;
-};
-
-class Relation;
-struct Change {
-  enum class Kind { added, replaced, removed };
-  Kind kind;
-  Relation* relation;
-  RowIds::Id id;
-  std::size_t number;                    // of the row when it was changed
-  std::unique_ptr<const Before> before;  // of what was replaced or removed
-};
 
 // A read of some rows. While it is active no other connection changes the file.
 class Cursor {
@@ -50,9 +33,9 @@ class Cursor {
   virtual RowIds::Id id() const = 0;
 };
 
-// All but cursors' step() and delivery is called with the library locked. Changes throw Refusal or
-// std::bad_alloc, and have then changed nothing; what they have done is noted by note().
-class Relation {
+// All but cursors' step() and delivery is called with the library locked. Changes throw Refusal, and have
+// then changed nothing, or std::bad_alloc; what they have done stands in the journal of the file.
+class Relation : public Reverting {
  public:
   virtual ~Relation() = default;
   Relation(const Relation&) = delete;
@@ -66,7 +49,6 @@ class Relation {
   virtual RowIds::Id insert(Values values, bool replaces) = 0;
   virtual void update(RowIds::Id id, Values values, bool replaces) = 0;
   virtual void remove(RowIds::Id id) = 0;
-  virtual void revert(const Change& change) = 0;
 
   virtual std::size_t size() const = 0;
   void renew_ids() { ids_ = RowIds(size()); }

@@ -78,10 +78,9 @@ SharedFile::Stamp SharedFile::stamp() const {
 }
 
 void SharedFile::read_again() {
-  changes_.clear();
+  journal_.clear();
   relations_.clear();
   ++generation_;
-  is_broken_ = false;
   file_ = nullptr;
   own_file_.reset();
   stamp_ = stamp();
@@ -96,7 +95,7 @@ void SharedFile::read_again() {
 // Another program may have saved the file; nobody here stands in the middle of it.
 void SharedFile::read_again_if_changed() {
   if (key_.empty() || writer_ != nullptr || !readers_.empty()) return;
-  if (file_ == nullptr || is_broken_ || stamp() != stamp_) read_again();
+  if (file_ == nullptr || journal_.is_broken() || stamp() != stamp_) read_again();
 }
 
 const tevpf::File& SharedFile::file() {
@@ -110,9 +109,9 @@ std::shared_ptr<Relation> SharedFile::relation(tevpf::Kind kind, const std::stri
   if (known == nullptr) {
     try {
       if (kind == tevpf::Kind::table) {
-        known = std::make_shared<TableRelation>(*this, file.table(name));
+        known = std::make_shared<TableRelation>(journal_, file.table(name));
       } else {
-        known = std::make_shared<ListRelation>(*this, file.list(name));
+        known = std::make_shared<ListRelation>(journal_, file.list(name));
       }
       known->renew_ids();
     } catch (const tevpf::Error& error) {
@@ -165,24 +164,10 @@ void SharedFile::begin_writing(Connection connection, Lock& lock) {
 
 // ---- Transactions -------------------------------------------------------------------------------
 
-void SharedFile::note(Change change) { changes_.push_back(std::move(change)); }
-
-void SharedFile::undo_to(std::size_t changes) {
-  try {
-    while (changes_.size() > changes) {
-      const Change& last = changes_.back();
-      last.relation->revert(last);
-      changes_.pop_back();
-    }
-  } catch (...) {
-    is_broken_ = true;
-    throw;
-  }
-}
-
 void SharedFile::save() {
-  if (is_broken_) throw Refusal(SQLITE_ERROR, "a change could not be undone: nothing was saved");
-  if (changes_.empty() || is_saved_ || key_.empty()) return;
+  if (journal_.is_broken())
+    throw Refusal(SQLITE_ERROR, "a change could not be undone: nothing was saved");
+  if (journal_.empty() || is_saved_ || key_.empty()) return;
   try {
     file_->save();
   } catch (const tevpf::Error& error) {
@@ -194,7 +179,7 @@ void SharedFile::save() {
 
 void SharedFile::end_table() noexcept {
   if (--tables_ > 0) return;
-  changes_.clear();
+  journal_.clear();
   for (const auto& [name, relation] : relations_) relation->renew_ids();
   is_saved_ = false;
   writer_ = nullptr;
@@ -202,21 +187,23 @@ void SharedFile::end_table() noexcept {
 }
 
 void SharedFile::commit() noexcept {
-  was_changed_ = was_changed_ || !changes_.empty();
+  was_changed_ = was_changed_ || !journal_.empty();
   end_table();
 }
 
 // Where another file of the transaction could not be saved, this one was, and is put back.
 void SharedFile::rollback() noexcept {
+  bool is_lost = false;
   try {
-    undo_to(0);
+    journal_.undo_to(0);
     if (is_saved_) file_->save();
     if (is_saved_) stamp_ = stamp();
   } catch (...) {
-    is_broken_ = true;
+    is_lost = true;
   }
   is_saved_ = false;
   end_table();
+  if (is_lost) journal_.set_broken();
 }
 
 }  // namespace sql

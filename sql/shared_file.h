@@ -53,9 +53,7 @@ class SharedFile {
   void begin_writing(Connection connection, Lock& lock);  // once for each of its tables
 
   // ---- Of the connection that writes ----
-  void note(Change change);
-  std::size_t changes() const noexcept { return changes_.size(); }
-  void undo_to(std::size_t changes);
+  Journal& journal() noexcept { return journal_; }
   void save();             // ahead of commits; throws Refusal
   void commit() noexcept;  // once for each table: the last one ends the transaction
   void rollback() noexcept;
@@ -86,9 +84,8 @@ class SharedFile {
   std::map<Connection, int> readers_;  // with their open cursors
   Connection writer_ = nullptr;
   int tables_ = 0;  // that take part in its transaction
-  std::vector<Change> changes_;
-  bool is_saved_ = false;   // the transaction's changes are on the disk
-  bool is_broken_ = false;  // something could not be undone: only reading the file again helps
+  Journal journal_;
+  bool is_saved_ = false;  // the transaction's changes are on the disk
   bool was_changed_ = false;
 };
 

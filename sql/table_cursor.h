@@ -6,13 +6,13 @@
 
 #include "row_blocks.h"
 #include "table_plan.h"
-#include "table_relation.h"
+#include "table_view.h"
 
 namespace sql {
 
 class TableCursor : public Cursor {
  public:
-  explicit TableCursor(TableRelation& relation) : relation_(relation) {}
+  explicit TableCursor(TableView& relation) : relation_(relation) {}
 
   void filter(int plan, Values arguments) override;
   bool step() noexcept override;
@@ -34,7 +34,7 @@ class TableCursor : public Cursor {
   void read_sorted(const Plan& plan);
   const unsigned char* read(std::size_t position);
 
-  TableRelation& relation_;
+  TableView& relation_;
   RowBlocks rows_{relation_.table(), relation_.shape().row_size, {}};
   std::vector<std::size_t> sorted_;  // row numbers, where no index has their order
   bool is_sorted_ = false;

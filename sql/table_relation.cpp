@@ -1,7 +1,6 @@
 #include "table_relation.h"
 
 #include "refusal.h"
-#include "shared_file.h"
 #include "table_cursor.h"
 #include "table_plan.h"
 #include "values.h"
@@ -46,13 +45,6 @@ std::string column_type(const Field& field) {
 }
 
 }  // namespace
-
-TableRelation::TableRelation(SharedFile& file, const tevpf::Table& table)
-    : file_(file), table_(table), shape_(table_), orders_(shape_.fields.size()) {
-  for (std::size_t i = 0; i < orders_.size(); ++i) {
-    if (shape_.fields[i].is_indexed) orders_[i].emplace(table_, shape_, shape_.fields[i]);
-  }
-}
 
 // SQLite knows no table without columns.
 std::string TableRelation::declaration() const {
@@ -101,7 +93,7 @@ void TableRelation::remove_equal(const Row& row, std::optional<RowIds::Id> but) 
 
 RowIds::Id TableRelation::insert(Values values, bool replaces) {
   std::size_t number = size();
-  const std::size_t mark = file_.changes();
+  const std::size_t mark = journal_.size();
   try {
     Row row = table_.new_row();
     fill(row, values);
@@ -109,18 +101,18 @@ RowIds::Id TableRelation::insert(Values values, bool replaces) {
     number = size();
     table_.append(row);
   } catch (const tevpf::Error& error) {
-    file_.undo_to(mark);
+    journal_.undo_to(mark);
     refuse(error, number);
   }
   const RowIds::Id id = ids_.add();
-  file_.note({Change::Kind::added, this, id, number, nullptr});
+  journal_.note({Change::Kind::added, this, id, number, nullptr});
   values_added(number);
   return id;
 }
 
 void TableRelation::update(RowIds::Id id, Values values, bool replaces) {
   std::size_t number = number_of(id);
-  const std::size_t mark = file_.changes();
+  const std::size_t mark = journal_.size();
   try {
     Row row = table_.row(number);
     auto before = std::make_unique<const BeforeRow>(row);
@@ -130,9 +122,9 @@ void TableRelation::update(RowIds::Id id, Values values, bool replaces) {
       number = number_of(id);
     }
     table_.replace(number, row);
-    file_.note({Change::Kind::replaced, this, id, number, std::move(before)});
+    journal_.note({Change::Kind::replaced, this, id, number, std::move(before)});
   } catch (const tevpf::Error& error) {
-    file_.undo_to(mark);
+    journal_.undo_to(mark);
     refuse(error, number);
   }
   values_added(number);
@@ -144,7 +136,7 @@ void TableRelation::remove(RowIds::Id id) {
     auto before = std::make_unique<const BeforeRow>(table_.row(number));
     table_.remove(number);
     ids_.remove(id);
-    file_.note({Change::Kind::removed, this, id, number, std::move(before)});
+    journal_.note({Change::Kind::removed, this, id, number, std::move(before)});
   } catch (const tevpf::Error& error) {
     refuse(error, number);
   }

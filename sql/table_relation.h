@@ -3,20 +3,15 @@
 
 #include <cstddef>
 #include <optional>
-#include <vector>
 
-#include "index_order.h"
-#include "relation.h"
-#include "table_shape.h"
-#include "tevpf.hpp"
+#include "table_view.h"
 
 namespace sql {
 
-class SharedFile;
-
-class TableRelation : public Relation {
+class TableRelation : public TableView {
  public:
-  TableRelation(SharedFile& file, const tevpf::Table& table);
+  TableRelation(Journal& journal, const tevpf::Table& table)
+      : TableView(table), journal_(journal) {}
 
   std::string declaration() const override;
   void plan(sqlite3_index_info& info) const override;
@@ -25,11 +20,6 @@ class TableRelation : public Relation {
   void update(RowIds::Id id, Values values, bool replaces) override;
   void remove(RowIds::Id id) override;
   void revert(const Change& change) override;
-  std::size_t size() const override { return table_.size(); }
-
-  const tevpf::Table& table() const noexcept { return table_; }
-  const TableShape& shape() const noexcept { return shape_; }
-  IndexOrder& order_of(std::size_t column) { return *orders_[column]; }  // of an indexed column
 
  private:
   void fill(tevpf::Row& row, Values values) const;
@@ -40,10 +30,7 @@ class TableRelation : public Relation {
   void values_added(std::size_t number);
   [[noreturn]] void refuse(const tevpf::Error& error, std::size_t number) const;
 
-  SharedFile& file_;
-  tevpf::Table table_;
-  TableShape shape_;
-  std::vector<std::optional<IndexOrder>> orders_;  // by column; none without index
+  Journal& journal_;
 };
 
 }  // namespace sql
