@@ -1,0 +1,103 @@
+#include "texts.h"
+
+#include <cstring>
+#include <string_view>
+
+#include "buffer.h"
+#include "text.h"
+
+namespace tevpf_python {
+
+py::list list_of(const std::vector<std::string>& texts) {
+  py::list result(texts.size());
+  for (std::size_t i = 0; i < texts.size(); ++i) {
+    PyList_SET_ITEM(result.ptr(), static_cast<Py_ssize_t>(i), to_str(texts[i]).release().ptr());
+  }
+  return result;
+}
+
+TextFields::TextFields(const tevpf::RowLayout& layout) : row_size_(layout.row_size()) {
+  for (tevpf::RowField& field : layout.fields()) {
+    if (field.type == tevpf::Type::string) fields_.push_back(std::move(field));
+  }
+}
+
+void TextFields::clear_ends(std::span<std::byte> rows) const noexcept {
+  for (const tevpf::RowField& field : fields_) {
+    for (std::size_t at = field.offset; at < rows.size(); at += row_size_) {
+      auto* const text = reinterpret_cast<char*>(rows.data() + at);
+      const std::size_t length = strnlen(text, field.size);
+      std::memset(text + length, 0, field.size - length);
+    }
+  }
+}
+
+// ---- From Python --------------------------------------------------------------------------------
+
+namespace {
+
+bool is_missing(PyObject* value) noexcept {
+  return value == Py_None ||
+         (PyFloat_Check(value) && PyFloat_AS_DOUBLE(value) != PyFloat_AS_DOUBLE(value));
+}
+
+[[noreturn]] void refuse(std::size_t row, const tevpf::RowField& field, TEVPF_STATUS status,
+                         const std::string& item, const std::string& problem) {
+  throw tevpf::Error(status, item, status == PF_BADTYPE ? "string" : field.column,
+                     "row " + std::to_string(row) + ": " + problem);
+}
+
+std::string_view check(std::size_t row, const tevpf::RowField& field, std::string_view text) {
+  const std::string start = "'" + field.column + "': ";
+  if (text.size() >= field.size) {
+    refuse(row, field, PF_RANGE, std::string(text),
+           start + "'" + std::string(text) + "' has " + std::to_string(text.size()) +
+               " characters; at most " + std::to_string(field.size - 1) + " are possible");
+  }
+  if (text.find('\0') != std::string_view::npos) {
+    refuse(row, field, PF_BADARG, std::string(text),
+           start + "a text cannot contain a NUL character");
+  }
+  return text;
+}
+
+void store_text(std::size_t row, const tevpf::RowField& field, PyObject* value, std::byte* place) {
+  if (is_missing(value)) return;
+  if (!PyUnicode_Check(value)) {
+    refuse(row, field, PF_BADTYPE, "column " + field.column,
+           "column '" + field.column + "' is of type string");
+  }
+  Py_ssize_t size = 0;
+  if (const char* const utf8 = PyUnicode_AsUTF8AndSize(value, &size)) {
+    const std::string_view text = check(row, field, {utf8, static_cast<std::size_t>(size)});
+    std::memcpy(place, text.data(), text.size());
+    return;
+  }
+  PyErr_Clear();
+  const std::string bytes = to_bytes(value);
+  std::memcpy(place, check(row, field, bytes).data(), bytes.size());
+}
+
+}  // namespace
+
+void store_texts(const tevpf::RowLayout& layout, std::size_t field, py::handle rows,
+                 const py::sequence& texts) {
+  const std::vector<tevpf::RowField> fields = layout.fields();
+  if (field >= fields.size() || fields[field].type != tevpf::Type::string) {
+    throw py::type_error("the column holds numbers");
+  }
+  const WritableBuffer buffer(rows);
+  const auto items = py::reinterpret_steal<py::object>(PySequence_Fast(texts.ptr(), "no sequence"));
+  if (!items) throw py::error_already_set();
+  const auto count = static_cast<std::size_t>(PySequence_Fast_GET_SIZE(items.ptr()));
+  if (count * layout.row_size() != buffer.bytes().size()) {
+    throw py::value_error("there must be one text for each row");
+  }
+  std::byte* place = buffer.bytes().data() + fields[field].offset;
+  for (std::size_t row = 0; row < count; ++row, place += layout.row_size()) {
+    store_text(row, fields[field],
+               PySequence_Fast_GET_ITEM(items.ptr(), static_cast<Py_ssize_t>(row)), place);
+  }
+}
+
+}  // namespace tevpf_python
