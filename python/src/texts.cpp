@@ -1,5 +1,6 @@
 #include "texts.h"
 
+#include <cstdint>
 #include <cstring>
 #include <string_view>
 
@@ -22,12 +23,34 @@ TextFields::TextFields(const tevpf::RowLayout& layout) : row_size_(layout.row_si
   }
 }
 
+namespace {
+
+// Clears what lies behind the first zero of a field, eight bytes at a time.
+void clear_end(std::byte* text, std::size_t size) noexcept {
+  constexpr std::uint64_t kOnes = 0x0101010101010101, kHighs = 0x8080808080808080;
+  bool ended = false;
+  for (; size >= sizeof(std::uint64_t); text += sizeof(std::uint64_t), size -= sizeof kOnes) {
+    std::uint64_t word;
+    std::memcpy(&word, text, sizeof word);
+    // The lowest bit that is set is the highest bit of the first byte that is zero.
+    const std::uint64_t zeros = (word - kOnes) & ~word & kHighs;
+    if (zeros != 0) word &= ((zeros & (~zeros + 1)) >> 7) - 1;
+    if (ended) word = 0;
+    ended = ended || zeros != 0;
+    std::memcpy(text, &word, sizeof word);
+  }
+  for (; size > 0; ++text, --size) {
+    ended = ended || *text == std::byte{0};
+    if (ended) *text = std::byte{0};
+  }
+}
+
+}  // namespace
+
 void TextFields::clear_ends(std::span<std::byte> rows) const noexcept {
   for (const tevpf::RowField& field : fields_) {
     for (std::size_t at = field.offset; at < rows.size(); at += row_size_) {
-      auto* const text = reinterpret_cast<char*>(rows.data() + at);
-      const std::size_t length = strnlen(text, field.size);
-      std::memset(text + length, 0, field.size - length);
+      clear_end(rows.data() + at, field.size);
     }
   }
 }

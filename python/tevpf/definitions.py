@@ -20,6 +20,16 @@ RANGES: dict[str, tuple[Value, Value]] = {
 }
 
 
+_WIDTHS = {"int16": 6, "int32": 11, "float32": 13, "float64": 23, "str": 1}
+
+
+def _defaults(kind: str) -> dict[str, Any]:
+    """What a new definition of a type has where nothing else is said."""
+    low, high = RANGES.get(kind, (None, None))
+    return {"min": low, "max": high, "precision": 6 if kind.startswith("float") else None,
+            "width": _WIDTHS.get(kind)}
+
+
 def type_of(value: Any) -> str:
     """The type that a value has by itself: numpy's scalars their own, int int32, float float64."""
     if isinstance(value, str):
@@ -56,11 +66,13 @@ _T = TypeVar("_T", bound="_Definition")
 @dataclasses.dataclass(frozen=True, repr=False)
 class _Definition:
     def _is_default(self, field: dataclasses.Field[Any]) -> bool:
-        value = getattr(self, field.name)
-        if field.name in ("min", "max"):
-            full = RANGES.get(getattr(self, "type"), (None, None))
-            return value is None or value == full[field.name == "max"]
-        return bool(value == field.default)
+        defaults = _defaults(getattr(self, "type"))
+        return bool(getattr(self, field.name) == defaults.get(field.name, field.default))
+
+    def _complete(self) -> None:
+        for name, value in _defaults(getattr(self, "type")).items():
+            if getattr(self, name, value) is None:
+                object.__setattr__(self, name, value)
 
     def __repr__(self) -> str:
         first, second, *rest = dataclasses.fields(self)
@@ -109,6 +121,9 @@ class Parameter(_Definition):
     def __post_init__(self) -> None:
         if not self.type:
             object.__setattr__(self, "type", type_of(self.value))
+        if isinstance(self.value, np.generic):
+            object.__setattr__(self, "value", self.value.item())
+        self._complete()
 
     def _is_default(self, field: dataclasses.Field[Any]) -> bool:
         if field.name == "type":
@@ -158,8 +173,9 @@ class Column(_Definition):
     def __post_init__(self) -> None:
         if self.unique:
             object.__setattr__(self, "indexed", True)
+        self._complete()
 
     @property
     def dtype(self) -> np.dtype[Any]:
         """The dtype of the column's values in numpy; texts are bytes in UTF-8."""
-        return np.dtype(f"S{self.width or 1}" if self.type == "str" else self.type)
+        return np.dtype(f"S{self.width}" if self.type == "str" else self.type)

@@ -262,10 +262,7 @@ class Tables(_Elements[Table]):
             "description": descriptions or {}})
         result = self._wrap(self._file._core.create_table(name, description))
         try:
-            for column in definitions:
-                result.columns.add(column)
-            if given is not None:
-                result.append(given)
+            result._build(definitions, given)
         except BaseException:
             del self[name]
             raise

@@ -60,6 +60,8 @@ def _array_of_series(series: Any) -> np.ndarray:
 def _array(values: Any) -> np.ndarray:
     """An array; one of objects becomes an array of numbers when all of them are, None being nan."""
     array = np.atleast_1d(np.asarray(values))
+    if array.dtype.kind in "US" and not isinstance(values, (np.ndarray, np.generic)):
+        return np.atleast_1d(np.asarray(values, object))  # numbers among texts are numbers
     if array.dtype != object or any(isinstance(value, str) for value in array.flat):
         return array
     try:

@@ -2,6 +2,7 @@
 
 from __future__ import annotations
 
+import dataclasses
 import os
 from collections.abc import Iterable, Iterator, Mapping, MutableMapping
 from typing import TYPE_CHECKING, Any, Optional, Union, overload
@@ -95,7 +96,7 @@ class Table:
             return self._walk(column)
         return self._pick(self._order(column, reverse))
 
-    def find(self, **values: Value) -> Optional[Row]:
+    def find(self, /, **values: Value) -> Optional[Row]:
         """The first row that holds these values: ``t.find(symbol="Fe")``; None if there is none.
 
         One indexed column is searched in O(log n), all others in O(n). Floats are equal within the
@@ -110,7 +111,7 @@ class Table:
         numbers = self._matching(values)
         return self[int(numbers[0])] if len(numbers) else None
 
-    def find_all(self, **values: Value) -> list[Row]:
+    def find_all(self, /, **values: Value) -> list[Row]:
         """All rows that hold these values, in storage order. O(n)."""
         return list(self._pick(self._matching(values)))
 
@@ -156,21 +157,50 @@ class Table:
         refuses.
         """
         self._file._require_writing()
+        self._append(data, self.columns.values())
+
+    def _append(self, data: Any, definitions: Iterable[Column]) -> None:
+        """The same for columns that have, or are to get, these definitions."""
         layout = self._layout()
         records = layout.records(columns_of(data))
-        for column in self.columns.values():
+        for column in definitions:
             if column.indexed and column.type.startswith("float"):
                 missing = np.isnan(records[column.name])
                 if missing.any():  # it equals everything, and would spoil the order of the index
                     refuse_row(column.name, records[column.name], missing)
         self._core.append_rows(layout.core, records)
 
+    def _build(self, definitions: Iterable[Column], data: Any) -> None:
+        """Fills a new table. Indexes are made behind the rows, all at once."""
+        definitions = list(definitions)
+        for column in definitions:
+            self._core.add_column(dataclasses.replace(column, indexed=False, unique=False)._fields())
+        if data is not None:
+            self._append(data, definitions)
+        for column in definitions:
+            if column.indexed:
+                self._index(column)
+
+    def _index(self, column: Column) -> None:
+        try:
+            self._core.redefine(column.name, column._fields())
+        except errors.DuplicateError:
+            values = self[column.name]
+            repeated = np.ones(len(values), bool)
+            repeated[np.unique(values, return_index=True)[1]] = False
+            if not repeated.any():  # equal within the tolerance
+                raise
+            row = int(repeated.argmax())
+            raise errors.DuplicateError(
+                f"row {row}: value '{values[row]}' is already in column '{column.name}'",
+                "PF_DUPLICATE", f"value {values[row]}", f"column {column.name}") from None
+
     def insert(self, number: int, values: Mapping[str, Value]) -> None:
         """Adds a row in front of another one; columns that are left out get their default."""
         self._file._require_writing()
         self._core.insert(number + len(self) if number < 0 else number, dict(values))
 
-    def update(self, number: int, **values: Value) -> None:
+    def update(self, number: int, /, **values: Value) -> None:
         """Changes values of a row: ``t.update(5, melting=1538.0)``."""
         self[number] = values
 
