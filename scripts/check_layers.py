@@ -12,10 +12,11 @@ import sys
 
 # From bottom to top; folders on the same line do not depend on each other.
 LAYERS = [["include"], ["core/base"], ["core/sequence"], ["core/io"], ["core"], ["values"],
-          ["lists", "tables"], ["reports"], ["include/tevpf"], ["tools"]]
+          ["lists", "tables"], ["reports"], ["include/tevpf"],
+          ["tools", "python/src"]]
 PUBLIC = {"include", "include/tevpf"}
 # These use only the public headers, as any program does.
-OUTSIDE = {"include/tevpf", "tools"}
+OUTSIDE = {"include/tevpf", "tools", "python/src"}
 
 ROOT = pathlib.Path(__file__).resolve().parent.parent
 RANKS = {folder: rank for rank, folders in enumerate(LAYERS) for folder in folders}

@@ -107,6 +107,7 @@ py::tuple row_tuple(const tevpf::Row& row) {
 }
 
 void bind_rows(py::module_& module) {
+  module.def("widest", widest);
   py::class_<RowLayout>(module, "RowLayout")
       .def_property_readonly("row_size", &RowLayout::row_size)
       .def("fields", fields_of)

@@ -1,5 +1,7 @@
 #include "texts.h"
 
+#include <algorithm>
+#include <cmath>
 #include <cstdint>
 #include <cstring>
 #include <string_view>
@@ -59,9 +61,18 @@ void TextFields::clear_ends(std::span<std::byte> rows) const noexcept {
 
 namespace {
 
+// None, not-a-number, and pandas' NA.
 bool is_missing(PyObject* value) noexcept {
-  return value == Py_None ||
-         (PyFloat_Check(value) && PyFloat_AS_DOUBLE(value) != PyFloat_AS_DOUBLE(value));
+  if (value == Py_None) return true;
+  if (PyFloat_Check(value)) return std::isnan(PyFloat_AS_DOUBLE(value));
+  return std::string_view(Py_TYPE(value)->tp_name).ends_with("missing.NAType");
+}
+
+// A sequence whose items can be looked at one after the other.
+py::object fast(const py::sequence& texts) {
+  auto items = py::reinterpret_steal<py::object>(PySequence_Fast(texts.ptr(), "no sequence"));
+  if (!items) throw py::error_already_set();
+  return items;
 }
 
 [[noreturn]] void refuse(std::size_t row, const tevpf::RowField& field, TEVPF_STATUS status,
@@ -103,6 +114,20 @@ void store_text(std::size_t row, const tevpf::RowField& field, PyObject* value, 
 
 }  // namespace
 
+std::size_t widest(const py::sequence& texts) {
+  const py::object items = fast(texts);
+  std::size_t result = 1;
+  for (Py_ssize_t i = 0; i < PySequence_Fast_GET_SIZE(items.ptr()); ++i) {
+    PyObject* const text = PySequence_Fast_GET_ITEM(items.ptr(), i);
+    if (!PyUnicode_Check(text)) continue;
+    const bool is_ascii = PyUnicode_IS_READY(text) && PyUnicode_IS_ASCII(text);
+    const std::size_t size =
+        is_ascii ? static_cast<std::size_t>(PyUnicode_GET_LENGTH(text)) : to_bytes(text).size();
+    result = std::max(result, size);
+  }
+  return result;
+}
+
 void store_texts(const tevpf::RowLayout& layout, std::size_t field, py::handle rows,
                  const py::sequence& texts) {
   const std::vector<tevpf::RowField> fields = layout.fields();
@@ -110,8 +135,7 @@ void store_texts(const tevpf::RowLayout& layout, std::size_t field, py::handle r
     throw py::type_error("the column holds numbers");
   }
   const WritableBuffer buffer(rows);
-  const auto items = py::reinterpret_steal<py::object>(PySequence_Fast(texts.ptr(), "no sequence"));
-  if (!items) throw py::error_already_set();
+  const py::object items = fast(texts);
   const auto count = static_cast<std::size_t>(PySequence_Fast_GET_SIZE(items.ptr()));
   if (count * layout.row_size() != buffer.bytes().size()) {
     throw py::value_error("there must be one text for each row");

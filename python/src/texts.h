@@ -28,7 +28,10 @@ class TextFields {
   std::vector<tevpf::RowField> fields_;
 };
 
-// Writes a sequence of texts into a field of as many rows; None and not-a-number become the empty text.
+// The largest number of bytes among the texts of a sequence, at least 1.
+std::size_t widest(const py::sequence& texts);
+
+// Writes a sequence of texts into a field of as many rows; what is missing becomes the empty text.
 //   rows  a writable buffer of zeros, one row for each text
 //   PF_BADTYPE  something else in the sequence
 //   PF_RANGE    a text is longer than the column is wide

@@ -11,6 +11,8 @@ _Path = Union[str, os.PathLike[str]]
 _Value = Union[int, float, str]
 _Row = tuple[_Value, ...]
 
+def widest(texts: Sequence[Any]) -> int: ...
+
 class File:
     @staticmethod
     def open(path: _Path) -> File: ...

@@ -45,14 +45,11 @@ def _is_series(values: Any) -> bool:
 
 
 def _array_of_series(series: Any) -> np.ndarray:
-    if isinstance(series.dtype, np.dtype) and series.dtype != object:
-        return np.asarray(series)
-    missing = np.asarray(series.isna())
-    kind = getattr(series.dtype, "kind", "O")
-    if kind not in "biuf":  # texts, categories
-        values = np.asarray(series, dtype=object)
-        return np.where(missing, None, values) if missing.any() else _array(values)
-    if missing.any() or kind == "f":
+    if isinstance(series.dtype, np.dtype):
+        return _array(np.asarray(series))
+    if getattr(series.dtype, "kind", "O") not in "biuf":  # texts, categories
+        return _array(np.asarray(series, dtype=object))
+    if series.dtype.kind == "f" or series.isna().any():
         return np.asarray(series.to_numpy("float64", na_value=np.nan))
     return np.asarray(series.to_numpy(series.dtype.numpy_dtype))
 
@@ -84,8 +81,7 @@ def definitions_of(columns: Mapping[str, np.ndarray]) -> list[Column]:
 def _widest(texts: np.ndarray) -> int:
     if texts.dtype.kind == "S":
         return max(texts.dtype.itemsize, 1)
-    return max((len(text.encode(errors="surrogateescape")) for text in texts.tolist()
-                if isinstance(text, str)), default=1) or 1
+    return _core.widest(texts.tolist())
 
 
 # ---- Rows of a table ----------------------------------------------------------------------------
