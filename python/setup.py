@@ -22,7 +22,8 @@ class CMakeBuild(build_ext):
         build = pathlib.Path(self.build_temp).resolve()
         build.mkdir(parents=True, exist_ok=True)
         subprocess.run(["cmake", "-S", ROOT, "-B", build, "-G", "Ninja", "-DCMAKE_BUILD_TYPE=Release",
-                        "-DTEVPF_BUILD_PYTHON=ON", "-DTEVPF_BUILD_TOOL=OFF", "-DTEVPF_BUILD_EXAMPLES=OFF",
+                        "-DTEVPF_BUILD_PYTHON=ON", "-DTEVPF_BUILD_TOOL=OFF", "-DTEVPF_BUILD_SQL=OFF",
+                        "-DTEVPF_BUILD_EXAMPLES=OFF",
                         f"-DPython_EXECUTABLE={sys.executable}"], check=True)
         subprocess.run(["cmake", "--build", build, "--target", "tevpf_python"], check=True)
         target = pathlib.Path(self.get_ext_fullpath(ext.name)).resolve()
