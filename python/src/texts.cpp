@@ -65,7 +65,7 @@ namespace {
 bool is_missing(PyObject* value) noexcept {
   if (value == Py_None) return true;
   if (PyFloat_Check(value)) return std::isnan(PyFloat_AS_DOUBLE(value));
-  return std::string_view(Py_TYPE(value)->tp_name).ends_with("missing.NAType");
+  return std::string_view(Py_TYPE(value)->tp_name).ends_with("NAType");
 }
 
 // A sequence whose items can be looked at one after the other.

@@ -154,3 +154,29 @@ def test_lists_equal_their_models_whatever_happens(folder):
         assert all(engine.position(key) == place for place, key in enumerate(model))
         if model:
             assert eval(repr(engine.values()[-1]), vars(tevpf)) == engine.values()[-1]
+
+
+def test_columns_get_the_types_of_their_data(folder):
+    frame = pd.DataFrame({
+        "flag": [True, False], "byte": np.array([255, 0], "u1"), "short": np.array([-5, 5], "i2"),
+        "word": np.array([65535, 0], "u2"), "long": [2 ** 31 - 1, -2 ** 31],
+        "half": np.array([0.5, np.nan], "f2"), "single": np.array([0.1, np.inf], "f4"),
+        "double": [0.1, np.nan], "text": ["zwölf", None], "category": pd.Categorical(["b", "a"]),
+        "Int": pd.array([1, 2], "Int16"), "Missing": pd.array([1, None], "Int64"),
+        "string": pd.array(["x", None], "string"), "Float": pd.array([1.5, None], "Float32")})
+    types = ["int16", "int16", "int16", "int32", "int32", "float32", "float32", "float64", "str", "str",
+             "int16", "float64", "str", "float64"]
+    nan = float("nan")
+    rows = [(1, 255, -5, 65535, 2 ** 31 - 1, 0.5, float(np.float32(0.1)), 0.1, "zwölf", "b", 1, 1.0, "x", 1.5),
+            (0, 0, 5, 0, -2 ** 31, nan, float("inf"), nan, "", "a", 2, nan, "", nan)]
+    with tevpf.open("types.pf", "x") as file:
+        table = file.tables.create("t", frame)
+        assert [column.type for column in table.columns.values()] == types
+        assert table.columns["text"].width == 6 and table.columns["category"].width == 1
+        assert [repr(row.to_tuple()) for row in table] == [repr(row) for row in rows]
+        table.append(table.to_numpy())
+        table.append(table.to_pandas()[:0])
+        assert [repr(row.to_tuple()) for row in table] == [repr(row) for row in rows * 2]
+        file.tables.create("indexed", frame.set_index("long")[["short"]])
+        assert list(file.tables["indexed"].columns) == ["long", "short"]
+        assert len(file.tables.create("empty", frame[:0])) == 0
