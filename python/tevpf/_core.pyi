@@ -3,10 +3,11 @@
 import os
 from typing import Any, Optional, Sequence, Union
 
-from typing_extensions import Buffer
+from numpy.typing import NDArray
 
 VERSION: str
 
+Buffer = NDArray[Any]
 _Path = Union[str, os.PathLike[str]]
 _Value = Union[int, float, str]
 _Row = tuple[_Value, ...]

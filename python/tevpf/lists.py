@@ -44,7 +44,7 @@ class List(MutableMapping[str, Parameter]):
     def __getitem__(self, name: str) -> Parameter:
         return Parameter._from(self._core.parameter(_checked(name)))
 
-    def __setitem__(self, name: str, value: Union[Value, Parameter]) -> None:  # type: ignore[override]
+    def __setitem__(self, name: str, value: Union[Value, Parameter]) -> None:
         """Changes a value, or stores a parameter.
 
         MissingError: a value for a parameter that is not there
@@ -136,7 +136,7 @@ class List(MutableMapping[str, Parameter]):
     def __eq__(self, other: object) -> bool:
         return self is other
 
-    __hash__ = object.__hash__  # type: ignore[assignment]
+    __hash__ = object.__hash__
 
     def __repr__(self) -> str:
         try:

@@ -7,12 +7,15 @@ from collections.abc import Mapping
 from typing import Any, Sequence
 
 import numpy as np
+import numpy.typing
 
 from . import _core, errors
 from .definitions import Column, column_type
 
+Array = numpy.typing.NDArray[Any]
 
-def columns_of(data: Any) -> dict[str, np.ndarray]:
+
+def columns_of(data: Any) -> dict[str, Array]:
     """The columns of some data by name, as arrays of one dimension and equal length.
 
     A data frame's index is a column if it has a name. Columns of pandas' own dtypes become numpy's:
@@ -23,9 +26,8 @@ def columns_of(data: Any) -> dict[str, np.ndarray]:
         if any(name is not None for name in data.index.names):
             data = data.reset_index()
         columns = {name: _array_of_series(data[name]) for name in data.columns}
-    elif isinstance(data, np.ndarray) and data.dtype.names is not None:
-        data = np.atleast_1d(data)
-        columns = {name: data[name] for name in data.dtype.names}
+    elif isinstance(data, np.ndarray) and (names := data.dtype.names) is not None:
+        columns = {name: np.atleast_1d(data)[name] for name in names}
     elif isinstance(data, Mapping):
         columns = {name: _array_of_series(values) if _is_series(values) else _array(values)
                    for name, values in data.items()}
@@ -44,7 +46,7 @@ def _is_series(values: Any) -> bool:
     return pandas is not None and isinstance(values, pandas.Series)
 
 
-def _array_of_series(series: Any) -> np.ndarray:
+def _array_of_series(series: Any) -> Array:
     if isinstance(series.dtype, np.dtype):
         return _array(np.asarray(series))
     if getattr(series.dtype, "kind", "O") not in "biuf":  # texts, categories
@@ -54,7 +56,7 @@ def _array_of_series(series: Any) -> np.ndarray:
     return np.asarray(series.to_numpy(series.dtype.numpy_dtype))
 
 
-def _array(values: Any) -> np.ndarray:
+def _array(values: Any) -> Array:
     """An array; one of objects becomes an array of numbers when all of them are, None being nan."""
     array = np.atleast_1d(np.asarray(values))
     if array.dtype.kind in "US" and not isinstance(values, (np.ndarray, np.generic)):
@@ -68,7 +70,7 @@ def _array(values: Any) -> np.ndarray:
     return numbers if numbers.dtype.kind in "biuf" else array
 
 
-def definitions_of(columns: Mapping[str, np.ndarray]) -> list[Column]:
+def definitions_of(columns: Mapping[str, Array]) -> list[Column]:
     """Columns that hold the data: of its types, texts as wide as the longest one."""
     result = []
     for name, array in columns.items():
@@ -78,7 +80,7 @@ def definitions_of(columns: Mapping[str, np.ndarray]) -> list[Column]:
     return result
 
 
-def _widest(texts: np.ndarray) -> int:
+def _widest(texts: Array) -> int:
     if texts.dtype.kind == "S":
         return max(texts.dtype.itemsize, 1)
     return _core.widest(texts.tolist())
@@ -101,7 +103,7 @@ class Layout:
             "offsets": [offset for *_, offset, _ in self.fields],
             "itemsize": core.row_size})
 
-    def records(self, columns: Mapping[str, np.ndarray]) -> np.ndarray:
+    def records(self, columns: Mapping[str, Array]) -> Array:
         """The data as rows, one array of this dtype.
 
         MissingError: a column that the table has not, or one that is missing
@@ -127,11 +129,11 @@ class Layout:
         return result
 
 
-def fits_bytes(array: np.ndarray, width: int) -> bool:
+def fits_bytes(array: Array, width: int) -> bool:
     return array.dtype.kind == "S" and array.dtype.itemsize <= width
 
 
-def refuse_inner_zeros(name: str, array: np.ndarray) -> None:
+def refuse_inner_zeros(name: str, array: Array) -> None:
     characters = np.ascontiguousarray(array).view(np.uint8).reshape(len(array), -1)
     wrong = ((characters[:, :-1] == 0) & (characters[:, 1:] != 0)).any(axis=1)
     if wrong.any():
@@ -139,14 +141,14 @@ def refuse_inner_zeros(name: str, array: np.ndarray) -> None:
                                    "character", "PF_BADARG", "", name)
 
 
-def texts(array: np.ndarray) -> Sequence[Any]:
+def texts(array: Array) -> Sequence[Any]:
     """As str; what is no text is left to be refused."""
     if array.dtype.kind != "S":
         return array.tolist()
     return [text.decode(errors="surrogateescape") for text in array.tolist()]
 
 
-def numbers(name: str, kind: str, array: np.ndarray) -> np.ndarray:
+def numbers(name: str, kind: str, array: Array) -> Array:
     """Numbers of a type that holds them: integers exactly, fractions as the nearest float."""
     target = np.dtype(kind)
     given = array.dtype
@@ -166,7 +168,7 @@ def numbers(name: str, kind: str, array: np.ndarray) -> np.ndarray:
     return array
 
 
-def refuse_row(name: str, array: np.ndarray, wrong: np.ndarray) -> None:
+def refuse_row(name: str, array: Array, wrong: Array) -> None:
     row = int(wrong.argmax())
     raise errors.RangeError(f"row {row}: '{name}': {array[row]} is out of range", "PF_RANGE",
                             str(array[row]), name)

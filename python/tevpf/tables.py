@@ -11,7 +11,7 @@ import numpy as np
 
 from . import _core, errors, notebook
 from .definitions import Column, Value
-from .records import Layout, columns_of, refuse_row
+from .records import Array, Layout, columns_of, refuse_row
 from .rows import Row
 
 if TYPE_CHECKING:
@@ -67,7 +67,7 @@ class Table:
     # ---- Reading ----
 
     @overload
-    def __getitem__(self, key: str) -> np.ndarray: ...
+    def __getitem__(self, key: str) -> Array: ...
     @overload
     def __getitem__(self, key: int) -> Row: ...
     @overload
@@ -120,7 +120,7 @@ class Table:
         found = self._core.find_prefix(column, prefix)
         return None if found is None else self._row(*found)
 
-    def to_numpy(self, sorted_by: Optional[str] = None) -> np.ndarray:
+    def to_numpy(self, sorted_by: Optional[str] = None) -> Array:
         """All rows as a structured array of shape (rows,), made with one copy.
 
         sorted_by: an indexed column, whose order the rows get.
@@ -142,7 +142,7 @@ class Table:
         frame.attrs["units"] = {c.name: c.units for c in columns.values() if c.units}
         return frame
 
-    def __array__(self, dtype: Any = None) -> np.ndarray:
+    def __array__(self, dtype: Any = None) -> Array:
         rows = self.to_numpy()
         return rows if dtype is None else rows.astype(dtype)
 
@@ -277,7 +277,7 @@ class Table:
                                        str(given), str(rows))
         return given % rows
 
-    def _column(self, name: str) -> np.ndarray:
+    def _column(self, name: str) -> Array:
         kind = self.columns[name].type
         if kind == "str":
             texts = self._core.read_texts(name)
@@ -295,12 +295,12 @@ class Table:
                 if len(self) != size:
                     raise RuntimeError("the table changed its size during iteration")
 
-    def _pick(self, numbers: np.ndarray) -> Iterator[Row]:
+    def _pick(self, numbers: Array) -> Iterator[Row]:
         positions = self._positions()
         for number in numbers.tolist():
             yield Row(positions, self._core.row(number), number)
 
-    def _order(self, column: str, reverse: bool) -> np.ndarray:
+    def _order(self, column: str, reverse: bool) -> Array:
         values = self[column]
         order = np.argsort(values, kind="stable")
         if not reverse:
@@ -308,7 +308,7 @@ class Table:
         numbers = len(values) - int(np.isnan(values).sum()) if values.dtype.kind == "f" else len(values)
         return np.concatenate([order[:numbers][::-1], order[numbers:]])
 
-    def _matching(self, values: Mapping[str, Value]) -> np.ndarray:
+    def _matching(self, values: Mapping[str, Value]) -> Array:
         """The numbers of the rows that hold these values."""
         matches = np.ones(len(self), bool)
         for column, value in values.items():
