@@ -2,25 +2,32 @@
 #pragma once
 
 #include <cstddef>
+#include <optional>
 #include <span>
 #include <string>
 #include <vector>
 
+#include "definition_options.h"
 #include "failure.h"
+#include "files.h"
 #include "find.h"
+#include "place.h"
 
 namespace tool {
 
 // What the command line said. A command reads the members that its row in the table declares.
-struct Arguments {
-  std::string file, element, parameter, value, new_name, csv, output, sort;
+struct Arguments : DefinitionOptions, PlaceOptions {
+  std::string file, element, csv, output, sort;
+  std::optional<std::string> member, value, new_name;
   std::vector<std::string> columns;
   std::size_t from = 0, to = 0;  // 0: not given
   bool json = false, names = false, list = false, table = false, force = false;
+  bool no_lock = false;
 
   Kind kind() const {
     return list ? Kind(tevpf::Kind::list) : table ? Kind(tevpf::Kind::table) : Kind();
   }
+  Target target() const { return {file, !no_lock}; }
 };
 
 struct Command {
@@ -32,8 +39,10 @@ struct Command {
 
 std::span<const Command> commands();
 
+ExitStatus run_add(const Arguments& arguments);
 ExitStatus run_check(const Arguments& arguments);
 ExitStatus run_cp(const Arguments& arguments);
+ExitStatus run_define(const Arguments& arguments);
 ExitStatus run_dump(const Arguments& arguments);
 ExitStatus run_export(const Arguments& arguments);
 ExitStatus run_get(const Arguments& arguments);

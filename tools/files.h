@@ -2,7 +2,9 @@
 #pragma once
 
 #include <cstdint>
+#include <functional>
 #include <string>
+#include <system_error>
 
 #include "failure.h"
 #include "temp_file.h"
@@ -22,13 +24,33 @@ tevpf::File open_to_change(const std::string& path);
 // Writes it as the library does, interrupts waiting meanwhile.
 void save(tevpf::File& file);
 
+// FILE of a command that changes it. Locked: no other program that locks it, too, changes it from
+// the moment it is read until it is saved.
+struct Target {
+  std::string path;
+  bool is_locked = true;
+};
+
+enum class Missing { kRefused, kMade };
+
+// Opens the file, changes and saves it. `change` is called again, on a fresh copy of the file, when
+// another program has made a missing file meanwhile. True: the file was made.
+bool change_file(const Target& target, Missing missing,
+                 const std::function<void(tevpf::File& file)>& change);
+
+// Says on standard output what was done. Where that fails, the message says that FILE is changed.
+void report(const Target& target, const std::string& done);
+
+bool exists(const std::string& path);  // a link that leads nowhere does, too
+
 // A file that appears under its name only when it is saved. An existing one is refused.
 class NewFile {
  public:
   static NewFile create(const std::string& path);
 
   tevpf::File& file() { return file_; }
-  void save();  // and closes it
+  // And closes it. An error: the name is taken meanwhile, nothing is left of the file.
+  std::error_code save();
 
  private:
   NewFile(const std::string& path, tevpf::File file);

@@ -24,8 +24,12 @@ tevpf::Element find_element(const tevpf::File& file, const std::string& name, Ki
     const std::string other =
         named.empty() ? ""
                       : std::string(", only a ") + word_of(named.front().kind) + " of that name";
+    std::vector<std::string> names;
+    for (const tevpf::Element& element : file.elements()) names.push_back(element.name);
+    const std::string guess = named.empty() ? did_you_mean(name, names) : "";
     throw Failure(kRefused, visible(file.name()) + ": there is no " + word_of(kind) + " " +
-                                in_quotes(name) + other + "; 'tevpf info' shows what there is");
+                                in_quotes(name) + other +
+                                (guess.empty() ? "; 'tevpf info' shows what there is" : guess));
   }
   if (named.size() > 1 && !kind) {
     throw Failure(kRefused, visible(file.name()) + ": both a list and a table are named " +
@@ -37,9 +41,12 @@ tevpf::Element find_element(const tevpf::File& file, const std::string& name, Ki
 tevpf::Parameter find_parameter(const tevpf::File& file, const std::string& list,
                                 const std::string& name) {
   if (auto found = file.list(list).find(name)) return *std::move(found);
+  std::vector<std::string> names;
+  for (const tevpf::Parameter& parameter : file.list(list)) names.push_back(parameter.name());
+  const std::string guess = did_you_mean(name, names);
   throw Failure(kRefused, visible(file.name()) + ": list " + in_quotes(list) +
                               " has no parameter " + in_quotes(name) +
-                              "; 'tevpf show' shows those it has");
+                              (guess.empty() ? "; 'tevpf show' shows those it has" : guess));
 }
 
 Columns::Columns(const tevpf::File& file, const tevpf::Table& table)

@@ -11,8 +11,7 @@ namespace tool {
 ExitStatus run_get(const Arguments& arguments) {
   const tevpf::File file = open_to_read(arguments.file);
   const tevpf::Element list = find_element(file, arguments.element, tevpf::Kind::list);
-  const std::string value =
-      exact_text(find_parameter(file, list.name, arguments.parameter).value());
+  const std::string value = exact_text(find_parameter(file, list.name, *arguments.member).value());
   // A script gets the very bytes; a terminal must not act upon them.
   print((is_terminal(stdout) ? visible(value) : value) + "\n");
   return finish_reading(file);

@@ -1,13 +1,10 @@
 // tevpf import: the rows of a CSV file into a table, all of them or none.
 #include <array>
 #include <cstdio>
-#include <filesystem>
 #include <memory>
-#include <system_error>
 
 #include "commands.h"
 #include "files.h"
-#include "output.h"
 #include "platform.h"
 #include "table_import.h"
 #include "text.h"
@@ -36,40 +33,18 @@ std::string read_whole(const std::string& path) {
                                  "; name a CSV file, or - for standard input");
 }
 
-bool exists(const std::string& path) {
-  std::error_code ignored;
-  return std::filesystem::symlink_status(path, ignored).type() !=
-         std::filesystem::file_type::not_found;
-}
-
-// The number of rows added.
-std::size_t import_and_save(const std::string& path, const std::string& table, const CsvText& csv) {
-  if (exists(path)) {
-    tevpf::File file = open_to_change(path);
-    const std::size_t rows = import_csv(file, table, csv);
-    save(file);
-    return rows;
-  }
-  NewFile made = NewFile::create(path);
-  const std::size_t rows = import_csv(made.file(), table, csv);
-  made.save();
-  return rows;
-}
-
 }  // namespace
 
 ExitStatus run_import(const Arguments& arguments) {
   check_new_name(arguments.element, "the table's name");
   const std::string text = read_whole(arguments.csv);
   const std::string name = arguments.csv == "-" ? "standard input" : arguments.csv;
-  const std::size_t rows = import_and_save(arguments.file, arguments.element, {text, name});
-  const std::string done = counted(rows, "row") + " added to table " + in_quotes(arguments.element);
-  try {
-    print(done + "\n");
-  } catch (const Failure& failure) {
-    throw Failure(failure.status(),
-                  visible(arguments.file) + " is changed: " + done + "; but " + failure.what());
-  }
+  std::size_t rows = 0;
+  change_file(arguments.target(), Missing::kMade, [&](tevpf::File& file) {
+    rows = import_csv(file, arguments.element, {text, name});
+  });
+  report(arguments.target(),
+         counted(rows, "row") + " added to table " + in_quotes(arguments.element));
   return kDone;
 }
 

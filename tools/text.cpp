@@ -2,9 +2,33 @@
 
 #include <algorithm>
 #include <array>
+#include <numeric>
+#include <utility>
 
 namespace tool {
 namespace {
+
+char lower(char c) { return c >= 'A' && c <= 'Z' ? static_cast<char>(c - 'A' + 'a') : c; }
+
+// How many letters must be changed, added, left out or swapped with the next one to make one name of
+// the other; capitals do not count.
+std::size_t distance(std::string_view a, std::string_view b) {
+  std::vector<std::size_t> before(b.size() + 1), last(b.size() + 1), now(b.size() + 1);
+  std::iota(last.begin(), last.end(), std::size_t{0});
+  for (std::size_t i = 1; i <= a.size(); ++i) {
+    now[0] = i;
+    for (std::size_t j = 1; j <= b.size(); ++j) {
+      const auto same = [&](std::size_t x, std::size_t y) { return lower(a[x]) == lower(b[y]); };
+      now[j] = std::min({last[j] + 1, now[j - 1] + 1, last[j - 1] + (same(i - 1, j - 1) ? 0 : 1)});
+      if (i > 1 && j > 1 && same(i - 1, j - 2) && same(i - 2, j - 1)) {
+        now[j] = std::min(now[j], before[j - 2] + 1);
+      }
+    }
+    std::swap(before, last);
+    std::swap(last, now);
+  }
+  return last[b.size()];
+}
 
 bool is_continuation(char byte) { return (static_cast<unsigned char>(byte) & 0xC0) == 0x80; }
 
@@ -80,6 +104,20 @@ std::string in_quotes(std::string_view text) { return "'" + visible(text) + "'";
 std::size_t display_width(std::string_view text) {
   return text.size() -
          static_cast<std::size_t>(std::count_if(text.begin(), text.end(), is_continuation));
+}
+
+std::string did_you_mean(std::string_view name, const std::vector<std::string>& names) {
+  // A third of a short name is another name.
+  std::size_t least = std::clamp<std::size_t>(name.size() / 3, 1, 3) + 1;
+  const std::string* nearest = nullptr;
+  for (const std::string& candidate : names) {
+    const std::size_t far = distance(name, candidate);
+    if (far < std::min(least, std::max<std::size_t>(candidate.size(), 1))) {
+      least = far;
+      nearest = &candidate;
+    }
+  }
+  return nearest == nullptr ? "" : "; did you mean " + in_quotes(*nearest) + "?";
 }
 
 std::string_view trimmed(std::string_view text) {

@@ -5,6 +5,7 @@
 #include <cstdint>
 #include <string>
 #include <string_view>
+#include <vector>
 
 namespace tool {
 
@@ -24,5 +25,8 @@ std::string_view trimmed(std::string_view text);  // without blanks and tabs at 
 
 // "1 row", "2 rows".
 std::string counted(std::uintmax_t count, std::string_view noun);
+
+// "; did you mean 'Thrust'?" when one of the names is nearly the given one, else nothing.
+std::string did_you_mean(std::string_view name, const std::vector<std::string>& names);
 
 }  // namespace tool

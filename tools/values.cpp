@@ -27,6 +27,30 @@ Parsed parse_number(std::string_view text, Value& value) {
   return Parsed::kValue;
 }
 
+constexpr std::size_t kExactDigits = 15;  // every integer of so many digits is a double
+constexpr std::int32_t kLeastPrecision = 6, kMostPrecision = 17;
+
+bool is_digit(char c) { return c >= '0' && c <= '9'; }
+
+// Whether reading text as a number would lose digits that may matter: leading zeros, and integers
+// beyond what a double tells apart.
+bool would_lose_digits(std::string_view text) {
+  if (text.starts_with('-') || text.starts_with('+')) text.remove_prefix(1);
+  if (text.size() > 1 && text[0] == '0' && is_digit(text[1])) return true;
+  return text.size() > kExactDigits && std::all_of(text.begin(), text.end(), is_digit);
+}
+
+// Of a number's shortest text: without zeros at either end.
+std::int32_t significant_digits(std::string_view text) {
+  const std::string_view mantissa = text.substr(0, text.find('e'));
+  static constexpr std::string_view kNotZero = "123456789";
+  const std::size_t first = mantissa.find_first_of(kNotZero);
+  if (first == std::string_view::npos) return 1;
+  const std::string_view digits =
+      mantissa.substr(first, mantissa.find_last_of(kNotZero) + 1 - first);
+  return static_cast<std::int32_t>(std::count_if(digits.begin(), digits.end(), is_digit));
+}
+
 bool is_whole_range(const tevpf::Bounds& bounds) {
   return std::visit(
       [&](const auto& min) {
@@ -44,6 +68,34 @@ bool is_whole_range(const tevpf::Bounds& bounds) {
 }  // namespace
 
 bool is_floating(Type type) { return type == Type::float32 || type == Type::float64; }
+
+Type guess_type(std::string_view text) {
+  const std::string_view number = trimmed(text);
+  Value value;
+  if (would_lose_digits(number) || std::none_of(number.begin(), number.end(), is_digit)) {
+    return Type::string;
+  }
+  for (const Type type : {Type::int32, Type::float64}) {
+    if (parse_value(type, number, value) == Parsed::kValue) return type;
+  }
+  return Type::string;
+}
+
+Value zero_of(Type type) {
+  Value zero = std::string();
+  if (type != Type::string) parse_value(type, "0", zero);
+  return zero;
+}
+
+std::int32_t precision_of(std::string_view number) {
+  Value value;
+  if (parse_value(Type::float64, number, value) != Parsed::kValue) return kLeastPrecision;
+  return std::clamp(significant_digits(exact_text(value)), kLeastPrecision, kMostPrecision);
+}
+
+std::string with_article(Type type) {
+  return std::string(type == Type::int32 ? "an " : "a ") + tevpf::to_string(type);
+}
 
 Parsed parse_value(Type type, std::string_view text, Value& value) {
   switch (type) {
@@ -85,11 +137,15 @@ std::string display_text(const Value& value, std::int32_t precision) {
     return exact_text(value);
   }
   const double number = wide != nullptr ? *wide : static_cast<double>(*narrow);
+  std::string exact = exact_text(value);
+  if (significant_digits(exact) <= precision) return exact;
   std::array<char, 64> buffer;
-  // More digits than tell all doubles apart say nothing.
-  const int length =
-      std::snprintf(buffer.data(), buffer.size(), "%.*g", std::min(precision, 17), number);
+  const int length = std::snprintf(buffer.data(), buffer.size(), "%.*g", precision, number);
   return {buffer.data(), static_cast<std::size_t>(length)};
+}
+
+bool is_within(const Value& value, const std::optional<tevpf::Bounds>& bounds) {
+  return !is_nan(value) && (!bounds || !(value < bounds->min || bounds->max < value));
 }
 
 bool is_nan(const Value& value) {
@@ -109,14 +165,12 @@ std::string bounds_text(const std::optional<tevpf::Bounds>& bounds, const std::s
 
 std::string refused_value(const std::string& text, Parsed parsed, Type type,
                           const std::string& bounds) {
-  const std::string word = tevpf::to_string(type);
-  const std::string article = type == Type::int32 ? "an " : "a ";
   if (parsed == Parsed::kNotANumber) {
-    return in_quotes(text) + " is not " + article + word +
+    return in_quotes(text) + " is not " + with_article(type) +
            (bounds.empty() ? "" : "; give a number from " + bounds);
   }
   if (!bounds.empty()) return visible(text) + " is out of range; it must lie within " + bounds;
-  return visible(text) + " does not fit " + article + word;
+  return visible(text) + " does not fit " + with_article(type);
 }
 
 }  // namespace tool
