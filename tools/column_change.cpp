@@ -1,6 +1,7 @@
 #include "column_change.h"
 
 #include <limits>
+#include <unordered_map>
 #include <vector>
 
 #include "text.h"
@@ -114,6 +115,20 @@ void check_rows(const tevpf::Table& table, std::size_t position, const tevpf::Co
   }
 }
 
+[[noreturn]] void refuse_equal_rows(const tevpf::Table& table, std::size_t position,
+                                    const Subject& subject) {
+  std::unordered_map<std::string, std::size_t> rows;  // by their values
+  for (const tevpf::RowView row : table) {
+    const std::string text = exact_text(row.value(position));
+    const auto [first, is_new] = rows.try_emplace(text, row.number());
+    if (!is_new) {
+      subject.refuse(row_name(first->second) + " and " + row_name(row.number()) + " both hold " +
+                     in_quotes(text) + ", so it cannot be unique");
+    }
+  }
+  subject.refuse("two rows hold values that are equal within the column's precision");
+}
+
 }  // namespace
 
 void add_column(tevpf::Table& table, const std::string& name, const DefinitionOptions& options,
@@ -147,7 +162,7 @@ void change_column(tevpf::Table& table, const std::string& name, const Definitio
     table.redefine(name, now);
   } catch (const tevpf::Error& error) {
     if (error.status() != PF_NOTUNIQUE) throw;
-    subject.refuse("two rows hold the same value, " + in_quotes(error.item()));
+    refuse_equal_rows(table, position, subject);
   }
 }
 

@@ -2,6 +2,7 @@
 #pragma once
 
 #include <cstddef>
+#include <cstdint>
 #include <optional>
 #include <span>
 #include <string>
@@ -17,12 +18,13 @@ namespace tool {
 
 // What the command line said. A command reads the members that its row in the table declares.
 struct Arguments : DefinitionOptions, PlaceOptions {
-  std::string file, element, csv, output, sort;
-  std::optional<std::string> member, value, new_name;
-  std::vector<std::string> columns;
+  std::string file, element, csv, output, other, on_conflict = "refuse", changes;
+  std::optional<std::string> member, value, new_name, where, to_file;
+  std::vector<std::string> columns, sort, cells;
   std::size_t from = 0, to = 0;  // 0: not given
+  std::optional<std::int32_t> limit;
   bool json = false, names = false, list = false, table = false, force = false;
-  bool no_lock = false;
+  bool count = false, summary = false, wide = false, all = false, no_lock = false;
 
   Kind kind() const {
     return list ? Kind(tevpf::Kind::list) : table ? Kind(tevpf::Kind::table) : Kind();
@@ -43,15 +45,20 @@ ExitStatus run_add(const Arguments& arguments);
 ExitStatus run_check(const Arguments& arguments);
 ExitStatus run_cp(const Arguments& arguments);
 ExitStatus run_define(const Arguments& arguments);
+ExitStatus run_delete(const Arguments& arguments);
+ExitStatus run_diff(const Arguments& arguments);
 ExitStatus run_dump(const Arguments& arguments);
 ExitStatus run_export(const Arguments& arguments);
 ExitStatus run_get(const Arguments& arguments);
 ExitStatus run_import(const Arguments& arguments);
 ExitStatus run_info(const Arguments& arguments);
+ExitStatus run_insert(const Arguments& arguments);
+ExitStatus run_merge(const Arguments& arguments);
 ExitStatus run_mv(const Arguments& arguments);
 ExitStatus run_new(const Arguments& arguments);
 ExitStatus run_rm(const Arguments& arguments);
 ExitStatus run_set(const Arguments& arguments);
 ExitStatus run_show(const Arguments& arguments);
+ExitStatus run_update(const Arguments& arguments);
 
 }  // namespace tool

@@ -1,6 +1,7 @@
-// tevpf export: a list or a table as CSV that reads back exactly.
+// tevpf export: a list or a table as CSV, or JSON of it or of the whole file; both read back exactly.
 #include "commands.h"
 #include "csv.h"
+#include "element_json.h"
 #include "files.h"
 #include "output.h"
 #include "values.h"
@@ -48,9 +49,29 @@ void export_table(Output& output, const tevpf::Table& table) {
   }
 }
 
+ExitStatus export_as_json(const Arguments& arguments) {
+  const tevpf::File file = open_to_read(arguments.file);
+  if (arguments.element.empty()) {
+    Output output(arguments.output, file.name());
+    write_file_json(output, file);
+    output.finish();
+    return finish_reading(file);
+  }
+  const tevpf::Element element = find_element(file, arguments.element, arguments.kind());
+  Output output(arguments.output, file.name());
+  write_element_json(output, file, element);
+  output.write("\n");
+  output.finish();
+  return finish_reading(file);
+}
+
 }  // namespace
 
 ExitStatus run_export(const Arguments& arguments) {
+  if (arguments.json) return export_as_json(arguments);
+  if (arguments.element.empty()) {
+    throw Failure(kUsage, "CSV is of one list or table, so name it; --json writes the whole file");
+  }
   const tevpf::File file = open_to_read(arguments.file);
   const tevpf::Element element = find_element(file, arguments.element, arguments.kind());
   Output output(arguments.output, file.name());

@@ -94,6 +94,11 @@ std::string obstacle_to_saving(const tevpf::Error& error) {
   return visible(error.what());
 }
 
+void refuse_damage(const tevpf::File& file, const std::string& path, const char* consequence) {
+  if (!file.damage()) return;
+  throw Failure(kUnreadable, visible(path) + ": it is damaged: " + damage_of(file) + consequence);
+}
+
 [[noreturn]] void refuse_new_file(const std::string& path, const std::error_code& error) {
   throw save_failure(path, error.message(), OnDisk::kAsBefore);
 }
@@ -126,13 +131,22 @@ ExitStatus finish_reading(const tevpf::File& file) {
   return kUnreadable;
 }
 
+tevpf::File open_undamaged(const std::string& path) {
+  tevpf::File file = open(path);
+  refuse_damage(file, path, "; nothing was copied, because what cannot be read would be lost");
+  return file;
+}
+
+void refuse_same_file(const std::string& read, const std::string& changed) {
+  std::error_code ignored;
+  if (!fs::equivalent(read, changed, ignored)) return;
+  throw Failure(kRefused,
+                visible(read) + " and " + visible(changed) + " are one file; name another one");
+}
+
 tevpf::File open_to_change(const std::string& path) {
   tevpf::File file = open(path);
-  if (file.damage()) {
-    throw Failure(kUnreadable,
-                  visible(path) + ": it is damaged: " + damage_of(file) +
-                      "; it was not changed, because what cannot be read would be lost");
-  }
+  refuse_damage(file, path, "; it was not changed, because what cannot be read would be lost");
   if (file.is_read_only()) {
     throw Failure(kCannotWrite, visible(path) +
                                     ": it may only be read; change its permissions or "

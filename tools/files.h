@@ -15,6 +15,12 @@ namespace tool {
 // To look at. A damaged file is opened as far as it can be read.
 tevpf::File open_to_read(const std::string& path);
 
+// To copy from. A damaged file is refused, because the copy would lack what could not be read.
+tevpf::File open_undamaged(const std::string& path);
+
+// Refuses to read and change one file at once.
+void refuse_same_file(const std::string& read, const std::string& changed);
+
 // How reading commands end: of a damaged file, this says that only a part was shown.
 ExitStatus finish_reading(const tevpf::File& file);
 

@@ -21,6 +21,7 @@
 #include <windows.h>
 #else
 #include <sys/file.h>
+#include <sys/ioctl.h>
 #include <unistd.h>
 
 #include <future>
@@ -68,6 +69,12 @@ void remove_on_interrupt(const fs::path& file) {
   }
 }
 
+std::optional<std::string> environment(const char* name) {
+  const char* const value = std::getenv(name);
+  if (value == nullptr) return std::nullopt;
+  return value;
+}
+
 std::string unused_path_beside(const fs::path& target) {
   static constexpr std::string_view kLetters = "abcdefghijklmnopqrstuvwxyz0123456789";
   static constexpr int kLength = 8;
@@ -89,6 +96,10 @@ void prepare_process() {
 }
 
 bool is_terminal(std::FILE* stream) { return _isatty(_fileno(stream)) != 0; }
+
+TerminalSize terminal_size() { return {}; }
+std::FILE* open_pager(const std::string&) { return nullptr; }
+void close_pager(std::FILE*) {}
 
 bool stdout_is(const fs::path&) { return false; }  // an open file has no cheap identity there
 
@@ -228,6 +239,23 @@ void prepare_process() {
 }
 
 bool is_terminal(std::FILE* stream) { return isatty(fileno(stream)) != 0; }
+
+TerminalSize terminal_size() {
+  winsize size{};
+  if (ioctl(STDOUT_FILENO, TIOCGWINSZ, &size) != 0) return {};
+  return {size.ws_col, size.ws_row};
+}
+
+// Without a choice of the user's, less leaves a short text on the screen and keeps colours.
+std::FILE* open_pager(const std::string& command) {
+  (void)setenv("LESS", "FRX", 0);
+  std::fflush(stdout);
+  std::FILE* const pager = popen(command.c_str(), "w");
+  if (pager != nullptr) std::signal(SIGINT, SIG_IGN);
+  return pager;
+}
+
+void close_pager(std::FILE* pager) { (void)pclose(pager); }
 
 bool stdout_is(const fs::path& file) { return is_same_file(STDOUT_FILENO, file); }
 

@@ -2,9 +2,11 @@
 // with a branch for Windows.
 #pragma once
 
+#include <cstddef>
 #include <cstdio>
 #include <filesystem>
 #include <functional>
+#include <optional>
 #include <string>
 #include <string_view>
 #include <system_error>
@@ -20,6 +22,21 @@ std::error_code last_error();
 void prepare_process();
 
 bool is_terminal(std::FILE* stream);
+
+struct TerminalSize {
+  std::size_t columns = 0, rows = 0;  // 0: not known
+};
+TerminalSize terminal_size();  // of the terminal behind standard output
+
+// Starts a command of the shell that shows on the terminal what is written to the stream. From then on
+// interrupts are the command's to handle. Null when it cannot be started.
+std::FILE* open_pager(const std::string& command);
+
+// Waits until the user has seen enough.
+void close_pager(std::FILE* pager);
+
+// The value of a variable of the environment, none when it is not set.
+std::optional<std::string> environment(const char* name);
 
 // Standard output is redirected to this very file.
 bool stdout_is(const std::filesystem::path& file);

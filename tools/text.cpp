@@ -32,26 +32,13 @@ std::size_t distance(std::string_view a, std::string_view b) {
 
 bool is_continuation(char byte) { return (static_cast<unsigned char>(byte) & 0xC0) == 0x80; }
 
-// Bytes of the printable UTF-8 sequence at the front of a text, 0 when there is none. Overlong
-// forms and surrogates fail by their second byte, as do the control characters U+0080 to U+009F.
+// Bytes of the printable UTF-8 sequence at the front of a text, 0 when there is none.
 std::size_t printable_sequence(std::string_view text) {
+  const std::size_t size = character_size(text);
   const auto lead = static_cast<unsigned char>(text[0]);
-  if (lead < 0x80) return lead >= 0x20 && lead != 0x7F ? 1 : 0;
-  const std::size_t size = lead < 0xC2   ? 0
-                           : lead < 0xE0 ? 2
-                           : lead < 0xF0 ? 3
-                           : lead < 0xF5 ? 4
-                                         : 0;
-  if (size == 0 || text.size() < size) return 0;
-  if (!std::all_of(text.begin() + 1, text.begin() + static_cast<std::ptrdiff_t>(size),
-                   is_continuation)) {
-    return 0;
-  }
-  const auto second = static_cast<unsigned char>(text[1]);
-  const bool refused = (lead == 0xC2 && second < 0xA0) || (lead == 0xE0 && second < 0xA0) ||
-                       (lead == 0xED && second >= 0xA0) || (lead == 0xF0 && second < 0x90) ||
-                       (lead == 0xF4 && second >= 0x90);
-  return refused ? 0 : size;
+  const bool is_control = lead < 0x20 || lead == 0x7F ||
+                          (size == 2 && lead == 0xC2 && static_cast<unsigned char>(text[1]) < 0xA0);
+  return is_control ? 0 : size;
 }
 
 std::string escape(char byte) {
@@ -95,6 +82,26 @@ std::string escaped(std::string_view text, std::size_t (*kept)(std::string_view)
 
 }  // namespace
 
+// Overlong forms and surrogates fail by their second byte.
+std::size_t character_size(std::string_view text) {
+  const auto lead = static_cast<unsigned char>(text[0]);
+  if (lead < 0x80) return 1;
+  const std::size_t size = lead < 0xC2   ? 0
+                           : lead < 0xE0 ? 2
+                           : lead < 0xF0 ? 3
+                           : lead < 0xF5 ? 4
+                                         : 0;
+  if (size == 0 || text.size() < size) return 0;
+  if (!std::all_of(text.begin() + 1, text.begin() + static_cast<std::ptrdiff_t>(size),
+                   is_continuation)) {
+    return 0;
+  }
+  const auto second = static_cast<unsigned char>(text[1]);
+  const bool refused = (lead == 0xE0 && second < 0xA0) || (lead == 0xED && second >= 0xA0) ||
+                       (lead == 0xF0 && second < 0x90) || (lead == 0xF4 && second >= 0x90);
+  return refused ? 0 : size;
+}
+
 std::string visible(std::string_view text) { return escaped(text, nothing); }
 
 std::string visible_lines(std::string_view text) { return escaped(text, layout_sequence); }
@@ -104,6 +111,15 @@ std::string in_quotes(std::string_view text) { return "'" + visible(text) + "'";
 std::size_t display_width(std::string_view text) {
   return text.size() -
          static_cast<std::size_t>(std::count_if(text.begin(), text.end(), is_continuation));
+}
+
+std::string_view first_characters(std::string_view text, std::size_t count) {
+  std::size_t end = 0;
+  while (end < text.size() && (count > 0 || is_continuation(text[end]))) {
+    if (!is_continuation(text[end])) --count;
+    ++end;
+  }
+  return text.substr(0, end);
 }
 
 std::string did_you_mean(std::string_view name, const std::vector<std::string>& names) {

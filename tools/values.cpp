@@ -51,18 +51,26 @@ std::int32_t significant_digits(std::string_view text) {
   return static_cast<std::int32_t>(std::count_if(digits.begin(), digits.end(), is_digit));
 }
 
-bool is_whole_range(const tevpf::Bounds& bounds) {
+// Whether a bound says more than what the type can hold.
+template <class Limit>
+bool is_set(const Value& bound, const Limit& limit) {
   return std::visit(
-      [&](const auto& min) {
-        using T = std::decay_t<decltype(min)>;
+      [&](const auto& value) {
+        using T = std::decay_t<decltype(value)>;
         if constexpr (std::is_same_v<T, std::string>) {
-          return true;
+          return false;
         } else {
-          return min <= std::numeric_limits<T>::lowest() &&
-                 std::get<T>(bounds.max) >= std::numeric_limits<T>::max();
+          return limit(value, std::numeric_limits<T>());
         }
       },
-      bounds.min);
+      bound);
+}
+
+// In front of bounds that are set on one side only, and in no other text of bounds.
+constexpr std::string_view kAtLeast = "at least ", kAtMost = "at most ";
+
+bool is_one_sided(std::string_view bounds) {
+  return bounds.starts_with(kAtLeast) || bounds.starts_with(kAtMost);
 }
 
 }  // namespace
@@ -157,19 +165,36 @@ bool comes_before(const Value& a, const Value& b) {
   return a < b;
 }
 
+bool has_min(const tevpf::Bounds& bounds) {
+  return is_set(bounds.min, [](auto min, auto limits) { return min > limits.lowest(); });
+}
+
+bool has_max(const tevpf::Bounds& bounds) {
+  return is_set(bounds.max, [](auto max, auto limits) { return max < limits.max(); });
+}
+
 std::string bounds_text(const std::optional<tevpf::Bounds>& bounds, const std::string& units) {
-  if (!bounds || is_whole_range(*bounds)) return {};
-  return exact_text(bounds->min) + " to " + exact_text(bounds->max) +
-         (units.empty() ? "" : " " + visible(units));
+  const bool from = bounds && has_min(*bounds);
+  const bool to = bounds && has_max(*bounds);
+  if (!from && !to) return {};
+  const std::string unit = units.empty() ? "" : " " + visible(units);
+  if (!to) return std::string(kAtLeast) + exact_text(bounds->min) + unit;
+  if (!from) return std::string(kAtMost) + exact_text(bounds->max) + unit;
+  return exact_text(bounds->min) + " to " + exact_text(bounds->max) + unit;
 }
 
 std::string refused_value(const std::string& text, Parsed parsed, Type type,
                           const std::string& bounds) {
   if (parsed == Parsed::kNotANumber) {
     return in_quotes(text) + " is not " + with_article(type) +
-           (bounds.empty() ? "" : "; give a number from " + bounds);
+           (bounds.empty()         ? ""
+            : is_one_sided(bounds) ? "; give a number of " + bounds
+                                   : "; give a number from " + bounds);
   }
-  if (!bounds.empty()) return visible(text) + " is out of range; it must lie within " + bounds;
+  if (!bounds.empty()) {
+    return visible(text) + " is out of range; it must " +
+           (is_one_sided(bounds) ? "be " : "lie within ") + bounds;
+  }
   return visible(text) + " does not fit " + with_article(type);
 }
 

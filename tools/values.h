@@ -47,7 +47,11 @@ bool is_within(const Value& value, const std::optional<tevpf::Bounds>& bounds);
 // Numbers by size, what is not a number last; texts by their bytes. Both values are of one type.
 bool comes_before(const Value& a, const Value& b);
 
-// "0 to 3000 rpm"; empty when the bounds only say what the type can hold.
+// Whether the bounds say more than what the type can hold.
+bool has_min(const tevpf::Bounds& bounds);
+bool has_max(const tevpf::Bounds& bounds);
+
+// "0 to 3000 rpm", "at least 0 kg"; empty when the bounds only say what the type can hold.
 std::string bounds_text(const std::optional<tevpf::Bounds>& bounds, const std::string& units);
 
 // Why a text is refused that is no value of the type, or lies outside the bounds: the end of a

@@ -1,0 +1,25 @@
+#include "condition.h"
+
+#include "failure.h"
+
+namespace tool {
+
+namespace {
+
+[[noreturn]] void refuse_expressions() {
+  throw Failure(kRefused,
+                "this program was built without SQLite, so it knows no expressions; choose rows by "
+                "--from and --to");
+}
+
+}  // namespace
+
+std::vector<std::size_t> rows_where(const tevpf::File&, const tevpf::Table&, const std::string&) {
+  refuse_expressions();
+}
+
+void update_rows(tevpf::File&, tevpf::Table&, const std::vector<std::size_t>&, const std::string&) {
+  refuse_expressions();
+}
+
+}  // namespace tool
