@@ -41,6 +41,8 @@ const Argument kArguments[] = {
     {"VALUE", nullptr, nullptr, "The value; put -- before one like -x", &Arguments::value},
     {"NEW", nullptr, nullptr, "The new name, at most 19 characters", &Arguments::new_name},
     {"CSV", nullptr, nullptr, "The CSV or JSON file, - for standard input", &Arguments::csv},
+    {"SQL", nullptr, nullptr, "The statements; without them, those on standard input",
+     &Arguments::statements},
     {"-o", "-o,--output", "OUT", "Write to OUT instead of standard output", &Arguments::output},
     {"--columns", "--columns", "A,B,...", "Show these columns, in this order", &Arguments::columns},
     {"--sort", "--sort", "A,-B,...", "Show rows in the order of these columns, -B downwards",
@@ -64,6 +66,9 @@ const Argument kArguments[] = {
      &Arguments::on_conflict},
     {"--from", "--from", "ROW", "First row, counted from 1", &Arguments::from},
     {"--to", "--to", "ROW", "Last row", &Arguments::to},
+    {"--with", "--with", "OTHER", "Another file, in SQL by its name without ending",
+     &Arguments::with},
+    {"--csv", "--csv", nullptr, "Write CSV", &Arguments::as_csv},
     {"--json", "--json", nullptr, "Write JSON", &Arguments::json},
     {"--names", "--names", nullptr, "Print the names of the elements alone", &Arguments::names},
     {"--type", "--type", "TYPE", "integer, short, real, double or string", &Arguments::type},
@@ -153,6 +158,7 @@ bool read_arguments(const Command& command, int argc, const char* const* argv, A
   app.allow_windows_style_options(false);
   declare_all(app, command.arguments, arguments);
   exclude_each_other(app, {"--list", "--table"});
+  exclude_each_other(app, {"--csv", "--json"});
   exclude_each_other(app, {"--before", "--after", "--position"});
   try {
     app.parse(argc, argv);

@@ -18,12 +18,13 @@ namespace tool {
 
 // What the command line said. A command reads the members that its row in the table declares.
 struct Arguments : DefinitionOptions, PlaceOptions {
-  std::string file, element, csv, output, other, on_conflict = "refuse", changes;
+  std::string file, element, csv, output, other, on_conflict = "refuse", changes, statements;
   std::optional<std::string> member, value, new_name, where, to_file;
-  std::vector<std::string> columns, sort, cells;
+  std::vector<std::string> columns, sort, cells, with;
   std::size_t from = 0, to = 0;  // 0: not given
   std::optional<std::int32_t> limit;
   bool json = false, names = false, list = false, table = false, force = false;
+  bool as_csv = false;
   bool count = false, summary = false, wide = false, all = false, no_lock = false;
 
   Kind kind() const {
@@ -59,6 +60,7 @@ ExitStatus run_new(const Arguments& arguments);
 ExitStatus run_rm(const Arguments& arguments);
 ExitStatus run_set(const Arguments& arguments);
 ExitStatus run_show(const Arguments& arguments);
+ExitStatus run_sql(const Arguments& arguments);
 ExitStatus run_update(const Arguments& arguments);
 
 }  // namespace tool

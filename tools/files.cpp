@@ -103,23 +103,6 @@ void refuse_damage(const tevpf::File& file, const std::string& path, const char*
   throw save_failure(path, error.message(), OnDisk::kAsBefore);
 }
 
-void take_lock(const std::string& path, std::optional<FileLock>& lock) {
-  lock.emplace(path, [&] {
-    if (!is_terminal(stderr)) return;
-    std::fprintf(stderr, "tevpf: %s: another program changes it; waiting\n", visible(path).c_str());
-  });
-  switch (lock->state()) {
-    case FileLock::State::kHeld:
-      return;
-    case FileLock::State::kNoFile:
-      throw Failure(kUnreadable, visible(path) + ": " + obstacle_to_opening(path));
-    case FileLock::State::kRefused:
-      throw Failure(kCannotWrite,
-                    visible(path) + ": it cannot be locked: " + lock->error().message() +
-                        "; --no-lock changes it without a lock, when no other program does");
-  }
-}
-
 }  // namespace
 
 tevpf::File open_to_read(const std::string& path) { return open(path); }
@@ -165,6 +148,23 @@ void save(tevpf::File& file) {
     const bool is_touched = Stamp(file.name()) != before;
     throw save_failure(file.name(), obstacle_to_saving(error),
                        is_touched ? OnDisk::kTouched : OnDisk::kAsBefore);
+  }
+}
+
+void take_lock(const std::string& path, std::optional<FileLock>& lock) {
+  lock.emplace(path, [&] {
+    if (!is_terminal(stderr)) return;
+    std::fprintf(stderr, "tevpf: %s: another program changes it; waiting\n", visible(path).c_str());
+  });
+  switch (lock->state()) {
+    case FileLock::State::kHeld:
+      return;
+    case FileLock::State::kNoFile:
+      throw Failure(kUnreadable, visible(path) + ": " + obstacle_to_opening(path));
+    case FileLock::State::kRefused:
+      throw Failure(kCannotWrite,
+                    visible(path) + ": it cannot be locked: " + lock->error().message() +
+                        "; --no-lock changes it without a lock, when no other program does");
   }
 }
 

@@ -3,10 +3,12 @@
 
 #include <cstdint>
 #include <functional>
+#include <optional>
 #include <string>
 #include <system_error>
 
 #include "failure.h"
+#include "platform.h"
 #include "temp_file.h"
 #include "tevpf.hpp"
 
@@ -36,6 +38,9 @@ struct Target {
   std::string path;
   bool is_locked = true;
 };
+
+// Waits for the lock of a file and holds it as long as `lock` lives.
+void take_lock(const std::string& path, std::optional<FileLock>& lock);
 
 enum class Missing { kRefused, kMade };
 

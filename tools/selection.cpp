@@ -69,24 +69,25 @@ void cut(std::vector<std::size_t>& rows, const Arguments& arguments) {
   rows.erase(rows.begin(), rows.begin() + static_cast<std::ptrdiff_t>(skipped));
 }
 
-std::vector<std::size_t> rows_that_match(const tevpf::File& file, const tevpf::Table& table,
+std::vector<std::size_t> rows_that_match(tevpf::File& file, const tevpf::Element& element,
                                          const Arguments& arguments) {
-  if (arguments.where) return rows_where(file, table, *arguments.where);
-  std::vector<std::size_t> rows(table.size());
+  if (arguments.where) return rows_where(file, element, *arguments.where);
+  std::vector<std::size_t> rows(file.table(element.name).size());
   std::iota(rows.begin(), rows.end(), std::size_t{0});
   return rows;
 }
 
 }  // namespace
 
-Selection select(const tevpf::File& file, const tevpf::Table& table, const Arguments& arguments) {
+Selection select(tevpf::File& file, const tevpf::Element& element, const Arguments& arguments) {
+  const tevpf::Table table = file.table(element.name);
   const Columns all(file, table);
   const std::vector<std::size_t> columns = chosen_columns(all, arguments.columns);
   std::vector<SortKey> keys;
   for (const std::string& name : split_names(all, arguments.sort)) {
     keys.push_back(sort_key(all, name));
   }
-  std::vector<std::size_t> rows = rows_that_match(file, table, arguments);
+  std::vector<std::size_t> rows = rows_that_match(file, element, arguments);
   sort_rows(rows, table, keys);
   cut(rows, arguments);
   if (arguments.limit) {
@@ -95,15 +96,18 @@ Selection select(const tevpf::File& file, const tevpf::Table& table, const Argum
   return {all, columns, rows};
 }
 
-std::vector<std::size_t> rows_to_change(const tevpf::File& file, const tevpf::Table& table,
+std::vector<std::size_t> rows_to_change(tevpf::File& file, const tevpf::Element& element,
                                         const Arguments& arguments) {
   if (!arguments.where && arguments.from == 0 && arguments.to == 0 && !arguments.all) {
     throw Failure(kUsage,
                   "which rows is not said: --where chooses them by a condition, --from and "
                   "--to by their numbers, --all takes all");
   }
-  std::vector<std::size_t> rows = rows_that_match(file, table, arguments);
-  cut(rows, arguments);
+  std::vector<std::size_t> rows = rows_that_match(file, element, arguments);
+  const auto is_outside = [&](std::size_t row) {
+    return row + 1 < arguments.from || (arguments.to != 0 && row >= arguments.to);
+  };
+  std::erase_if(rows, is_outside);
   return rows;
 }
 

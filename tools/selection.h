@@ -17,11 +17,11 @@ struct Selection {
 };
 
 // By --columns, --where, --sort, --from, --to and --limit, in this order.
-Selection select(const tevpf::File& file, const tevpf::Table& table, const Arguments& arguments);
+Selection select(tevpf::File& file, const tevpf::Element& element, const Arguments& arguments);
 
-// The rows that --where, or --from and --to, choose to be changed. Without any of them, --all is
-// needed: a forgotten condition must not empty a table.
-std::vector<std::size_t> rows_to_change(const tevpf::File& file, const tevpf::Table& table,
+// The rows that --where and the numbers --from and --to choose to be changed. Without any of them,
+// --all is needed: a forgotten condition must not empty a table.
+std::vector<std::size_t> rows_to_change(tevpf::File& file, const tevpf::Element& element,
                                         const Arguments& arguments);
 
 }  // namespace tool

@@ -56,10 +56,10 @@ void show_table(Output& output, const tevpf::Table& table, const Selection& sele
   });
 }
 
-void show_rows(Output& output, const tevpf::File& file, const tevpf::Element& element,
+void show_rows(Output& output, tevpf::File& file, const tevpf::Element& element,
                const Arguments& arguments) {
+  const Selection selection = select(file, element, arguments);
   const tevpf::Table table = file.table(element.name);
-  const Selection selection = select(file, table, arguments);
   if (arguments.count) {
     output.write(std::to_string(selection.rows.size()) + "\n");
   } else if (arguments.summary) {
@@ -89,7 +89,7 @@ void show_parameters(Output& output, const tevpf::List& list, const tevpf::Eleme
 }  // namespace
 
 ExitStatus run_show(const Arguments& arguments) {
-  const tevpf::File file = open_to_read(arguments.file);
+  tevpf::File file = open_to_read(arguments.file);
   const tevpf::Element element = find_element(file, arguments.element, arguments.kind());
   Output output({}, file.name());
   if (element.kind == tevpf::Kind::list) {

@@ -10,9 +10,8 @@ ExitStatus run_update(const Arguments& arguments) {
   std::size_t count = 0;
   change_file(arguments.target(), Missing::kRefused, [&](tevpf::File& file) {
     const tevpf::Element element = find_element(file, arguments.element, tevpf::Kind::table);
-    tevpf::Table table = file.table(element.name);
-    const std::vector<std::size_t> rows = rows_to_change(file, table, arguments);
-    update_rows(file, table, rows, arguments.changes);
+    const std::vector<std::size_t> rows = rows_to_change(file, element, arguments);
+    update_rows(file, element, rows, arguments.changes);
     count = rows.size();
   });
   report(arguments.target(), counted(count, "row") + " updated");
