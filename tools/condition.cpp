@@ -11,8 +11,8 @@ namespace {
 
 [[noreturn]] void refuse(const tevpf::File& file, const std::string& expression,
                          const sql::Error& error) {
-  throw Failure(kRefused, visible(file.name()) + ": " + in_quotes(expression) + ": " +
-                              visible(error.what()) + "; nothing was changed");
+  throw Failure(kRefused,
+                visible(file.name()) + ": " + in_quotes(expression) + ": " + visible(error.what()));
 }
 
 }  // namespace
@@ -51,7 +51,7 @@ void update_rows(tevpf::File& file, const tevpf::Element& table,
                      "\nwhere rowid in (select row from temp.chosen_rows)")
         .step();
   } catch (const sql::Error& error) {
-    refuse(file, changes, error);
+    refuse(file, changes, sql::Error(std::string(error.what()) + "; nothing was changed"));
   }
 }
 

@@ -12,12 +12,12 @@ namespace {
 // What parameters and columns have in common, behind their own members.
 template <class Definition>
 void add_definition(JsonObject& json, const Definition& definition) {
+  const tevpf::Column usual("x", definition.type());
   if (const auto& bounds = definition.bounds()) {
-    if (has_min(*bounds)) json.add("min", value_json(bounds->min));
-    if (has_max(*bounds)) json.add("max", value_json(bounds->max));
+    if (bounds->min != usual.bounds()->min) json.add("min", value_json(bounds->min));
+    if (bounds->max != usual.bounds()->max) json.add("max", value_json(bounds->max));
   }
-  const std::int32_t usual = tevpf::Column("x", definition.type()).precision();
-  if (definition.precision() != usual) {
+  if (definition.precision() != usual.precision()) {
     json.add("precision", std::to_string(definition.precision()));
   }
   if (!definition.units().empty()) json.add_text("units", definition.units());

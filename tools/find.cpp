@@ -58,14 +58,16 @@ bool Columns::has(const std::string& name) const {
 }
 
 std::size_t Columns::position_of(const std::string& name) const {
-  std::string names;
+  std::vector<std::string> names;
+  std::string listed;
   for (std::size_t i = 0; i < all_.size(); ++i) {
     if (all_[i].name() == name) return i;
-    if (i > 0) names += ", ";
-    names += visible(all_[i].name());
+    if (i > 0) listed += ", ";
+    listed += visible(all_[i].name());
+    names.push_back(all_[i].name());
   }
   throw Failure(kRefused, table_ + " has no column " + in_quotes(name) + "; it has " +
-                              (names.empty() ? "none" : names));
+                              (listed.empty() ? "none" : listed) + did_you_mean(name, names));
 }
 
 void check_new_name(const std::string& name, const std::string& what) {

@@ -1,6 +1,7 @@
 #include "json_import.h"
 
 #include <algorithm>
+#include <charconv>
 #include <limits>
 #include <nlohmann/json.hpp>
 #include <unordered_map>
@@ -29,7 +30,9 @@ class Part {
   Part of(const Json& json, const std::string& place) const { return {json, place_ + place}; }
 
   [[noreturn]] void fail(const std::string& what) const {
-    throw Failure(kRefused, place_ + ": " + what + "; nothing was imported");
+    const char* const end =
+        what.ends_with('?') ? " Nothing was imported" : "; nothing was imported";
+    throw Failure(kRefused, place_ + ": " + what + end);
   }
 
   bool has(const char* key) const { return json_->contains(key); }
