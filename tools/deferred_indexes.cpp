@@ -10,13 +10,15 @@ DeferredIndexes::DeferredIndexes(tevpf::Table table) : table_(std::move(table)) 
   }
 }
 
-void DeferredIndexes::take_away() {
-  for (tevpf::Column column : columns_) table_.redefine(column.name(), column.indexed(false));
-}
+bool DeferredIndexes::take_away() { return redefine(false); }
 
-bool DeferredIndexes::build() {
+bool DeferredIndexes::build() { return redefine(true); }
+
+bool DeferredIndexes::redefine(bool has_index) {
   try {
-    for (const tevpf::Column& column : columns_) table_.redefine(column.name(), column);
+    for (tevpf::Column column : columns_) {
+      table_.redefine(column.name(), has_index ? column : column.indexed(false));
+    }
     return true;
   } catch (const tevpf::Error&) {
     return false;

@@ -86,7 +86,7 @@ class Import {
 }  // namespace
 
 ExitStatus run_import(const Arguments& arguments) {
-  check_new_name(arguments.element, "the table's name");
+  check_new_name(arguments.element, arguments.list ? "the list's name" : "the table's name");
   const std::string done = Import(arguments).run();
   try {
     print(done + "\n");

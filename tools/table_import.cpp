@@ -59,7 +59,7 @@ class RowImport {
     };
     std::size_t count = 0;
     for (CsvRecord record; header_.next(reader_, record, options_); ++count) {
-      if (may_defer && count == defer_at) deferred.take_away();
+      if (may_defer && count == defer_at && !deferred.take_away()) throw IndexesRefused{};
       add(record);
       progress.step(count, share);
     }
