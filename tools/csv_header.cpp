@@ -48,7 +48,8 @@ std::vector<std::string> names_in_text(CsvReader& reader, const ImportOptions& o
   for (const CsvField& field : record.fields) {
     names.emplace_back(field.is_quoted ? field.text : trimmed(field.text));
   }
-  header.has_trailing_delimiter = names.size() > 1 && names.back().empty();
+  header.has_trailing_delimiter =
+      names.size() > 1 && names.back().empty() && !options.shortens_names;
   if (header.has_trailing_delimiter) names.pop_back();
   if (options.shortens_names) {
     shorten_names(names);
@@ -127,6 +128,9 @@ bool are_empty(const CsvRecord& record, std::size_t from) {
 std::string advice_for_ragged(const CsvRecord& record, const CsvHeader& header, char delimiter) {
   if (record.fields.size() < header.fields) return "; --fill takes those that it lacks as empty";
   if (are_empty(record, header.fields)) return "; --fill leaves out the empty ones behind them";
+  if (header.has_trailing_delimiter && record.fields.size() == header.fields + 1) {
+    return ": its last column has no name; --shorten-names gives it one";
+  }
   if (header.fields == 1) {
     return "; where lines in front are no CSV, --skip N or --comment TEXT leaves them out";
   }

@@ -42,7 +42,7 @@ void shorten_names(std::vector<std::string>& names) {
   for (std::size_t i = 0; i < names.size(); ++i) {
     if (is_settled[i]) continue;
     const std::string wanted = names[i].empty() ? "column" + std::to_string(i + 1) : names[i];
-    std::string name(cut(wanted, kLongest));
+    std::string name(trimmed(cut(wanted, kLongest)));
     for (std::size_t number = 2; !taken.insert(name).second; ++number) {
       const std::string end = "_" + std::to_string(number);
       name = std::string(cut(wanted, kLongest - end.size())) + end;

@@ -106,7 +106,8 @@ std::string megabytes(std::uintmax_t bytes) {
 }
 
 // Rows are of fixed width: one long text makes all of them long.
-void refuse_waste(const tevpf::Table& table, const Contents& contents, const CsvSource& source) {
+void refuse_waste(const tevpf::Table& table, const Contents& contents, const ImportOptions& options,
+                  const CsvSource& source) {
   constexpr std::uintmax_t kNoMatter = 1'000'000, kTimes = 10;
   const std::uintmax_t bytes = std::uintmax_t{table.row_size()} * contents.rows;
   if (bytes <= kNoMatter || bytes / kTimes <= contents.bytes) return;
@@ -118,6 +119,8 @@ void refuse_waste(const tevpf::Table& table, const Contents& contents, const Csv
                                          };
                                          return bytes_of(a) < bytes_of(b);
                                        });
+  if (options.is_forced || options.widths.find(widest->name()) != nullptr)
+    return;  // as was asked for
   const ColumnShape& shape = contents.shapes[static_cast<std::size_t>(widest - columns.begin())];
   throw Failure(kRefused, source.name() + ", line " + std::to_string(shape.longest_line()) +
                               ": column " + in_quotes(widest->name()) + ": the text has " +
@@ -139,7 +142,7 @@ tevpf::Table make_table_for(tevpf::File& file, const std::string& name, CsvSourc
   for (std::size_t i = 0; i < columns.size(); ++i) {
     table->add_column(column_for(columns[i].name, contents.shapes[i], options, source));
   }
-  if (!options.is_forced) refuse_waste(*table, contents, source);
+  refuse_waste(*table, contents, options, source);
   speak_of_bytes(contents, source);
   return *table;
 }
