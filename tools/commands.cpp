@@ -19,6 +19,7 @@ constexpr Command kCommands[] = {
      "csv:--no-header --shorten-names csv:--missing --fill --decimal-comma --skip --comment "
      "csv:--force csv:--list csv:--table",
      run_import},
+    {"sql", "Run SQL statements over FILE", "FILE [SQL] --with --csv --json", run_sql},
     {"check", "Say whether FILE is in order, or what is wrong and where", "FILE", run_check},
     {"new", "Make an empty FILE", "FILE", run_new},
     {"rm", "Remove a list or a table", "FILE ELEMENT --list --table", run_rm},

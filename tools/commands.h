@@ -13,8 +13,8 @@ namespace tool {
 
 // What the command line said. A command reads the members that its row in the table declares.
 struct Arguments {
-  std::string file, element, parameter, value, new_name, csv, output, sort;
-  std::vector<std::string> columns;
+  std::string file, element, parameter, value, new_name, csv, output, sort, statements;
+  std::vector<std::string> columns, with;
   std::size_t from = 0, to = 0;  // 0: not given
   // Of CSV.
   std::string delimiter, comment;
@@ -22,6 +22,7 @@ struct Arguments {
   std::size_t skip = 0;
   bool no_header = false, fill = false, shorten_names = false, decimal_comma = false, crlf = false;
   bool json = false, names = false, list = false, table = false, force = false;
+  bool as_csv = false;
 
   Kind kind() const {
     return list ? Kind(tevpf::Kind::list) : table ? Kind(tevpf::Kind::table) : Kind();
@@ -49,5 +50,6 @@ ExitStatus run_new(const Arguments& arguments);
 ExitStatus run_rm(const Arguments& arguments);
 ExitStatus run_set(const Arguments& arguments);
 ExitStatus run_show(const Arguments& arguments);
+ExitStatus run_sql(const Arguments& arguments);
 
 }  // namespace tool

@@ -162,7 +162,7 @@ std::size_t import_parameters(tevpf::File& file, const std::string& name, CsvSou
     try {
       list->add(*parameter);
     } catch (const tevpf::Error& error) {
-      parameters.refuse(in_quotes(parameter->name()) + ": " + visible(error.what()));
+      parameters.refuse(visible(error.what()));
     }
   }
   return count;
