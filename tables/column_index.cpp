@@ -115,19 +115,21 @@ template <class Key>
 IndexPlace search_blocks(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
                          const Key& key) noexcept {
   const Values values = values_of(table, column);
-  SequencePlace place;
   if constexpr (Key::kIsNumber) {
     using T = typename Key::Number;
-    place = search_keys(
-        column.index, table.num_rows, [&](std::int32_t slot) { return load<T>(values.of(slot)); },
-        [&](T value, std::int32_t) { return key.is_above(value); });
+    const auto value_of = [&](std::int32_t slot) { return load<T>(values.of(slot)); };
+    const SequencePlace place =
+        search_keys(column.index, table.num_rows, value_of,
+                    [&](T value, std::int32_t) { return key.is_above(value); });
+    return {place,
+            place.position < table.num_rows && key.equals(key_at(column.index, place, value_of))};
   } else {
-    place = search_items(column.index, table.num_rows,
-                         [&](std::int32_t slot) { return key.is_above(values.of(slot)); });
+    const SequencePlace place = search_items(column.index, table.num_rows, [&](std::int32_t slot) {
+      return key.is_above(values.of(slot));
+    });
+    return {place,
+            place.position < table.num_rows && key.equals(values.of(column.index.at(place)))};
   }
-  const bool found =
-      place.position < table.num_rows && key.equals(values.of(column.index.at(place.position)));
-  return {place, found};
 }
 
 // Searches all entries. Reals in blocks are looked up probe by probe.
@@ -382,7 +384,7 @@ SequencePlace entry_of(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
   const IndexPlace first = search_index(table, column, value);
   if (first.found) {
     const std::int32_t at = first.place.position;
-    if (column.index.at(at) == slot) return first.place;
+    if (column.index.at(first.place) == slot) return first.place;
     const std::int32_t end = std::min(table.num_rows, at + kNear);
     for (std::int32_t next = at + 1; next < end; ++next) {
       if (column.index.at(next) == slot) return column.index.place_at(next);

@@ -188,9 +188,12 @@ SequencePlace SequenceBlocks::locate(std::int32_t position) const noexcept {
 }
 
 std::int32_t SequenceBlocks::read_elsewhere(std::int32_t position) noexcept {
-  const SequencePlace place = locate(position);
+  return read(locate(position));
+}
+
+std::int32_t SequenceBlocks::read(const SequencePlace& place) noexcept {
   SequenceGroup& group = *groups[place.group];
-  hint = {position - place.offset, group.chunk(place.block), &group, place.block};
+  hint = {place.position - place.offset, group.chunk(place.block), &group, place.block};
   return hint.chunk[place.offset];
 }
 

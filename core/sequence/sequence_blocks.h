@@ -158,6 +158,7 @@ struct SequenceBlocks {
     if (offset >= static_cast<std::uint32_t>(hint.chunk.count)) return read_elsewhere(position);
     return hint.chunk[static_cast<std::int32_t>(offset)];
   }
+  std::int32_t read(const SequencePlace& place) noexcept;
   std::int32_t read_elsewhere(std::int32_t position) noexcept;
   void forget_hint() noexcept { hint.chunk.count = 0; }
 

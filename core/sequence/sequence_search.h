@@ -100,8 +100,8 @@ struct KeyProbes {
     const SequenceChunk chunk = group.chunk(b);
     const Key* const keys = keys_of_block(blocks, group, b, key_of);
     if (keys == nullptr) return count_less_in(chunk);
-    prefetch(chunk.items, chunk.count);  // whoever searches will read or insert an item
     prefetch(keys, chunk.count);
+    prefetch(chunk.items, chunk.count);  // whoever searches will read or insert an item
     return count_less(chunk.count, [&](std::int32_t i) { return less(keys[i], chunk[i]); });
   }
   std::int32_t count_less_in(const SequenceChunk& chunk) const noexcept {
@@ -144,6 +144,17 @@ SequencePlace search_keys(const Sequence& sequence, std::int32_t count, KeyOf ke
   using Probes = KeyProbes<KeyOf, Less>;
   if (sequence.blocks != nullptr) sequence.blocks->expect_keys(sizeof(typename Probes::Key));
   return search_sequence(sequence, count, Probes{key_of, less});
+}
+
+// The key of the item at a place where a search has ended; not the end of the sequence.
+template <class KeyOf>
+auto key_at(const Sequence& sequence, const SequencePlace& place, KeyOf key_of) noexcept {
+  using Key = decltype(key_of(place.position));
+  if (sequence.blocks != nullptr && sequence.blocks->key_size == std::int32_t{sizeof(Key)}) {
+    const SequenceBlock& block = sequence.blocks->groups[place.group]->block[place.block];
+    if (block.keys != nullptr) return static_cast<const Key*>(block.keys)[place.offset];
+  }
+  return key_of(sequence.at(place));
 }
 
 // The key of the item at a position, for searches with probes of their own.
