@@ -264,6 +264,13 @@ bool some_neighbours(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
   });
 }
 
+// Search keys belong to a flat index. Blocks made of it continue to use them.
+void pass_on_search_keys(TEVPF_COLUMN& column) noexcept {
+  if (column.index.blocks == nullptr || column.keys.values == nullptr) return;
+  column.index.blocks->adopt_keys(column.keys.values, value_type(column.def.type).size);
+  column.keys = {};
+}
+
 // The value as the key that blocks keep for it; null for texts, for which blocks keep no keys.
 const void* key_of_value(const TEVPF_COLUMN& column, const void* value) noexcept {
   return column.def.type == PF_TYPE_STRING ? nullptr : value;
@@ -276,7 +283,11 @@ const void* key_of_value(const TEVPF_COLUMN& column, const void* value) noexcept
 bool build_index(const TEVPF_TABLE& table, const TEVPF_COLUMN& column, std::int64_t room,
                  NewIndex& out) noexcept {
   if (!make_block(table.num_rows, room, out)) return false;
-  return !out.entries || sort_rows(table, column, out.entries.get());
+  if (!out.entries) return true;
+  out.keys = new_search_keys(column, table.num_rows);
+  if (!sort_rows(table, column, out.entries.get(), out.keys.get())) return false;
+  if (out.keys) add_fences(column, table.num_rows, out.keys.get());
+  return true;
 }
 
 void sort_from_now_on(const TEVPF_TABLE& table, const TEVPF_COLUMN& column) noexcept {
@@ -298,6 +309,7 @@ bool copy_index(const TEVPF_COLUMN& column, std::int32_t count, NewIndex& out) n
 void adopt_index(TEVPF_COLUMN& column, NewIndex index) noexcept {
   drop_search_keys(column);
   column.index.adopt(std::move(index.entries), index.room);
+  column.keys.values = index.keys.release();
 }
 
 void release_index(TEVPF_COLUMN& column) noexcept {
@@ -365,6 +377,7 @@ IndexPlace find_in_index(const TEVPF_TABLE& table, TEVPF_COLUMN& column, std::in
                     const ValuesOfIndex values = entries_of(table, column);
                     if constexpr (Key::kTotalOrder) {
                       const IndexPlace whole = search_all(table, column, prepared);
+                      if (whole.found) (void)column.index.at(whole.place);  // its row is read next
                       if (whole.place.position >= first) return whole;
                       return {{first}, prepared.equals(values.at(first))};
                     } else {
@@ -395,6 +408,26 @@ SequencePlace entry_of(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
 }
 
 // ---- Entries ------------------------------------------------------------------------------------
+
+bool ready_to_insert_entry(const TEVPF_TABLE& table, TEVPF_COLUMN& column,
+                           const SequencePlace& place, std::int32_t slot) noexcept {
+  if (!column.index.make_ready_to_insert(table.num_rows, place.position, slot)) return false;
+  pass_on_search_keys(column);
+  return true;
+}
+
+bool ready_to_erase_entry(const TEVPF_TABLE& table, TEVPF_COLUMN& column,
+                          const SequencePlace& place) noexcept {
+  if (!column.index.make_ready_to_erase(table.num_rows, place.position)) return false;
+  pass_on_search_keys(column);
+  return true;
+}
+
+bool ready_to_move_entry(const TEVPF_TABLE& table, TEVPF_COLUMN& column, EntryMove move) noexcept {
+  if (!column.index.make_ready_to_move(table.num_rows, move.from, move.to)) return false;
+  pass_on_search_keys(column);
+  return true;
+}
 
 void insert_entry(const TEVPF_TABLE& table, TEVPF_COLUMN& column, SequencePlace place,
                   std::int32_t slot, const void* value) noexcept {

@@ -109,7 +109,7 @@ bool prepare_entries(TEVPF_TABLE& table, const unsigned char* row, const Inserti
     const bool is_known = is_unique(column) && known < points.count;
     places[i] =
         is_known ? points.place[known++] : search_index(table, column, row + column.offset).place;
-    if (!column.index.make_ready_to_insert(table.num_rows, places[i].position, slot)) return false;
+    if (!ready_to_insert_entry(table, column, places[i], slot)) return false;
   }
   return true;
 }
@@ -163,8 +163,7 @@ TEVPF_STATUS delete_row(TEVPF_TABLE& table, std::int32_t slot, std::int32_t row_
   find_entries(table, slot, places);
   for (std::int32_t i = 0; i < table.num_cols; ++i) {
     TEVPF_COLUMN& column = table.col_array[i];
-    if (is_indexed(column) &&
-        !column.index.make_ready_to_erase(table.num_rows, places[i].position)) {
+    if (is_indexed(column) && !ready_to_erase_entry(table, column, places[i])) {
       return fail_empty(PF_NOMEM);
     }
   }
@@ -191,7 +190,7 @@ bool prepare_move(const TEVPF_TABLE& table, TEVPF_COLUMN& column, std::int32_t s
                   const unsigned char* row, EntryMove& move) noexcept {
   move.from = entry_of(table, column, slot).position;
   move.to = search_others(table, column, move.from, row + column.offset).place.position;
-  return column.index.make_ready_to_move(table.num_rows, move.from, move.to);
+  return ready_to_move_entry(table, column, move);
 }
 
 // A moved row leaves its place in every index and is reinserted before the rows of equal value,

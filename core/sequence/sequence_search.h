@@ -22,7 +22,7 @@ namespace tevpf {
 inline constexpr std::int32_t kSearchesPerGathering = 2;
 #else
 // Gathering the keys of a block costs about as much as this many searches without them.
-inline constexpr std::int32_t kSearchesPerGathering = 4;
+inline constexpr std::int32_t kSearchesPerGathering = 1;
 #endif
 
 // Probes that reach values through the items.
@@ -30,10 +30,15 @@ template <class Less>
 struct ItemProbes {
   Less less;
 
+  void get_ready(SequenceBlocks&) const noexcept {}
+  bool is_group_less(const SequenceBlocks& blocks, std::int32_t g) const noexcept {
+    const SequenceGroup& group = *blocks.groups[g];
+    return less(group.last[group.count - 1]);
+  }
+  void get_ready(SequenceGroup&) const noexcept {}
   bool is_last_less(const SequenceGroup& group, std::int32_t b) const noexcept {
     return less(group.last[b]);
   }
-  void get_ready(SequenceGroup&) const noexcept {}
   std::int32_t count_less_in(SequenceBlocks&, SequenceGroup& group, std::int32_t b) const noexcept {
     return count_less_in(group.chunk(b));
   }
@@ -79,20 +84,38 @@ struct KeyProbes {
 
   bool is_item_less(std::int32_t item) const noexcept { return less(key_of(item), item); }
 
-  bool is_last_less(const SequenceGroup& group, std::int32_t b) const noexcept {
-    if (!group.has_last_keys) return is_item_less(group.last[b]);
+  static Key load(const std::uint64_t& from) noexcept {
     Key key;
-    std::memcpy(&key, &group.last_key[b], sizeof key);
-    return less(key, group.last[b]);
+    std::memcpy(&key, &from, sizeof key);
+    return key;
+  }
+  static void store(std::uint64_t& to, Key key) noexcept { std::memcpy(&to, &key, sizeof key); }
+
+  void get_ready(SequenceBlocks& blocks) const noexcept {
+    if (blocks.has_top_keys) return;
+    for (std::int32_t g = 0; g < blocks.num_groups; ++g) {
+      const SequenceGroup& group = *blocks.groups[g];
+      const std::int32_t b = group.count - 1;
+      store(blocks.top_keys[g],
+            group.has_last_keys ? load(group.last_key[b]) : key_of(group.last[b]));
+    }
+    blocks.has_top_keys = true;
+  }
+  bool is_group_less(const SequenceBlocks& blocks, std::int32_t g) const noexcept {
+    const SequenceGroup& group = *blocks.groups[g];
+    return less(load(blocks.top_keys[g]), group.last[group.count - 1]);
   }
 
   void get_ready(SequenceGroup& group) const noexcept {
-    if (group.has_last_keys || ++group.heat < kSearchesPerGathering) return;
+    prefetch(group.last_key, kGroupRoom);
+    if (group.has_last_keys) return;
     for (std::int32_t b = 0; b < group.count; ++b) {
-      const Key key = key_of(group.last[b]);
-      std::memcpy(&group.last_key[b], &key, sizeof key);
+      store(group.last_key[b], key_of(group.last[b]));
     }
     group.has_last_keys = true;
+  }
+  bool is_last_less(const SequenceGroup& group, std::int32_t b) const noexcept {
+    return less(load(group.last_key[b]), group.last[b]);
   }
 
   std::int32_t count_less_in(SequenceBlocks& blocks, SequenceGroup& group,
@@ -116,10 +139,9 @@ SequencePlace search_sequence(const Sequence& sequence, std::int32_t count,
   if (sequence.blocks == nullptr) return {probes.count_less_in(sequence.chunk_at(count, 0))};
   SequenceBlocks& blocks = *sequence.blocks;
   // The last group, and the last block, are not compared: what is not in an earlier one is there.
-  const std::int32_t g = count_less(blocks.num_groups - 1, [&](std::int32_t i) {
-    const SequenceGroup& some = *blocks.groups[i];
-    return probes.is_last_less(some, some.count - 1);
-  });
+  probes.get_ready(blocks);
+  const std::int32_t g = count_less(
+      blocks.num_groups - 1, [&](std::int32_t i) { return probes.is_group_less(blocks, i); });
   SequenceGroup& group = *blocks.groups[g];
   probes.get_ready(group);
   const std::int32_t b =
