@@ -264,9 +264,10 @@ bool some_neighbours(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
   });
 }
 
-// Search keys belong to a flat index. Blocks made of it continue to use them.
+// Search keys belong to a flat index. Blocks made of an index of integers continue to use them.
 void pass_on_search_keys(TEVPF_COLUMN& column) noexcept {
   if (column.index.blocks == nullptr || column.keys.values == nullptr) return;
+  if (is_floating_type(column.def.type)) return;
   column.index.blocks->adopt_keys(column.keys.values, value_type(column.def.type).size);
   column.keys = {};
 }
@@ -387,6 +388,47 @@ IndexPlace find_in_index(const TEVPF_TABLE& table, TEVPF_COLUMN& column, std::in
                       return {{first + found.position}, found.equal};
                     }
                   });
+}
+
+// Smaller tables fit the cache.
+#ifdef TEVPF_TEST_HOOKS
+constexpr std::int32_t kRowsWorthFetching = 0;
+#else
+constexpr std::int32_t kRowsWorthFetching = 50'000;
+#endif
+
+void fetch_places(const TEVPF_TABLE& table, const unsigned char* row) noexcept {
+  constexpr std::int32_t kMost = 4;
+  if (table.num_rows < kRowsWorthFetching) return;
+  const TEVPF_COLUMN* columns[kMost];
+  SearchAhead searches[kMost];
+  std::int32_t count = 0;
+  for (std::int32_t i = 0; i < table.num_cols && count < kMost; ++i) {
+    const TEVPF_COLUMN& column = table.col_array[i];
+    const bool has_keys = is_indexed(column) && column.index.blocks != nullptr &&
+                          is_number_type(column.def.type) && !is_floating_type(column.def.type);
+    if (has_keys) columns[count++] = &column;
+  }
+  if (count < 2) return;
+  const auto for_each = [&](auto step) {
+    for (std::int32_t i = 0; i < count; ++i) {
+      const TEVPF_COLUMN& column = *columns[i];
+      with_number(column.def.type, [&](auto tag) {
+        using T = decltype(tag);
+        const NumberKey<T> key(row + column.offset, column.tolerance);
+        step(searches[i], *column.index.blocks, tag, [&](T value) { return key.is_above(value); });
+      });
+    }
+  };
+  for_each([](SearchAhead& search, const SequenceBlocks& blocks, auto tag, auto is_less) {
+    search.fetch_group<decltype(tag)>(blocks, is_less);
+  });
+  for_each([](SearchAhead& search, const SequenceBlocks&, auto tag, auto is_less) {
+    search.fetch_block<decltype(tag)>(is_less);
+  });
+  for_each([](SearchAhead& search, const SequenceBlocks&, auto tag, auto) {
+    search.fetch_keys<decltype(tag)>();
+  });
 }
 
 // An entry is among those of equal value, usually near the first. Where many are equal, or values

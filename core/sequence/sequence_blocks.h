@@ -15,7 +15,7 @@ namespace tevpf {
 inline constexpr std::int32_t kBlockRoom = 4;  // small sequences too have many blocks and groups
 inline constexpr std::int32_t kGroupRoom = 4;
 #else
-inline constexpr std::int32_t kBlockRoom = 64;
+inline constexpr std::int32_t kBlockRoom = 128;
 inline constexpr std::int32_t kGroupRoom = 64;
 #endif
 

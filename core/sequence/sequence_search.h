@@ -22,7 +22,7 @@ namespace tevpf {
 inline constexpr std::int32_t kSearchesPerGathering = 2;
 #else
 // Gathering the keys of a block costs about as much as this many searches without them.
-inline constexpr std::int32_t kSearchesPerGathering = 1;
+inline constexpr std::int32_t kSearchesPerGathering = 2;
 #endif
 
 // Probes that reach values through the items.
@@ -130,6 +130,49 @@ struct KeyProbes {
   std::int32_t count_less_in(const SequenceChunk& chunk) const noexcept {
     return count_less(chunk.count, [&](std::int32_t i) { return is_item_less(chunk[i]); });
   }
+};
+
+// Requests the cache lines that search_keys will read, as far as keys have been gathered. Whoever is
+// going to search several sequences takes each step for all of them before the next one, so that
+// their cache misses overlap. is_less(key) as in search_keys, without the item.
+class SearchAhead {
+ public:
+  template <class Key, class IsLess>
+  void fetch_group(const SequenceBlocks& blocks, IsLess is_less) noexcept {
+    group_ = nullptr;
+    if (!blocks.has_top_keys || blocks.key_size != std::int32_t{sizeof(Key)}) return;
+    group_ = blocks.groups[count_in<Key>(blocks.top_keys, blocks.num_groups - 1, is_less)];
+    __builtin_prefetch(group_);
+    prefetch(group_->last_key, kGroupRoom);
+  }
+  template <class Key, class IsLess>
+  void fetch_block(IsLess is_less) noexcept {
+    if (group_ != nullptr && !group_->has_last_keys) group_ = nullptr;
+    if (group_ == nullptr) return;
+    block_ = &group_->block[count_in<Key>(group_->last_key, group_->count - 1, is_less)];
+    __builtin_prefetch(block_);
+    prefetch(group_->start, kGroupRoom + 1);  // for the insertion
+  }
+  template <class Key>
+  void fetch_keys() const noexcept {
+    if (group_ == nullptr) return;
+    prefetch(static_cast<const Key*>(block_->keys), kBlockRoom);
+    prefetch(block_->items, kBlockRoom);
+  }
+
+ private:
+  template <class Key, class IsLess>
+  static std::int32_t count_in(const std::uint64_t* keys, std::int32_t count,
+                               IsLess is_less) noexcept {
+    return count_less(count, [&](std::int32_t i) {
+      Key key;
+      std::memcpy(&key, keys + i, sizeof key);
+      return is_less(key);
+    });
+  }
+
+  const SequenceGroup* group_ = nullptr;
+  const SequenceBlock* block_ = nullptr;
 };
 
 template <class Probes>
