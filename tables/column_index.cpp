@@ -184,6 +184,18 @@ Found search_along_keys(const unsigned char* keys, std::int32_t first, std::int3
   }
 }
 
+// The same for a column of any number type whose index is flat.
+IndexPlace search_with_keys(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
+                            const unsigned char* keys, std::int32_t first,
+                            const void* key) noexcept {
+  return with_number(column.def.type, [&](auto tag) -> IndexPlace {
+    const NumberKey<decltype(tag)> prepared(key, column.tolerance);
+    const Found found =
+        search_along_keys(keys, first, table.num_rows, column.index.items, prepared);
+    return {{found.position}, found.equal};
+  });
+}
+
 // The column that TEV8R1_sort_comp compares by: the one whose index was built last.
 struct SortContext {
   Values values;
@@ -335,6 +347,9 @@ bool has_equal_neighbours(const TEVPF_TABLE& table, const std::int32_t* entries,
 IndexPlace search_index(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
                         const void* key) noexcept {
   if (table.num_rows < 1) return {{0}, false};
+  if (column.index.items != nullptr && column.keys.values != nullptr) {
+    return search_with_keys(table, column, column.keys.values, 0, key);
+  }
   return with_key(column.def.type, column.tolerance, key, readable_bytes(table, column),
                   [&](const auto& prepared) { return search_all(table, column, prepared); });
 }
@@ -366,11 +381,7 @@ IndexPlace find_in_index(const TEVPF_TABLE& table, TEVPF_COLUMN& column, std::in
   if (entries != nullptr && column.def.type != PF_TYPE_STRING) {
     count_search(column, kRowsPerSearch);
     if (const unsigned char* const keys = search_keys(table, column, entries)) {
-      return with_number(column.def.type, [&](auto tag) -> IndexPlace {
-        const NumberKey<decltype(tag)> prepared(key, column.tolerance);
-        const Found found = search_along_keys(keys, first, count, entries, prepared);
-        return {{found.position}, found.equal};
-      });
+      return search_with_keys(table, column, keys, first, key);
     }
   }
   return with_key(column.def.type, column.tolerance, key, readable_bytes(table, column),
