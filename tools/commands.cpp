@@ -38,9 +38,13 @@ constexpr Command kCommands[] = {
     {"merge", "Add the lists and tables of another file to FILE",
      "FILE OTHER --on-conflict --no-lock", run_merge},
     {"export", "Write a list or a table as CSV, or everything as JSON",
-     "FILE [ELEMENT] -o --json --list --table", run_export},
-    {"import", "Add the rows of a CSV file to a table, or what a JSON file holds to FILE",
-     "FILE [TABLE] [CSV] --on-conflict --no-lock", run_import},
+     "FILE [ELEMENT] -o --json --columns --delimiter --no-header --missing --crlf --list --table",
+     run_export},
+    {"import", "Add a CSV file to a table or a list, or what a JSON file holds to FILE",
+     "FILE [ELEMENT] [CSV] csv:--columns csv:--types csv:--width csv:--default --delimiter "
+     "csv:--no-header --shorten-names csv:--missing --fill --decimal-comma --skip --comment "
+     "csv:--force csv:--list csv:--table --on-conflict --no-lock",
+     run_import},
     {"dump", "Write the text dump of FILE, or of one element",
      "FILE [ELEMENT] -o --list --table --force", run_dump},
     {"sql", "Run SQL statements over FILE", "FILE [SQL] --with --csv --json --no-lock", run_sql},

@@ -23,6 +23,11 @@ struct Arguments : DefinitionOptions, PlaceOptions {
   std::vector<std::string> columns, sort, cells, with;
   std::size_t from = 0, to = 0;  // 0: not given
   std::optional<std::int32_t> limit;
+  // Of CSV.
+  std::string delimiter, comment;
+  std::vector<std::string> missing, types, widths, defaults;
+  std::size_t skip = 0;
+  bool no_header = false, fill = false, shorten_names = false, decimal_comma = false, crlf = false;
   bool json = false, names = false, list = false, table = false, force = false;
   bool as_csv = false;
   bool count = false, summary = false, wide = false, all = false, no_lock = false;

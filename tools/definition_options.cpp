@@ -81,7 +81,7 @@ void keep_texts(Definition& definition, const Definition& before) {
 
 }  // namespace
 
-Type type_named(const std::string& word) {
+Type required_type(const std::string& word) {
   for (const TypeName& name : kTypeNames) {
     if (word == name.word) return name.type;
   }
@@ -93,7 +93,7 @@ tevpf::Parameter define_parameter(const std::string& name, const tevpf::Paramete
                                   const std::optional<std::string>& value,
                                   const DefinitionOptions& options, const Subject& subject) {
   const std::string text = value ? *value : exact_text(before->value());
-  const Type type = options.type        ? type_named(*options.type)
+  const Type type = options.type        ? required_type(*options.type)
                     : before != nullptr ? before->type()
                                         : guess_type(text);
   const bool keeps_type = before != nullptr && before->type() == type;
@@ -117,7 +117,7 @@ tevpf::Column define_column(const std::string& name, const tevpf::Column* before
   if (!options.type && before == nullptr) {
     subject.refuse("a new column needs --type: integer, short, real, double or string");
   }
-  const Type type = options.type ? type_named(*options.type) : before->type();
+  const Type type = options.type ? required_type(*options.type) : before->type();
   const bool keeps_type = before != nullptr && before->type() == type;
   if (type == Type::string && !keeps_type && !options.width) {
     subject.refuse("a string column needs --width, the bytes of its longest text");

@@ -35,7 +35,7 @@ struct Subject {
 };
 
 // The type that a word names: those of the library's messages, or the usual ones of programs.
-Type type_named(const std::string& word);
+Type required_type(const std::string& word);
 
 // The definition of a parameter. `before`: the one that is changed, none for a new one, which needs
 // a value. Texts of numbers are read as the parameter's type, which is guessed when it is not given.

@@ -24,15 +24,6 @@ void add_definition(JsonObject& json, const Definition& definition) {
   if (!definition.description().empty()) json.add_text("description", definition.description());
 }
 
-bool is_utf8(std::string_view text) {
-  while (!text.empty()) {
-    const std::size_t size = character_size(text);
-    if (size == 0) return false;
-    text.remove_prefix(size);
-  }
-  return true;
-}
-
 // Writes rows as objects, or as arrays when a column's name cannot be a key.
 class RowWriter {
  public:

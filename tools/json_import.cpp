@@ -143,7 +143,7 @@ Value value_of(const Part& part, const Definition& definition) {
 Type type_of(const Part& part) {
   const std::string word = part["type"].text("type");
   try {
-    return type_named(word);
+    return required_type(word);
   } catch (const Failure&) {
     part.fail("there is no type " + in_quotes(word) +
               "; choose integer, short, real, double or string");

@@ -35,7 +35,8 @@ _tevpf() {
     case ${COMP_WORDS[i]} in
       -o | --output | --columns | --sort | --where | --from | --to | --limit | --type | --width | \
         --units | --min | --max | --precision | --description | --default | --before | --after | \
-        --position | --on-conflict | --with) ((++i)) ;;
+        --position | --on-conflict | --with | --delimiter | --types | --missing | --skip | \
+        --comment) ((++i)) ;;
       -*) ;;
       *)
         ((++position))
@@ -48,6 +49,7 @@ _tevpf() {
   case $previous in
     -o | --output | --with) _tevpf_files "$word"; return ;;
     --to) [[ $command == cp ]] && _tevpf_files "$word"; return ;;
+    --delimiter) mapfile -t COMPREPLY < <(compgen -W "comma semicolon tab" -- "$word"); return ;;
     --type) mapfile -t COMPREPLY < <(compgen -W "integer short real double string" -- "$word"); return ;;
     --on-conflict) mapfile -t COMPREPLY < <(compgen -W "refuse rename replace skip" -- "$word"); return ;;
     --columns | --sort | --before | --after)
@@ -55,7 +57,7 @@ _tevpf() {
       return
       ;;
     --where | --from | --limit | --width | --units | --min | --max | --precision | --description | \
-      --default | --position) return ;;
+      --default | --position | --types | --missing | --skip | --comment) return ;;
   esac
   if [[ $word == -* ]]; then
     mapfile -t COMPREPLY < <(compgen -W "$(tevpf "$command" --help 2>/dev/null |

@@ -32,13 +32,13 @@ std::size_t distance(std::string_view a, std::string_view b) {
 
 bool is_continuation(char byte) { return (static_cast<unsigned char>(byte) & 0xC0) == 0x80; }
 
-// Bytes of the printable UTF-8 sequence at the front of a text, 0 when there is none.
+// Bytes of the UTF-8 character at the front of a text, 0 when there is none that may be shown: control
+// characters are those of ASCII and U+0080 to U+009F.
 std::size_t printable_sequence(std::string_view text) {
-  const std::size_t size = character_size(text);
   const auto lead = static_cast<unsigned char>(text[0]);
-  const bool is_control = lead < 0x20 || lead == 0x7F ||
-                          (size == 2 && lead == 0xC2 && static_cast<unsigned char>(text[1]) < 0xA0);
-  return is_control ? 0 : size;
+  if (lead < 0x20 || lead == 0x7F) return 0;
+  if (lead == 0xC2 && text.size() > 1 && static_cast<unsigned char>(text[1]) < 0xA0) return 0;
+  return character_size(text);
 }
 
 std::string escape(char byte) {
@@ -136,10 +136,28 @@ std::string did_you_mean(std::string_view name, const std::vector<std::string>& 
   return nearest == nullptr ? "" : "; did you mean " + in_quotes(*nearest) + "?";
 }
 
+bool is_utf8(std::string_view text) {
+  while (!text.empty()) {
+    const std::size_t size = character_size(text);
+    if (size == 0) return false;
+    text.remove_prefix(size);
+  }
+  return true;
+}
+
 std::string_view trimmed(std::string_view text) {
   const std::size_t first = text.find_first_not_of(" \t");
   if (first == std::string_view::npos) return {};
   return text.substr(first, text.find_last_not_of(" \t") - first + 1);
+}
+
+std::string_view cut(std::string_view text, std::size_t size) {
+  constexpr std::size_t kLongestCharacter = 4;
+  if (text.size() <= size) return text;
+  std::size_t end = size;
+  while (end > 0 && size - end < kLongestCharacter && is_continuation(text[end])) --end;
+  // A text that is no UTF-8 is cut anywhere.
+  return text.substr(0, is_continuation(text[end]) ? size : end);
 }
 
 std::string counted(std::uintmax_t count, std::string_view noun) {

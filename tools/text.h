@@ -27,7 +27,12 @@ std::size_t display_width(std::string_view text);
 // The front of a visible text, so many characters of it.
 std::string_view first_characters(std::string_view text, std::size_t count);
 
+bool is_utf8(std::string_view text);
+
 std::string_view trimmed(std::string_view text);  // without blanks and tabs at both ends
+
+// The front of a text that has `size` bytes at most and ends with a whole character of UTF-8.
+std::string_view cut(std::string_view text, std::size_t size);
 
 // "1 row", "2 rows".
 std::string counted(std::uintmax_t count, std::string_view noun);

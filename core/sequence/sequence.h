@@ -46,6 +46,12 @@ struct Sequence {
     return blocks == nullptr ? position : blocks->read(position);
   }
 
+  // The item at a place. Makes the next reads of positions around it cheap.
+  std::int32_t at(const SequencePlace& place) const noexcept {
+    if (place.group < 0) return at(place.position);
+    return blocks->read(place);
+  }
+
   // The longest chunk that starts at a position, 0 .. count - 1. Valid until the next change.
   SequenceChunk chunk_at(std::int32_t count, std::int32_t position) const noexcept;
 
