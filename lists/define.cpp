@@ -17,8 +17,8 @@
 namespace tevpf {
 namespace {
 
-// A full list gets the documented number of spare slots; the count does not depend on how many slots
-// are allocated.
+// A full list gets the documented number of spare slots; the count does not depend on how many
+// slots are allocated.
 TEVPF_STATUS ensure_free_slot(TEVPF_LIST& list) noexcept {
   if (list.free_params > 0) return PF_NORMAL;
   const std::int32_t increment = library.alloc_increment;

@@ -1,5 +1,5 @@
-// The start of operations that read or change parameters where they are: find the list in the current
-// file by name, then find its parameter.
+// The start of operations that read or change parameters where they are: find the list in the
+// current file by name, then find its parameter.
 #pragma once
 
 #include "core/base/status.h"

@@ -1,12 +1,13 @@
 // The records of lists and their parameters, and operations on whole records: release and copy.
 //
-// Terms. A slot is a place in the parameter block; a parameter keeps its slot as long as it is in the
-// list. A position counts parameters as the list presents them. A place counts them in name order.
+// Terms. A slot is a place in the parameter block; a parameter keeps its slot as long as it is in
+// the list. A position counts parameters as the list presents them. A place counts them in name
+// order.
 //
-// Invariants: the name index holds each parameter's slot once, ordered by name; no two names compare
-// equal; header.btf = 12 + the stored sizes of all parameters; for strings, length is the length of
-// value; description and string value lie in the list's text block, or are blocks that the record
-// owns.
+// Invariants: the name index holds each parameter's slot once, ordered by name; no two names
+// compare equal; header.btf = 12 + the stored sizes of all parameters; for strings, length is the
+// length of value; description and string value lie in the list's text block, or are blocks that
+// the record owns.
 //
 // A list is settled when its parameters are in position order, so that slots are positions, and its
 // name index is one array with room for num_params + free_params entries. Outside callers may then

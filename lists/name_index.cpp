@@ -105,8 +105,8 @@ void admit(NameIndex& index, const NameField& name) noexcept {
   index.order.blocks->drop_all_keys();
 }
 
-// A key to compare with those of the list, also for a name that does not begin as they do: it is less
-// or greater than all of them, or equal to some, where the names decide.
+// A key to compare with those of the list, also for a name that does not begin as they do: it is
+// less or greater than all of them, or equal to some, where the names decide.
 NameKey wanted_key(const NameIndex& index, const Wanted& wanted) noexcept {
   const std::int32_t length = index.beginning_length;
   const std::int32_t same = std::min(common_length(index.beginning, wanted.field), length);
@@ -131,7 +131,7 @@ NamePlace search_blocks(TEVPF_LIST& list, const Wanted& wanted) noexcept {
       });
   if (!met && !wanted.pattern.prefix) return {place, false};
   const bool found =
-      place.position < count && order_of(param_in(list, order.at(place.position)), wanted) == 0;
+      place.position < count && order_of(param_in(list, order.item_at(place)), wanted) == 0;
   return {place, found};
 }
 
@@ -156,7 +156,7 @@ TEVPF_STATUS find_param(TEVPF_LIST& list, const char* name, std::int32_t& slot) 
     found = look_up(list, pattern);
   } else {
     const NamePlace at = search_all(list, Wanted(name));
-    if (at.found) found = list.index.order.at(at.place.position);
+    if (at.found) found = list.index.order.item_at(at.place);
   }
   if (found < 0) return fail(PF_NOPARAM, name);
   slot = found;
@@ -209,8 +209,8 @@ void insert_name(TEVPF_LIST& list, const SequencePlace& place, std::int32_t slot
   enter_name(list, slot);
 }
 
-void erase_name(TEVPF_LIST& list, const SequencePlace& place) noexcept {
-  remove_name(list, list.index.order.at(place.position));
+void erase_name(TEVPF_LIST& list, const SequencePlace& place, std::int32_t slot) noexcept {
+  remove_name(list, slot);
   list.index.order.erase(list.num_params, place);
   if (list.num_params == 1) list.index.order.clear();
   show_array(list);

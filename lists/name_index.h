@@ -1,5 +1,5 @@
-// The name index of a list: the slots of its parameters, ordered by name. Apart from the reader, the
-// writer and the operations on whole records, only these functions access it.
+// The name index of a list: the slots of its parameters, ordered by name. Apart from the reader,
+// the writer and the operations on whole records, only these functions access it.
 //
 // An index from a file is accepted in any order; searches of it end, stay in bounds and change
 // nothing.
@@ -41,8 +41,8 @@ NamePlace search_others(TEVPF_LIST& list, std::int32_t without, const char* name
 
 // ---- Changes; num_params is the count before them -----------------------------------------------
 
-// Each allocates what the change may need. False when out of memory, and nothing has changed; places
-// stay valid.
+// Each allocates what the change may need. False when out of memory, and nothing has changed;
+// places stay valid.
 [[nodiscard]] bool ready_to_insert_name(TEVPF_LIST& list, std::int32_t place,
                                         std::int32_t slot) noexcept;
 [[nodiscard]] bool ready_to_erase_name(TEVPF_LIST& list, std::int32_t place) noexcept;
@@ -51,8 +51,8 @@ NamePlace search_others(TEVPF_LIST& list, std::int32_t without, const char* name
 
 // Enters the name of the parameter in a slot, whose record is already there.
 void insert_name(TEVPF_LIST& list, const SequencePlace& place, std::int32_t slot) noexcept;
-// Removes the entry at a place; the record is still there.
-void erase_name(TEVPF_LIST& list, const SequencePlace& place) noexcept;
+// Removes the entry of a slot at a place; the record is still there.
+void erase_name(TEVPF_LIST& list, const SequencePlace& place, std::int32_t slot) noexcept;
 // Renames the parameter at place `from`; `to` counts the others.
 void change_name(TEVPF_LIST& list, std::int32_t from, std::int32_t to,
                  const NameField& name) noexcept;

@@ -1,6 +1,6 @@
-// Keys for searches in the name index: eight bytes of a name as a number. Names of a list often begin
-// alike, so the bytes are taken from behind the beginning that all of them have in common. Names in
-// one list with different keys are ordered by their keys.
+// Keys for searches in the name index: eight bytes of a name as a number. Names of a list often
+// begin alike, so the bytes are taken from behind the beginning that all of them have in common.
+// Names in one list with different keys are ordered by their keys.
 #pragma once
 
 #include <algorithm>

@@ -1,6 +1,6 @@
 // Finds parameters by exact name in O(1). The table only speeds up look-ups; the list's sorted name
-// index is authoritative. The table is built after enough look-ups to repay its cost, and then follows
-// the changes of the list. If there is no memory for it, the index is searched.
+// index is authoritative. The table is built after enough look-ups to repay its cost, and then
+// follows the changes of the list. If there is no memory for it, the index is searched.
 #pragma once
 
 #include <cstdint>

@@ -16,9 +16,10 @@ std::int32_t& next_free(TEVPF_PARAM& slot) noexcept { return slot.def.type; }
 
 }  // namespace
 
-std::int32_t find_position(TEVPF_LIST& list, std::int32_t slot) noexcept {
+SequencePlace find_in_order(TEVPF_LIST& list, std::int32_t slot) noexcept {
+  if (is_in_place(list)) return {slot};
   list.slots.order.expect_finding(list.num_params);
-  return list.slots.order.position_of(list.num_params, slot);
+  return list.slots.order.place_of(list.num_params, slot);
 }
 
 bool reserve_params(TEVPF_LIST& list, std::int64_t count) noexcept {
@@ -58,12 +59,10 @@ void insert_param(TEVPF_LIST& list, std::int32_t position, const TEVPF_PARAM& pa
   param_in(list, slot) = param;
 }
 
-void erase_param(TEVPF_LIST& list, std::int32_t position) noexcept {
+void erase_param(TEVPF_LIST& list, const SequencePlace& place, std::int32_t slot) noexcept {
   ParamSlots& slots = list.slots;
   // The last parameter of an identity order: its slot is the next one anyway.
   if (is_in_place(list)) return;
-  const SequencePlace place = slots.order.place_at(position);
-  const std::int32_t slot = slots.order.at(position);
   slots.order.erase(list.num_params, place);
   slots.reads = 0;
   param_in(list, slot) = {};

@@ -1,13 +1,13 @@
 // The parameters of a list. Only param_store knows how they lie in param_ptr.
 //
-// A parameter occupies one slot of the parameter block and stays there, whatever comes, goes or moves
-// around it. The sequence slots.order lists the slots in position order. Slots of deleted parameters
-// are reused.
+// A parameter occupies one slot of the parameter block and stays there, whatever comes, goes or
+// moves around it. The sequence slots.order lists the slots in position order. Slots of deleted
+// parameters are reused.
 //
-// Invariants: the slots in the order and the free slots are 0 .. num_params + num_free - 1, each once;
-// there are no free slots while the order is an identity. A free slot is zero except for the number
-// of the next one. The block grows geometrically. free_params counts what the documented increments
-// added; callers maintain it, as they do num_params.
+// Invariants: the slots in the order and the free slots are 0 .. num_params + num_free - 1, each
+// once; there are no free slots while the order is an identity. A free slot is zero except for the
+// number of the next one. The block grows geometrically. free_params counts what the documented
+// increments added; callers maintain it, as they do num_params.
 #pragma once
 
 #include <cstdint>
@@ -30,10 +30,10 @@ inline TEVPF_PARAM& param_at(const TEVPF_LIST& list, std::int32_t position) noex
   return list.param_ptr[list.slots.order.at(position)];
 }
 
-// The position of the parameter in a slot.
-std::int32_t find_position(TEVPF_LIST& list, std::int32_t slot) noexcept;
+// Where the parameter in a slot stands in position order; its position.
+SequencePlace find_in_order(TEVPF_LIST& list, std::int32_t slot) noexcept;
 inline std::int32_t position_of(TEVPF_LIST& list, std::int32_t slot) noexcept {
-  return is_in_place(list) ? slot : find_position(list, slot);
+  return is_in_place(list) ? slot : find_in_order(list, slot).position;
 }
 
 // Calls visit(slot) for every parameter in position order.
@@ -63,7 +63,7 @@ inline std::int32_t next_slot(const TEVPF_LIST& list) noexcept {
 // Stores a record that owns its texts in the next slot.
 void insert_param(TEVPF_LIST& list, std::int32_t position, const TEVPF_PARAM& param) noexcept;
 // Frees the slot of a parameter; the caller has released its texts.
-void erase_param(TEVPF_LIST& list, std::int32_t position) noexcept;
+void erase_param(TEVPF_LIST& list, const SequencePlace& place, std::int32_t slot) noexcept;
 // Moves a parameter; `to` counts the others.
 void move_param(TEVPF_LIST& list, std::int32_t from, std::int32_t to) noexcept;
 

@@ -30,16 +30,18 @@ TEVPF_STATUS TEV8R1_PF_delete_param(const char* list_name, const char* param_nam
   SequencePlace place;
   PF_TRY(find(list_name, param_name, list, place));
 
-  const std::int32_t slot = list->index.order.at(place.position);
-  const std::int32_t position = position_of(*list, slot);
-  if (!ready_to_erase_name(*list, place.position) || !ready_to_erase_param(*list, position)) {
+  const std::int32_t slot = list->index.order.item_at(place);
+  TEVPF_PARAM_DEF& definition = param_in(*list, slot).def;
+  __builtin_prefetch(definition.description);  // for its length
+  const SequencePlace in_order = find_in_order(*list, slot);
+  if (!ready_to_erase_name(*list, place.position) ||
+      !ready_to_erase_param(*list, in_order.position)) {
     return fail_empty(PF_NOMEM);
   }
-  erase_name(*list, place);
-  TEVPF_PARAM_DEF& definition = param_in(*list, slot).def;
+  erase_name(*list, place, slot);
   const std::int64_t bytes = stored_size(definition);
   release_texts(definition, list->texts);
-  erase_param(*list, position);
+  erase_param(*list, in_order, slot);
   --list->num_params;
   ++list->free_params;
   list->header.btf -= static_cast<std::int32_t>(bytes);

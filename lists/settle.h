@@ -1,6 +1,6 @@
-// Returns a list to the state in which a file loads it: parameters in position order, the name index
-// one array of positions. Operations on whole lists (saving, dumps, copies) settle the list first, as
-// does every operation that gives an outside caller a pointer to a record.
+// Returns a list to the state in which a file loads it: parameters in position order, the name
+// index one array of positions. Operations on whole lists (saving, dumps, copies) settle the list
+// first, as does every operation that gives an outside caller a pointer to a record.
 #pragma once
 
 #include "core/base/status.h"
@@ -14,8 +14,8 @@ extern "C" {
 //   PF_NOMEM   out of memory while settling it; texts empty
 TEVPF_API TEVPF_STATUS TEV8R1_get_list_ptr(const char* name, TEVPF_LIST** list_out) noexcept;
 
-// Finds the first parameter in name order that matches the name or pattern, and its place in the name
-// index. The list is settled.
+// Finds the first parameter in name order that matches the name or pattern, and its place in the
+// name index. The list is settled.
 //   PF_NOPARAM  none; place_out: where the name would have to be inserted; texts: the name
 //   PF_NOMEM    out of memory while settling the list; texts empty
 TEVPF_API TEVPF_STATUS TEV8R1_get_param_ptr(TEVPF_LIST* list, const char* name,
@@ -35,8 +35,8 @@ namespace tevpf {
 // change.
 [[nodiscard]] bool settle(TEVPF_LIST& list) noexcept;
 
-// Counts a read of a list whose parameters are not in position order, and settles it once reads have
-// cost as much as settling.
+// Counts a read of a list whose parameters are not in position order, and settles it once reads
+// have cost as much as settling.
 void count_read(TEVPF_LIST& list) noexcept;
 
 }  // namespace tevpf

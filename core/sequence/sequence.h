@@ -46,6 +46,12 @@ struct Sequence {
     return blocks == nullptr ? position : blocks->read(position);
   }
 
+  // The item at a place that a search or place_of has found.
+  std::int32_t item_at(const SequencePlace& place) const noexcept {
+    if (blocks == nullptr || place.group < 0) return at(place.position);
+    return blocks->groups[place.group]->chunk(place.block)[place.offset];
+  }
+
   // The longest chunk that starts at a position, 0 .. count - 1. Valid until the next change.
   SequenceChunk chunk_at(std::int32_t count, std::int32_t position) const noexcept;
 
@@ -68,8 +74,8 @@ struct Sequence {
   }
 
   // The place of an item, at position -1 if it is not in the sequence. In blocks, an item that does
-  // not stand in ascending order with the others takes a scan at first; once scans have cost as much
-  // as a map from items to blocks, there is one, and calls are O(1).
+  // not stand in ascending order with the others takes a scan at first; once scans have cost as
+  // much as a map from items to blocks, there is one, and calls are O(1).
   SequencePlace place_of(std::int32_t count, std::int32_t item) const noexcept;
   std::int32_t position_of(std::int32_t count, std::int32_t item) const noexcept {
     return place_of(count, item).position;

@@ -73,9 +73,8 @@ SequencePlace SequenceBlocks::place_in(const SequenceGroup& group, std::int32_t 
 // Where most items ascend, as where few have been moved since they were an identity, this finds
 // nearly all of them.
 SequencePlace SequenceBlocks::look_in_order(std::int32_t item) const noexcept {
-  const std::int32_t g = count_less(num_groups - 1, [&](std::int32_t i) {
-    return groups[i]->last[groups[i]->count - 1] < item;
-  });
+  const std::int32_t g = count_less(
+      num_groups - 1, [&](std::int32_t i) { return groups[i]->last[groups[i]->count - 1] < item; });
   const SequenceGroup& group = *groups[g];
   const std::int32_t b =
       count_less(group.count - 1, [&](std::int32_t i) { return group.last[i] < item; });

@@ -1,6 +1,6 @@
-// Random operations on several lists and on a plain model of them. After every one: status, both error
-// texts, every parameter, cursor, spare slots, and the invariants of the record, which is compared in
-// whatever state it is; now and then it is handed out and must be settled.
+// Random operations on several lists and on a plain model of them. After every one: status, both
+// error texts, every parameter, cursor, spare slots, and the invariants of the record, which is
+// compared in whatever state it is; now and then it is handed out and must be settled.
 #include <gtest/gtest.h>
 
 #include <algorithm>
