@@ -90,7 +90,7 @@ class ListModel : public TempFileTest {
   // Those of beta usually begin alike.
   std::string any_name() {
     if (chance(12)) return std::string(18, 'l') + letters(6, "lm*");
-    if (name_ == "beta" && !chance(200)) return std::string(14, 'l') + letters(4, "abc\xE9");
+    if (name_ == "beta" && !chance(60)) return std::string(14, 'l') + letters(4, "abc\xE9");
     return (chance(10) ? " " : "") + letters(3, "abc\xE9") + (chance(12) ? "*" : "");
   }
   std::string known_name() {
