@@ -329,10 +329,10 @@ IndexPlace search_others(const TEVPF_TABLE& table, const TEVPF_COLUMN& column, s
   const std::int32_t others = table.num_rows - 1;
   if (others < 1) return {{0}, false};
   return with_key(column.def.type, column.tolerance, key, readable_bytes(table, column),
-                  [&](const auto& prepared) -> IndexPlace {
+                  [&]<class Key>(const Key& prepared) -> IndexPlace {
                     const ValuesOfIndex all = entries_of(table, column);
                     const WithoutOne<ValuesOfIndex> values{all, without};
-                    if constexpr (prepared.kTotalOrder) {
+                    if constexpr (Key::kTotalOrder) {
                       const IndexPlace whole = search_all(table, column, prepared);
                       const std::int32_t at =
                           whole.place.position - (without < whole.place.position ? 1 : 0);
@@ -359,15 +359,16 @@ IndexPlace find_in_index(const TEVPF_TABLE& table, TEVPF_COLUMN& column, std::in
     }
   }
   return with_key(column.def.type, column.tolerance, key, readable_bytes(table, column),
-                  [&](const auto& prepared) -> IndexPlace {
+                  [&]<class Key>(const Key& prepared) -> IndexPlace {
                     const ValuesOfIndex values = entries_of(table, column);
-                    if constexpr (prepared.kTotalOrder) {
+                    if constexpr (Key::kTotalOrder) {
                       const IndexPlace whole = search_all(table, column, prepared);
                       if (whole.place.position >= first) return whole;
                       return {{first}, prepared.equals(values.at(first))};
                     } else {
                       const auto from = [&](std::int32_t at) { return values.at(first + at); };
-                      const Found found = search_entries(ValuesFrom{from}, count - first, prepared);
+                      const ValuesFrom<decltype(from)> rest{from};
+                      const Found found = search_entries(rest, count - first, prepared);
                       return {{first + found.position}, found.equal};
                     }
                   });

@@ -105,8 +105,7 @@ struct KeyProbes {
     return count_less(chunk.count, [&](std::int32_t i) { return less(keys[i], chunk[i]); });
   }
   std::int32_t count_less_in(const SequenceChunk& chunk) const noexcept {
-    return ItemProbes{[this](std::int32_t item) { return is_item_less(item); }}.count_less_in(
-        chunk);
+    return count_less(chunk.count, [&](std::int32_t i) { return is_item_less(chunk[i]); });
   }
 };
 

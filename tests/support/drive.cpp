@@ -36,7 +36,14 @@ std::vector<Record*> elements(std::int32_t type) {
   return all;
 }
 auto lists() { return elements<TEVPF_LIST>(PF_ELEM_LIST); }
-auto tables() { return elements<TEVPF_TABLE>(PF_ELEM_TABLE); }
+
+// Tables with rows that fit a buffer: a file may ask for rows of gigabytes as long as it has none.
+auto tables() {
+  constexpr std::int32_t kWidestRow = 1 << 24;
+  std::vector<TEVPF_TABLE*> all = elements<TEVPF_TABLE>(PF_ELEM_TABLE);
+  std::erase_if(all, [](const TEVPF_TABLE* table) { return table->row_wid > kWidestRow; });
+  return all;
+}
 
 void read_list(const char* list) {
   std::int32_t type, value_size, desc_size, position;
@@ -210,10 +217,12 @@ bool save_and_compare(const std::string& folder) {
   TEV8R1_PF_inq_current_file(own);
   const bool saved = TEV8R1_PF_save(copy.c_str()) == PF_NORMAL;
   if (const std::string bytes = read(copy); saved && !bytes.empty()) {
-    require(TEV8R1_PF_open(copy.c_str()) == PF_NORMAL, "a saved file opens");
+    const TEVPF_STATUS opened = TEV8R1_PF_open(copy.c_str());
+    // A table too wide for the heap stays without its default row; what follows it is not read.
+    require(opened == PF_NORMAL || opened == PF_NOMEM, "a saved file opens");
     require_rules();
     require(TEV8R1_PF_save(again.c_str()) == PF_NORMAL, "a saved file can be saved");
-    require(read(again) == bytes, "a saved file holds what was saved");
+    require(opened == PF_NOMEM || read(again) == bytes, "a saved file holds what was saved");
     TEV8R1_PF_close(0);
     TEV8R1_PF_change_file(own);
   }
