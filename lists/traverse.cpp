@@ -30,10 +30,13 @@ void deliver(TEVPF_LIST& list, std::int32_t position, TEVPF_PARAM_DEF& out) noex
   list.cur_param = position;
 }
 
-inline TEVPF_STATUS step(TEVPF_LIST& list, char* name_out, void* value_out) noexcept {
+// slot_at(position) is the slot there.
+template <class SlotAt>
+inline TEVPF_STATUS step(TEVPF_LIST& list, char* name_out, void* value_out,
+                         SlotAt slot_at) noexcept {
   if (list.cur_param < std::numeric_limits<std::int32_t>::max()) ++list.cur_param;
   if (list.cur_param >= list.num_params) return PF_NOMORE;
-  const TEVPF_PARAM_DEF& definition = param_at(list, list.cur_param).def;
+  const TEVPF_PARAM_DEF& definition = param_in(list, slot_at(list.cur_param)).def;
   fetch_along(&definition, sizeof definition);
   copy_field_text(name_out, definition.name);
   copy_value(definition, value_out);
@@ -44,7 +47,8 @@ inline TEVPF_STATUS step(TEVPF_LIST& list, char* name_out, void* value_out) noex
                                              void* value_out) noexcept {
   TEVPF_LIST* list;
   PF_TRY(find_list_to_read(list_name, list));
-  return step(*list, name_out, value_out);
+  return step(*list, name_out, value_out,
+              [&](std::int32_t position) { return list->slots.order.at(position); });
 }
 
 }  // namespace
@@ -57,8 +61,8 @@ using namespace tevpf;
 TEVPF_STATUS TEV8R1_PF_get_next_param(const char* list_name, char* name_out,
                                       void* value_out) noexcept {
   TEVPF_LIST* const list = last_list(list_name);
-  return list != nullptr && is_in_place(*list) ? step(*list, name_out, value_out)
-                                               : find_and_step(list_name, name_out, value_out);
+  if (list == nullptr || !is_in_place(*list)) return find_and_step(list_name, name_out, value_out);
+  return step(*list, name_out, value_out, [](std::int32_t position) { return position; });
 }
 
 TEVPF_STATUS TEV8R1_PF_get_next_param_def(const char* list_name,
