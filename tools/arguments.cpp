@@ -46,6 +46,35 @@ const Argument kArguments[] = {
     {"--list", "--list", nullptr, "The name is that of a list", &Arguments::list},
     {"--table", "--table", nullptr, "The name is that of a table", &Arguments::table},
     {"--force", "--force", nullptr, "Write a dump that is far longer than FILE", &Arguments::force},
+    {"--delimiter", "--delimiter", "CHAR",
+     "What stands between fields: a character, comma, semicolon, tab", &Arguments::delimiter},
+    {"--no-header", "--no-header", nullptr, "Write no header row", &Arguments::no_header},
+    {"--missing", "--missing", "TEXT", "What stands for a number that is none (nan)",
+     &Arguments::missing},
+    {"--crlf", "--crlf", nullptr, "End lines with CR and LF", &Arguments::crlf},
+    {"csv:--columns", "--columns", "A,B,...",
+     "Import these columns alone; with --no-header, the names of all", &Arguments::columns},
+    {"csv:--types", "--types", "COLUMN=TYPE,...",
+     "Types in a new table: integer, short, real, double, string", &Arguments::types},
+    {"csv:--width", "--width", "COLUMN=N,...",
+     "Width of a string column in a new table; longer texts are cut", &Arguments::widths},
+    {"csv:--default", "--default", "COLUMN=VALUE", "The value where the CSV has none",
+     &Arguments::defaults},
+    {"csv:--no-header", "--no-header", nullptr, "The first line is a row already",
+     &Arguments::no_header},
+    {"--shorten-names", "--shorten-names", nullptr,
+     "Cut long names of columns, number equal ones, name empty ones", &Arguments::shorten_names},
+    {"csv:--missing", "--missing", "TEXT",
+     "A field that says TEXT is empty; may be given several times", &Arguments::missing},
+    {"--fill", "--fill", nullptr, "Take fields that a short row lacks as empty", &Arguments::fill},
+    {"--decimal-comma", "--decimal-comma", nullptr, "Numbers have a comma before their decimals",
+     &Arguments::decimal_comma},
+    {"--skip", "--skip", "N", "Leave out the first N lines", &Arguments::skip},
+    {"--comment", "--comment", "TEXT", "Leave out lines that start with TEXT", &Arguments::comment},
+    {"csv:--force", "--force", nullptr, "Make a table that is far larger than the CSV",
+     &Arguments::force},
+    {"csv:--list", "--list", nullptr, "Make or extend a list", &Arguments::list},
+    {"csv:--table", "--table", nullptr, "Make or extend a table", &Arguments::table},
 };
 
 std::string counted_from_one(const std::string& text) {
@@ -67,7 +96,7 @@ void declare(CLI::App& app, const Argument& argument, bool required, Arguments& 
           option->option_text(argument.value);
           option->allow_extra_args(false);  // one value each time it is given
           if constexpr (std::is_same_v<decltype(target), std::size_t&>) {
-            option->check(counted_from_one);
+            if (std::string(argument.value) == "ROW") option->check(counted_from_one);
           }
         }
       },

@@ -11,8 +11,13 @@ constexpr Command kCommands[] = {
     {"set", "Change the value of a parameter, within its bounds", "FILE LIST PARAM VALUE", run_set},
     {"dump", "Write the text dump of FILE, or of one element",
      "FILE [ELEMENT] -o --list --table --force", run_dump},
-    {"export", "Write a list or a table as CSV", "FILE ELEMENT -o --list --table", run_export},
-    {"import", "Add the rows of a CSV file to a table, made when it is not there", "FILE TABLE CSV",
+    {"export", "Write a list or a table as CSV",
+     "FILE ELEMENT -o --columns --delimiter --no-header --missing --crlf --list --table",
+     run_export},
+    {"import", "Add a CSV file to a table or a list, made when it is not there",
+     "FILE ELEMENT CSV csv:--columns csv:--types csv:--width csv:--default --delimiter "
+     "csv:--no-header --shorten-names csv:--missing --fill --decimal-comma --skip --comment "
+     "csv:--force csv:--list csv:--table",
      run_import},
     {"sql", "Run SQL statements over FILE", "FILE [SQL] --with --csv --json", run_sql},
     {"check", "Say whether FILE is in order, or what is wrong and where", "FILE", run_check},

@@ -16,6 +16,11 @@ struct Arguments {
   std::string file, element, parameter, value, new_name, csv, output, sort, statements;
   std::vector<std::string> columns, with;
   std::size_t from = 0, to = 0;  // 0: not given
+  // Of CSV.
+  std::string delimiter, comment;
+  std::vector<std::string> missing, types, widths, defaults;
+  std::size_t skip = 0;
+  bool no_header = false, fill = false, shorten_names = false, decimal_comma = false, crlf = false;
   bool json = false, names = false, list = false, table = false, force = false;
   bool as_csv = false;
 

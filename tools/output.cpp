@@ -92,4 +92,6 @@ void print(const std::string& text) {
   output.finish();
 }
 
+void note(const std::string& sentence) { std::fprintf(stderr, "tevpf: %s\n", sentence.c_str()); }
+
 }  // namespace tool

@@ -43,4 +43,7 @@ class Output {
 // A command's short answer on standard output.
 void print(const std::string& text);
 
+// Something to know beside it, on standard error: "tevpf: " and the sentence.
+void note(const std::string& sentence);
+
 }  // namespace tool

@@ -3,7 +3,7 @@
 #include <filesystem>
 
 #include "commands.h"
-#include "csv.h"
+#include "csv_writer.h"
 #include "files.h"
 #include "input.h"
 #include "json.h"
@@ -67,21 +67,15 @@ void write_text(Output& output, Statement& rows) {
              [&](std::size_t row, std::size_t c) { return cells[row * columns + c]; });
 }
 
-template <class Field>
-void write_csv_line(Output& output, int columns, Field field) {
-  std::string line;
-  for (int c = 0; c < columns; ++c) {
-    if (c > 0) line += ',';
-    append_csv(line, field(c), columns == 1);
-  }
-  output.write(line += "\r\n");
-}
-
 void write_csv(Output& output, Statement& rows) {
-  write_csv_line(output, rows.columns(), [&](int c) { return rows.name(c); });
+  CsvWriter writer(output, {});
+  for (int c = 0; c < rows.columns(); ++c) writer.text(rows.name(c));
+  writer.end_record();
   while (rows.step()) {
-    write_csv_line(output, rows.columns(), [&](int c) { return field_text(rows, c); });
+    for (int c = 0; c < rows.columns(); ++c) writer.text(field_text(rows, c));
+    writer.end_record();
   }
+  writer.finish();
 }
 
 void write_json(Output& output, Statement& rows) {

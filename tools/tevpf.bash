@@ -27,12 +27,17 @@ _tevpf() {
     info) options+=" --json --names" ;;
     show) options+=" --columns --sort --from --to --json --list --table" ;;
     dump) options+=" -o --output --list --table --force" ;;
-    export) options+=" -o --output --list --table" ;;
+    export) options+=" -o --output --columns --delimiter --no-header --missing --crlf --list --table" ;;
+    import)
+      options+=" --delimiter --no-header --columns --types --width --default --missing --fill"
+      options+=" --shorten-names --decimal-comma --skip --comment --force --list --table"
+      ;;
     rm | cp | mv) options+=" --list --table" ;;
   esac
   case $previous in
     -o | --output) _tevpf_files "$word"; return ;;
-    --columns | --sort | --from | --to) return ;;
+    --delimiter) mapfile -t COMPREPLY < <(compgen -W "comma semicolon tab" -- "$word"); return ;;
+    --columns | --sort | --from | --to | --types | --width | --default | --missing | --skip | --comment) return ;;
   esac
   if [[ $word == -* ]]; then
     mapfile -t COMPREPLY < <(compgen -W "$options" -- "$word")
@@ -43,7 +48,8 @@ _tevpf() {
   local i position=0 file=
   for ((i = 2; i < COMP_CWORD; ++i)); do
     case ${COMP_WORDS[i]} in
-      -o | --output | --columns | --sort | --from | --to) ((++i)) ;;
+      -o | --output | --columns | --sort | --from | --to | --delimiter | --types | --width | \
+        --default | --missing | --skip | --comment) ((++i)) ;;
       -*) ;;
       *) ((++position == 1)) && file=${COMP_WORDS[i]} ;;
     esac

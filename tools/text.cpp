@@ -8,26 +8,34 @@ namespace {
 
 bool is_continuation(char byte) { return (static_cast<unsigned char>(byte) & 0xC0) == 0x80; }
 
-// Bytes of the printable UTF-8 sequence at the front of a text, 0 when there is none. Overlong
-// forms and surrogates fail by their second byte, as do the control characters U+0080 to U+009F.
-std::size_t printable_sequence(std::string_view text) {
+// Bytes of the UTF-8 sequence at the front of a text, 0 when there is none. Overlong forms and
+// surrogates fail by their second byte.
+std::size_t sequence(std::string_view text) {
   const auto lead = static_cast<unsigned char>(text[0]);
-  if (lead < 0x80) return lead >= 0x20 && lead != 0x7F ? 1 : 0;
-  const std::size_t size = lead < 0xC2   ? 0
+  const std::size_t size = lead < 0x80   ? 1
+                           : lead < 0xC2 ? 0
                            : lead < 0xE0 ? 2
                            : lead < 0xF0 ? 3
                            : lead < 0xF5 ? 4
                                          : 0;
-  if (size == 0 || text.size() < size) return 0;
+  if (size < 2) return size;
+  if (text.size() < size) return 0;
   if (!std::all_of(text.begin() + 1, text.begin() + static_cast<std::ptrdiff_t>(size),
                    is_continuation)) {
     return 0;
   }
   const auto second = static_cast<unsigned char>(text[1]);
-  const bool refused = (lead == 0xC2 && second < 0xA0) || (lead == 0xE0 && second < 0xA0) ||
-                       (lead == 0xED && second >= 0xA0) || (lead == 0xF0 && second < 0x90) ||
-                       (lead == 0xF4 && second >= 0x90);
+  const bool refused = (lead == 0xE0 && second < 0xA0) || (lead == 0xED && second >= 0xA0) ||
+                       (lead == 0xF0 && second < 0x90) || (lead == 0xF4 && second >= 0x90);
   return refused ? 0 : size;
+}
+
+// The same without control characters: those of ASCII and U+0080 to U+009F.
+std::size_t printable_sequence(std::string_view text) {
+  const auto lead = static_cast<unsigned char>(text[0]);
+  if (lead < 0x20 || lead == 0x7F) return 0;
+  if (lead == 0xC2 && text.size() > 1 && static_cast<unsigned char>(text[1]) < 0xA0) return 0;
+  return sequence(text);
 }
 
 std::string escape(char byte) {
@@ -82,10 +90,28 @@ std::size_t display_width(std::string_view text) {
          static_cast<std::size_t>(std::count_if(text.begin(), text.end(), is_continuation));
 }
 
+bool is_utf8(std::string_view text) {
+  while (!text.empty()) {
+    const std::size_t size = sequence(text);
+    if (size == 0) return false;
+    text.remove_prefix(size);
+  }
+  return true;
+}
+
 std::string_view trimmed(std::string_view text) {
   const std::size_t first = text.find_first_not_of(" \t");
   if (first == std::string_view::npos) return {};
   return text.substr(first, text.find_last_not_of(" \t") - first + 1);
+}
+
+std::string_view cut(std::string_view text, std::size_t size) {
+  constexpr std::size_t kLongestCharacter = 4;
+  if (text.size() <= size) return text;
+  std::size_t end = size;
+  while (end > 0 && size - end < kLongestCharacter && is_continuation(text[end])) --end;
+  // A text that is no UTF-8 is cut anywhere.
+  return text.substr(0, is_continuation(text[end]) ? size : end);
 }
 
 std::string counted(std::uintmax_t count, std::string_view noun) {

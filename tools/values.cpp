@@ -2,29 +2,20 @@
 
 #include <algorithm>
 #include <array>
-#include <charconv>
 #include <cmath>
 #include <cstdio>
 #include <limits>
 #include <type_traits>
 
-#include "text.h"
-
 namespace tool {
 namespace {
 
 template <class T>
-Parsed parse_number(std::string_view text, Value& value) {
-  text = trimmed(text);
-  if (text.size() > 1 && text[0] == '+' && text[1] != '-') text.remove_prefix(1);
+Parsed parse_as(std::string_view text, Value& value) {
   T number{};
-  const auto [end, error] = std::from_chars(text.data(), text.data() + text.size(), number);
-  if (error == std::errc::invalid_argument || end != text.data() + text.size()) {
-    return Parsed::kNotANumber;
-  }
-  if (error != std::errc{}) return Parsed::kOutOfRange;
-  value = number;
-  return Parsed::kValue;
+  const Parsed parsed = parse_number(text, number);
+  if (parsed == Parsed::kValue) value = number;
+  return parsed;
 }
 
 bool is_whole_range(const tevpf::Bounds& bounds) {
@@ -48,13 +39,13 @@ bool is_floating(Type type) { return type == Type::float32 || type == Type::floa
 Parsed parse_value(Type type, std::string_view text, Value& value) {
   switch (type) {
     case Type::int32:
-      return parse_number<std::int32_t>(text, value);
+      return parse_as<std::int32_t>(text, value);
     case Type::int16:
-      return parse_number<std::int16_t>(text, value);
+      return parse_as<std::int16_t>(text, value);
     case Type::float32:
-      return parse_number<float>(text, value);
+      return parse_as<float>(text, value);
     case Type::float64:
-      return parse_number<double>(text, value);
+      return parse_as<double>(text, value);
     case Type::string:
       break;
   }

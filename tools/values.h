@@ -1,12 +1,15 @@
 // Values as text: read, and written so that they read back exactly.
 #pragma once
 
+#include <charconv>
 #include <cstdint>
 #include <optional>
 #include <string>
 #include <string_view>
+#include <system_error>
 
 #include "tevpf.hpp"
+#include "text.h"
 
 namespace tool {
 
@@ -20,6 +23,8 @@ enum class Parsed { kValue, kNotANumber, kOutOfRange };
 // Reads text as a value of the type. Numbers may have blanks around them and a sign; "nan" and
 // "inf" are numbers of the floating types.
 Parsed parse_value(Type type, std::string_view text, Value& value);
+template <class T>
+Parsed parse_number(std::string_view text, T& number);
 
 // The shortest text that reads back as the same value.
 std::string exact_text(const Value& value);
@@ -45,6 +50,20 @@ template <class Definition>
 std::string refused_value(const std::string& text, Parsed parsed, const Definition& definition) {
   return refused_value(text, parsed, definition.type(),
                        bounds_text(definition.bounds(), definition.units()));
+}
+
+// ---- Implementation ---------------------------------------------------------------------------
+
+template <class T>
+Parsed parse_number(std::string_view text, T& number) {
+  const bool may_have_blanks = !text.empty() && (text.front() <= ' ' || text.back() <= ' ');
+  if (may_have_blanks) text = trimmed(text);
+  if (text.size() > 1 && text[0] == '+' && text[1] != '-') text.remove_prefix(1);
+  const auto [end, error] = std::from_chars(text.data(), text.data() + text.size(), number);
+  if (error == std::errc::invalid_argument || end != text.data() + text.size()) {
+    return Parsed::kNotANumber;
+  }
+  return error == std::errc{} ? Parsed::kValue : Parsed::kOutOfRange;
 }
 
 }  // namespace tool
