@@ -214,6 +214,7 @@ struct SequenceBlocks {
   void remember(const SequenceChunk& chunk, std::int32_t id) noexcept;
   SequencePlace place_in(const SequenceGroup& group, std::int32_t b,
                          std::int32_t offset) const noexcept;
+  SequencePlace look_in_order(std::int32_t item) const noexcept;
   SequencePlace look_everywhere(std::int32_t item) noexcept;
 
   // In sequence_keys.cpp; the last four are called before the change to the items.
