@@ -1,9 +1,10 @@
-// tevpf export: a list or a table as CSV that reads back exactly.
+// tevpf export: a list or a table as CSV, or JSON of it or of the whole file; both read back exactly.
 #include <numeric>
 
 #include "commands.h"
 #include "csv_dialect.h"
 #include "csv_writer.h"
+#include "element_json.h"
 #include "files.h"
 #include "list_csv.h"
 #include "names.h"
@@ -68,9 +69,29 @@ void export_table(CsvWriter& writer, const tevpf::File& file, const tevpf::Table
   }
 }
 
+ExitStatus export_as_json(const Arguments& arguments) {
+  const tevpf::File file = open_to_read(arguments.file);
+  if (arguments.element.empty()) {
+    Output output(arguments.output, file.name());
+    write_file_json(output, file);
+    output.finish();
+    return finish_reading(file);
+  }
+  const tevpf::Element element = find_element(file, arguments.element, arguments.kind());
+  Output output(arguments.output, file.name());
+  write_element_json(output, file, element);
+  output.write("\n");
+  output.finish();
+  return finish_reading(file);
+}
+
 }  // namespace
 
 ExitStatus run_export(const Arguments& arguments) {
+  if (arguments.json) return export_as_json(arguments);
+  if (arguments.element.empty()) {
+    throw Failure(kUsage, "CSV is of one list or table, so name it; --json writes the whole file");
+  }
   const CsvStyle style = style_of(arguments);
   const tevpf::File file = open_to_read(arguments.file);
   const tevpf::Element element = find_element(file, arguments.element, arguments.kind());

@@ -1,15 +1,14 @@
-// tevpf import: the rows of a CSV file into a table, or its parameters into a list; all of them or
-// none.
-#include <filesystem>
-#include <system_error>
+// tevpf import: the rows of a CSV file into a table, or its parameters into a list, all of them or
+// none; or the elements of a JSON file.
+#include <utility>
 
 #include "commands.h"
 #include "csv_source.h"
 #include "files.h"
 #include "import_options.h"
+#include "input.h"
+#include "json_import.h"
 #include "list_csv.h"
-#include "output.h"
-#include "platform.h"
 #include "progress.h"
 #include "table_import.h"
 #include "text.h"
@@ -17,43 +16,47 @@
 namespace tool {
 namespace {
 
-bool exists(const std::string& path) {
-  std::error_code ignored;
-  return std::filesystem::symlink_status(path, ignored).type() !=
-         std::filesystem::file_type::not_found;
+ExitStatus import_whole_json(const Arguments& arguments) {
+  const Conflict conflict = conflict_named(arguments.on_conflict);
+  const std::string& path = arguments.element;  // the one name behind FILE
+  if (path.empty() || path.ends_with(".csv")) {
+    throw Failure(kUsage, "name a JSON file behind FILE, or a table and a CSV file");
+  }
+  const std::string text = read_whole(path, "name a JSON file, or - for standard input");
+  std::size_t count = 0;
+  change_file(arguments.target(), Missing::kMade, [&](tevpf::File& file) {
+    count = import_json(file, {text, path == "-" ? "standard input" : path}, conflict);
+  });
+  report(arguments.target(), counted(count, "element") + " added");
+  return kDone;
 }
 
 class Import {
  public:
   Import(const Arguments& arguments)
-      : path_(arguments.file),
+      : target_(arguments.target()),
         name_(arguments.element),
         options_(import_options(arguments)),
         source_(arguments.csv) {}
 
   // What was done: "3 rows added to table 't'".
   std::string run() {
-    if (!exists(path_)) {
-      NewFile made = NewFile::create(path_);
-      std::string done = import_into(made.file(), Indexes::kAtOnce);
-      progress_.clear();
-      made.save();
-      return done;
-    }
     try {
-      return import_and_save(Indexes::kAtOnce);
+      return run_with(Indexes::kAtOnce);
     } catch (const IndexesRefused&) {
-      source_.start_over();
-      return import_and_save(Indexes::kRowByRow);
+      return run_with(Indexes::kRowByRow);
     }
   }
 
  private:
-  std::string import_and_save(Indexes indexes) {
-    tevpf::File file = open_to_change(path_);
-    std::string done = import_into(file, indexes);
-    progress_.clear();
-    save(file);
+  std::string run_with(Indexes indexes) {
+    std::string done;
+    bool is_first = true;
+    change_file(target_, Missing::kMade, [&](tevpf::File& file) {
+      if (!std::exchange(is_first, false) || indexes == Indexes::kRowByRow) source_.start_over();
+      done = import_into(file, indexes);
+      progress_.clear();
+    });
     return done;
   }
 
@@ -77,7 +80,8 @@ class Import {
                                 " is a list; rows go into tables, so choose another name");
   }
 
-  std::string path_, name_;
+  Target target_;
+  std::string name_;
   ImportOptions options_;
   CsvSource source_;
   Progress progress_{"row"};
@@ -86,14 +90,9 @@ class Import {
 }  // namespace
 
 ExitStatus run_import(const Arguments& arguments) {
+  if (arguments.csv.empty()) return import_whole_json(arguments);
   check_new_name(arguments.element, arguments.list ? "the list's name" : "the table's name");
-  const std::string done = Import(arguments).run();
-  try {
-    print(done + "\n");
-  } catch (const Failure& failure) {
-    throw Failure(failure.status(),
-                  visible(arguments.file) + " is changed: " + done + "; but " + failure.what());
-  }
+  report(arguments.target(), Import(arguments).run());
   return kDone;
 }
 

@@ -18,6 +18,17 @@ using tevpf::Value;
 
 bool is_floating(Type type);  // real or double
 
+// The type that a value most likely has: integer, else double, else string.
+Type guess_type(std::string_view text);
+
+Value zero_of(Type type);  // 0, or the empty text
+
+// Significant digits that show the number exactly, at least those of a new definition.
+std::int32_t precision_of(std::string_view number);
+
+// "an integer", "a double".
+std::string with_article(Type type);
+
 enum class Parsed { kValue, kNotANumber, kOutOfRange };
 
 // Reads text as a value of the type. Numbers may have blanks around them and a sign; "nan" and
@@ -29,15 +40,23 @@ Parsed parse_number(std::string_view text, T& number);
 // The shortest text that reads back as the same value.
 std::string exact_text(const Value& value);
 
-// Floating values with that many significant digits (0: exact), the others exact.
+// Floating values with that many significant digits (0: exact), or fewer when these are exact; the
+// others exact.
 std::string display_text(const Value& value, std::int32_t precision);
 
 bool is_nan(const Value& value);
 
+// Whether a parameter may have the value: what is not a number lies outside all bounds.
+bool is_within(const Value& value, const std::optional<tevpf::Bounds>& bounds);
+
 // Numbers by size, what is not a number last; texts by their bytes. Both values are of one type.
 bool comes_before(const Value& a, const Value& b);
 
-// "0 to 3000 rpm"; empty when the bounds only say what the type can hold.
+// Whether the bounds say more than what the type can hold.
+bool has_min(const tevpf::Bounds& bounds);
+bool has_max(const tevpf::Bounds& bounds);
+
+// "0 to 3000 rpm", "at least 0 kg"; empty when the bounds only say what the type can hold.
 std::string bounds_text(const std::optional<tevpf::Bounds>& bounds, const std::string& units);
 
 // Why a text is refused that is no value of the type, or lies outside the bounds: the end of a
