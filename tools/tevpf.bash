@@ -15,7 +15,7 @@ _tevpf_files() {
 
 _tevpf() {
   local word=${COMP_WORDS[COMP_CWORD]} previous=${COMP_WORDS[COMP_CWORD - 1]}
-  local commands="info show get set dump export import check new rm cp mv --help --version"
+  local commands="info show get set dump export import sql check new rm cp mv --help --version"
   COMPREPLY=()
   if ((COMP_CWORD == 1)); then
     mapfile -t COMPREPLY < <(compgen -W "$commands" -- "$word")
@@ -28,10 +28,11 @@ _tevpf() {
     show) options+=" --columns --sort --from --to --json --list --table" ;;
     dump) options+=" -o --output --list --table --force" ;;
     export) options+=" -o --output --list --table" ;;
+    sql) options+=" --with --csv --json" ;;
     rm | cp | mv) options+=" --list --table" ;;
   esac
   case $previous in
-    -o | --output) _tevpf_files "$word"; return ;;
+    -o | --output | --with) _tevpf_files "$word"; return ;;
     --columns | --sort | --from | --to) return ;;
   esac
   if [[ $word == -* ]]; then
@@ -43,7 +44,7 @@ _tevpf() {
   local i position=0 file=
   for ((i = 2; i < COMP_CWORD; ++i)); do
     case ${COMP_WORDS[i]} in
-      -o | --output | --columns | --sort | --from | --to) ((++i)) ;;
+      -o | --output | --with | --columns | --sort | --from | --to) ((++i)) ;;
       -*) ;;
       *) ((++position == 1)) && file=${COMP_WORDS[i]} ;;
     esac
@@ -52,7 +53,7 @@ _tevpf() {
   file=$(xargs printf '%s' <<<"${file/#\~\//$HOME/}" 2>/dev/null)
   case $position:${COMP_WORDS[1]} in
     0:* | 2:import) _tevpf_files "$word" ;;
-    1:info | 1:check | 1:new) ;;
+    1:info | 1:check | 1:new | 1:sql) ;;
     1:*) _tevpf_elements "$file" "$word" ;;
   esac
 }
