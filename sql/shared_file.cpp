@@ -193,11 +193,13 @@ void SharedFile::commit() noexcept {
 
 // Where another file of the transaction could not be saved, this one was, and is put back.
 void SharedFile::rollback() noexcept {
-  bool is_lost = false;
+  bool is_lost = journal_.is_broken();
   try {
-    journal_.undo_to(0);
-    if (is_saved_) file_->save();
-    if (is_saved_) stamp_ = stamp();
+    if (!is_lost) journal_.undo_to(0);
+    if (!is_lost && is_saved_) {
+      file_->save();
+      stamp_ = stamp();
+    }
   } catch (...) {
     is_lost = true;
   }
