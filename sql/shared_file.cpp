@@ -155,6 +155,8 @@ void SharedFile::begin_writing(Connection connection, Lock& lock) {
     return writer_ == connection || (writer_ == nullptr && !has_other_readers(connection));
   });
   read_again_if_changed();
+  // A value out of range, once removed from a list, is not taken back.
+  if (journal_.is_broken()) throw Refusal(SQLITE_ERROR, "an earlier change could not be undone");
   const tevpf::File& opened = file();
   if (opened.damage()) throw Refusal(SQLITE_READONLY, "the file is damaged and not changed");
   if (opened.is_read_only()) throw Refusal(SQLITE_READONLY, "the file may not be written");
