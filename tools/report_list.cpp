@@ -25,18 +25,18 @@ std::string place_of(const tevpf::Parameter& p) {
   if (p.value() < bounds.min) return "<span class=\"out\">below the minimum</span>";
   if (p.value() > bounds.max) return "<span class=\"out\">above the maximum</span>";
   const double min = as_number(bounds.min), max = as_number(bounds.max);
-  if (is_open_below(bounds) || is_open_above(bounds) || !(min < max)) return {};
+  if (!has_min(bounds) || !has_max(bounds) || !(min < max)) return {};
   return bounds_figure(as_number(p.value()), min, max, bounds_text(bounds, p.units()));
 }
 
 std::string row_of(const tevpf::Parameter& p) {
   static const std::string kNoBound = html_cell("");
-  const bool has_min = p.bounds() && !is_open_below(*p.bounds());
-  const bool has_max = p.bounds() && !is_open_above(*p.bounds());
+  const bool from = p.bounds() && has_min(*p.bounds());
+  const bool to = p.bounds() && has_max(*p.bounds());
   return "<tr><th scope=\"row\">" + html_text(p.name()) + "</th>" +
          html_cell(p.value(), p.precision()) + html_cell(p.units()) +
-         (has_min ? html_cell(p.bounds()->min, p.precision()) : kNoBound) + "<td>" + place_of(p) +
-         "</td>" + (has_max ? html_cell(p.bounds()->max, p.precision()) : kNoBound) +
+         (from ? html_cell(p.bounds()->min, p.precision()) : kNoBound) + "<td>" + place_of(p) +
+         "</td>" + (to ? html_cell(p.bounds()->max, p.precision()) : kNoBound) +
          html_cell(p.description()) + "</tr>\n";
 }
 

@@ -121,16 +121,16 @@ TEST_F(ListRules, TableOfNamesIsNotNeeded) {
   tevpf::heap_fail_at(0);
   look_up_twice();
   EXPECT_TRUE(tevpf::heap_fail_off());
-  EXPECT_EQ(many.names.slots, nullptr);
+  EXPECT_EQ(many.names.entries, nullptr);
   look_up_twice();
-  EXPECT_NE(many.names.slots, nullptr);
+  EXPECT_NE(many.names.entries, nullptr);
   EXPECT_EQ(TEV8R1_inq_param_exists("list", std::string(4000, 'p').c_str()), PF_NOPARAM);
   // A full table that cannot grow is given up; the parameter is added all the same.
   ASSERT_GT(many.free_params, 0);
   tevpf::heap_fail_at(0);
   EXPECT_EQ(add({PF_TYPE_INT, "p42"}), PF_NORMAL);
   EXPECT_TRUE(tevpf::heap_fail_off());
-  EXPECT_EQ(many.names.slots, nullptr);
+  EXPECT_EQ(many.names.entries, nullptr);
   EXPECT_EQ(TEV8R1_inq_param_exists("list", "p42"), PF_NORMAL);
   EXPECT_EQ(broken_rule(many), nullptr);
 }

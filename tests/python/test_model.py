@@ -172,6 +172,7 @@ def test_columns_get_the_types_of_their_data(folder):
     with tevpf.open("types.pf", "x") as file:
         table = file.tables.create("t", frame)
         assert [column.type for column in table.columns.values()] == types
+        assert table.dtype["text"] == "S6"
         assert table.columns["text"].width == 6 and table.columns["category"].width == 1
         assert [repr(row.to_tuple()) for row in table] == [repr(row) for row in rows]
         table.append(table.to_numpy())
