@@ -1,6 +1,6 @@
 #!/usr/bin/env bash
 # install-packages.sh GROUP...: installs the missing Debian packages of these groups.
-# Groups: build tool test python bench x86 windows fuzz lint
+# Groups: build tool test python bench x86 windows fuzz lint browser
 set -euo pipefail
 
 declare -A groups=(
@@ -14,6 +14,7 @@ declare -A groups=(
   [windows]="g++-mingw-w64-i686-win32"
   [fuzz]="clang libclang-rt-14-dev llvm"
   [lint]="clang-format clang-tidy cppcheck shellcheck python3"
+  [browser]="chromium chromium-driver python3-selenium"
 )
 
 missing=()

@@ -66,6 +66,8 @@ const Argument kArguments[] = {
      &Arguments::on_conflict},
     {"--from", "--from", "ROW", "First row, counted from 1", &Arguments::from},
     {"--to", "--to", "ROW", "Last row", &Arguments::to},
+    {"--rows", "--rows", "COUNT", "Rows to show of each list or table, 1000 if not given",
+     &Arguments::rows},
     {"--with", "--with", "OTHER", "Another file, in SQL by its name without ending",
      &Arguments::with},
     {"--csv", "--csv", nullptr, "Write CSV", &Arguments::as_csv},

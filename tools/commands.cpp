@@ -47,6 +47,7 @@ constexpr Command kCommands[] = {
      run_import},
     {"dump", "Write the text dump of FILE, or of one element",
      "FILE [ELEMENT] -o --list --table --force", run_dump},
+    {"report", "Write FILE as a page of HTML, with figures", "FILE -o --rows", run_report},
     {"sql", "Run SQL statements over FILE", "FILE [SQL] --with --csv --json --no-lock", run_sql},
     {"check", "Say whether FILE is in order, or what is wrong and where", "FILE", run_check},
     {"new", "Make an empty FILE", "FILE", run_new},

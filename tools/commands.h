@@ -28,6 +28,7 @@ struct Arguments : DefinitionOptions, PlaceOptions {
   std::vector<std::string> missing, types, widths, defaults;
   std::size_t skip = 0;
   bool no_header = false, fill = false, shorten_names = false, decimal_comma = false, crlf = false;
+  std::size_t rows = 1000;
   bool json = false, names = false, list = false, table = false, force = false;
   bool as_csv = false;
   bool count = false, summary = false, wide = false, all = false, no_lock = false;
@@ -62,6 +63,7 @@ ExitStatus run_insert(const Arguments& arguments);
 ExitStatus run_merge(const Arguments& arguments);
 ExitStatus run_mv(const Arguments& arguments);
 ExitStatus run_new(const Arguments& arguments);
+ExitStatus run_report(const Arguments& arguments);
 ExitStatus run_rm(const Arguments& arguments);
 ExitStatus run_set(const Arguments& arguments);
 ExitStatus run_show(const Arguments& arguments);

@@ -151,6 +151,18 @@ bool is_nan(const Value& value) {
   return std::visit([](const auto& v) { return v != v; }, value);
 }
 
+double as_number(const Value& value) {
+  return std::visit(
+      [](const auto& v) -> double {
+        if constexpr (std::is_same_v<std::decay_t<decltype(v)>, std::string>) {
+          return std::nan("");
+        } else {
+          return v;
+        }
+      },
+      value);
+}
+
 bool comes_before(const Value& a, const Value& b) {
   if (is_nan(a) || is_nan(b)) return !is_nan(a) && is_nan(b);
   return a < b;

@@ -46,6 +46,9 @@ std::string display_text(const Value& value, std::int32_t precision);
 
 bool is_nan(const Value& value);
 
+// A number as a double, which holds all of them exactly; a text is not a number.
+double as_number(const Value& value);
+
 // Whether a parameter may have the value: what is not a number lies outside all bounds.
 bool is_within(const Value& value, const std::optional<tevpf::Bounds>& bounds);
 
