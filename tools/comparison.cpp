@@ -9,7 +9,7 @@
 namespace tool {
 namespace {
 
-using Report = std::function<void(const Difference&)>;
+using Report = ReportDifference;
 
 void compare_texts(const std::string& place, const char* what, const std::string& before,
                    const std::string& after, const Report& report) {

@@ -81,7 +81,7 @@ bool same(const LoadedColumn& a, std::size_t row, const LoadedColumn& b, std::si
 class RowComparison {
  public:
   RowComparison(std::string place, const LoadedTable& before, const LoadedTable& after,
-                const std::function<void(const Difference&)>& report)
+                const ReportDifference& report)
       : place_(std::move(place)), before_(before), after_(after), report_(report) {}
 
   void by_number() {
@@ -150,13 +150,13 @@ class RowComparison {
   std::string place_;
   const LoadedTable& before_;
   const LoadedTable& after_;
-  const std::function<void(const Difference&)>& report_;
+  const ReportDifference& report_;
 };
 
 }  // namespace
 
 void compare_rows(const std::string& place, const tevpf::Table& before, const tevpf::Table& after,
-                  const std::function<void(const Difference&)>& report) {
+                  const ReportDifference& report) {
   std::vector<tevpf::Column> common;
   std::optional<std::size_t> key;
   for (const tevpf::Column& column : before.columns()) {
