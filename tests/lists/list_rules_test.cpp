@@ -4,7 +4,9 @@
 #include <climits>
 
 #include "core/base/heap.h"
+#include "lists/directory.h"
 #include "lists/param_record.h"
+#include "support/list_check.h"
 #include "support/param_def.h"
 #include "support/temp_file.h"
 
@@ -108,6 +110,23 @@ TEST_F(ListRules, DisorderedIndexIsTakenAsItStands) {
   for (int i = 0; i < 100; ++i) {
     EXPECT_EQ(TEV8R1_inq_param_exists("list", "p10"), PF_NOPARAM);
     EXPECT_EQ(TEV8R1_inq_param_exists("list", "p11"), PF_NORMAL);
+  }
+}
+
+// All names begin alike but one, which belongs in front of them or behind them.
+TEST_F(ListRules, ANameThatBeginsDifferentlyFindsItsPlace) {
+  const std::string beginning(12, 'l');
+  for (const char* other : {"a", "z", "lllm", "llla", "llllll", "\xFF"}) {
+    SCOPED_TRACE(other);
+    for (int i = 0; i < 80; ++i) {
+      ASSERT_EQ(add({PF_TYPE_INT, beginning + std::to_string(10 + 37 * i % 80)}), PF_NORMAL);
+    }
+    ASSERT_EQ(add({PF_TYPE_INT, other}), PF_NORMAL);
+    TEVPF_LIST* many = nullptr;
+    ASSERT_EQ(tevpf::find_list("list", many), PF_NORMAL);
+    EXPECT_EQ(broken_rule(*many), nullptr);
+    ASSERT_EQ(TEV8R1_PF_delete_list("list"), PF_NORMAL);
+    ASSERT_EQ(TEV8R1_PF_create_elem("list", "", PF_ELEM_LIST), PF_NORMAL);
   }
 }
 
