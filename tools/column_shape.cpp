@@ -9,11 +9,6 @@
 #include "values.h"
 
 namespace tool {
-namespace {
-
-constexpr int kMostPrecision = 17;
-
-}  // namespace
 
 bool FieldRules::is_missing(std::string_view field) const {
   if (field.empty()) return true;

@@ -2,6 +2,7 @@
 #pragma once
 
 #include <cstddef>
+#include <cstdint>
 #include <optional>
 #include <string>
 #include <string_view>
@@ -50,7 +51,7 @@ class ColumnShape {
   bool integers_ = true, numbers_ = true;  // of the fields that are not missing
   bool has_digits_ = false, has_missing_ = false, has_infinity_ = false;
   std::size_t longest_ = 1, longest_line_ = 0;
-  int precision_ = 6;  // significant digits that show every number exactly
+  std::int32_t precision_ = 6;  // significant digits that show every number exactly
 
   std::optional<Stranger> not_utf8_;  // the first text that is not
   Stranger first_{};                  // of the fields that are no numbers

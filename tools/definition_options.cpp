@@ -3,21 +3,12 @@
 #include <array>
 #include <utility>
 
+#include "number_text.h"
 #include "text.h"
+#include "values.h"
 
 namespace tool {
 namespace {
-
-struct TypeName {
-  const char* word;
-  Type type;
-};
-constexpr TypeName kTypeNames[] = {
-    {"integer", Type::int32},   {"short", Type::int16},     {"real", Type::float32},
-    {"double", Type::float64},  {"string", Type::string},   {"int", Type::int32},
-    {"int32", Type::int32},     {"int16", Type::int16},     {"float", Type::float32},
-    {"float32", Type::float32}, {"float64", Type::float64}, {"text", Type::string},
-};
 
 // The bounds that a type itself sets.
 std::optional<tevpf::Bounds> widest_bounds(Type type) { return tevpf::Column("x", type).bounds(); }
@@ -82,9 +73,7 @@ void keep_texts(Definition& definition, const Definition& before) {
 }  // namespace
 
 Type required_type(const std::string& word) {
-  for (const TypeName& name : kTypeNames) {
-    if (word == name.word) return name.type;
-  }
+  if (const auto type = type_named(word)) return *type;
   throw Failure(kUsage, "--type: there is no type " + in_quotes(word) +
                             "; choose integer, short, real, double or string");
 }
@@ -101,7 +90,7 @@ tevpf::Parameter define_parameter(const std::string& name, const tevpf::Paramete
     if (keeps_type) return *before;
     tevpf::Parameter made(name, zero_of(type));
     if (before != nullptr) keep_texts(made, *before);
-    if (is_floating(type)) made.precision(precision_of(text));
+    if (is_floating(type)) made.precision(precision_for(text));
     return made;
   };
   tevpf::Parameter result = start();

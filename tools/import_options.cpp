@@ -11,8 +11,6 @@
 namespace tool {
 namespace {
 
-constexpr Type kTypes[] = {Type::int32, Type::int16, Type::float32, Type::float64, Type::string};
-
 Type parse_type(const std::string& word) {
   if (const auto type = type_named(word)) return *type;
   throw Failure(kUsage, "--types: " + in_quotes(word) +
@@ -53,13 +51,6 @@ void read_widths(const std::vector<std::string>& given, ImportOptions& options) 
 }
 
 }  // namespace
-
-std::optional<Type> type_named(std::string_view word) {
-  for (const Type type : kTypes) {
-    if (word == tevpf::to_string(type)) return type;
-  }
-  return std::nullopt;
-}
 
 ImportOptions import_options(const Arguments& arguments) {
   ImportOptions options;

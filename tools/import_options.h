@@ -50,7 +50,4 @@ struct ImportOptions {
 // A Failure (kUsage) when an option says nothing that can be meant.
 ImportOptions import_options(const Arguments& arguments);
 
-// The type of that name ("integer", ...).
-std::optional<tevpf::Type> type_named(std::string_view word);
-
 }  // namespace tool

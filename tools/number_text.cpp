@@ -5,23 +5,13 @@
 #include <cstddef>
 #include <cstdint>
 
+#include "text.h"
 #include "values.h"
 
 namespace tool {
 namespace {
 
 constexpr int kExactDigits = 15;  // every number of so many digits is that of one double alone
-
-bool is_digit(char c) { return c >= '0' && c <= '9'; }
-
-int significant_digits(double number) {
-  const std::string text = exact_text(number);
-  const std::string_view mantissa = std::string_view(text).substr(0, text.find('e'));
-  const std::size_t first = mantissa.find_first_of("123456789");
-  if (first == std::string_view::npos) return 1;
-  return static_cast<int>(std::count_if(mantissa.begin() + static_cast<std::ptrdiff_t>(first),
-                                        mantissa.end(), is_digit));
-}
 
 // Digits that a number would lose make a text: leading zeros, and integers beyond what a double
 // tells apart.
@@ -41,7 +31,7 @@ NumberText read_any(std::string_view text) {
   if (!result.has_digits) return result;
   std::int32_t integer = 0;
   result.is_integer = parse_number(text, integer) == Parsed::kValue;
-  result.precision = significant_digits(number);
+  result.precision = significant_digits(exact_text(number));
   return result;
 }
 
@@ -82,6 +72,20 @@ NumberText read_number_text(std::string_view text, char point) {
   if (point == '.') return read_any(text);
   const std::string plain = with_decimal_point(text);
   return plain.empty() ? NumberText{} : read_any(plain);
+}
+
+tevpf::Type guess_type(std::string_view text) {
+  const std::string_view number = trimmed(text);
+  const NumberText read = number.empty() ? NumberText{} : read_number_text(number, '.');
+  if (!read.has_digits) return Type::string;
+  return read.is_integer ? Type::int32 : Type::float64;
+}
+
+std::int32_t precision_for(std::string_view number) {
+  constexpr std::int32_t kLeast = 6;
+  double value = 0;
+  if (parse_number(number, value) != Parsed::kValue) return kLeast;
+  return std::clamp(significant_digits(exact_text(value)), kLeast, kMostPrecision);
 }
 
 std::string with_decimal_point(std::string_view text) {

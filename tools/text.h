@@ -29,6 +29,8 @@ std::string_view first_characters(std::string_view text, std::size_t count);
 
 bool is_utf8(std::string_view text);
 
+inline bool is_digit(char byte) { return byte >= '0' && byte <= '9'; }
+
 std::string_view trimmed(std::string_view text);  // without blanks and tabs at both ends
 
 // The front of a text that has `size` bytes at most and ends with a whole character of UTF-8.

@@ -18,29 +18,16 @@ Parsed parse_as(std::string_view text, Value& value) {
   return parsed;
 }
 
-constexpr std::size_t kExactDigits = 15;  // every integer of so many digits is a double
-constexpr std::int32_t kLeastPrecision = 6, kMostPrecision = 17;
-
-bool is_digit(char c) { return c >= '0' && c <= '9'; }
-
-// Whether reading text as a number would lose digits that may matter: leading zeros, and integers
-// beyond what a double tells apart.
-bool would_lose_digits(std::string_view text) {
-  if (text.starts_with('-') || text.starts_with('+')) text.remove_prefix(1);
-  if (text.size() > 1 && text[0] == '0' && is_digit(text[1])) return true;
-  return text.size() > kExactDigits && std::all_of(text.begin(), text.end(), is_digit);
-}
-
-// Of a number's shortest text: without zeros at either end.
-std::int32_t significant_digits(std::string_view text) {
-  const std::string_view mantissa = text.substr(0, text.find('e'));
-  static constexpr std::string_view kNotZero = "123456789";
-  const std::size_t first = mantissa.find_first_of(kNotZero);
-  if (first == std::string_view::npos) return 1;
-  const std::string_view digits =
-      mantissa.substr(first, mantissa.find_last_of(kNotZero) + 1 - first);
-  return static_cast<std::int32_t>(std::count_if(digits.begin(), digits.end(), is_digit));
-}
+struct TypeName {
+  std::string_view word;
+  Type type;
+};
+constexpr TypeName kTypeNames[] = {
+    {"integer", Type::int32},   {"short", Type::int16},     {"real", Type::float32},
+    {"double", Type::float64},  {"string", Type::string},   {"int", Type::int32},
+    {"int32", Type::int32},     {"int16", Type::int16},     {"float", Type::float32},
+    {"float32", Type::float32}, {"float64", Type::float64}, {"text", Type::string},
+};
 
 // Whether a bound says more than what the type can hold.
 template <class Limit>
@@ -66,30 +53,29 @@ bool is_one_sided(std::string_view bounds) {
 
 }  // namespace
 
-bool is_floating(Type type) { return type == Type::float32 || type == Type::float64; }
-
-Type guess_type(std::string_view text) {
-  const std::string_view number = trimmed(text);
-  Value value;
-  if (would_lose_digits(number) || std::none_of(number.begin(), number.end(), is_digit)) {
-    return Type::string;
-  }
-  for (const Type type : {Type::int32, Type::float64}) {
-    if (parse_value(type, number, value) == Parsed::kValue) return type;
-  }
-  return Type::string;
+std::int32_t significant_digits(std::string_view exact) {
+  const std::string_view mantissa = exact.substr(0, exact.find('e'));
+  static constexpr std::string_view kNotZero = "123456789";
+  const std::size_t first = mantissa.find_first_of(kNotZero);
+  if (first == std::string_view::npos) return 1;
+  const std::string_view digits =
+      mantissa.substr(first, mantissa.find_last_of(kNotZero) + 1 - first);
+  return static_cast<std::int32_t>(std::count_if(digits.begin(), digits.end(), is_digit));
 }
+
+std::optional<Type> type_named(std::string_view word) {
+  for (const TypeName& name : kTypeNames) {
+    if (word == name.word) return name.type;
+  }
+  return std::nullopt;
+}
+
+bool is_floating(Type type) { return type == Type::float32 || type == Type::float64; }
 
 Value zero_of(Type type) {
   Value zero = std::string();
   if (type != Type::string) parse_value(type, "0", zero);
   return zero;
-}
-
-std::int32_t precision_of(std::string_view number) {
-  Value value;
-  if (parse_value(Type::float64, number, value) != Parsed::kValue) return kLeastPrecision;
-  return std::clamp(significant_digits(exact_text(value)), kLeastPrecision, kMostPrecision);
 }
 
 std::string with_article(Type type) {

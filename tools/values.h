@@ -16,15 +16,12 @@ namespace tool {
 using tevpf::Type;
 using tevpf::Value;
 
+// The type of that name: "integer", "double"; also by its size, "int32".
+std::optional<Type> type_named(std::string_view word);
+
 bool is_floating(Type type);  // real or double
 
-// The type that a value most likely has: integer, else double, else string.
-Type guess_type(std::string_view text);
-
 Value zero_of(Type type);  // 0, or the empty text
-
-// Significant digits that show the number exactly, at least those of a new definition.
-std::int32_t precision_of(std::string_view number);
 
 // "an integer", "a double".
 std::string with_article(Type type);
@@ -39,6 +36,9 @@ Parsed parse_number(std::string_view text, T& number);
 
 // The shortest text that reads back as the same value.
 std::string exact_text(const Value& value);
+
+// Of a number as exact_text writes it: its digits without zeros at either end, at least 1.
+std::int32_t significant_digits(std::string_view exact);
 
 // Floating values with that many significant digits (0: exact), or fewer when these are exact; the
 // others exact.
