@@ -1,8 +1,8 @@
-# 64-bit Windows, cross-built with mingw-w64 (Debian: g++-mingw-w64-x86-64-win32).
+# 64-bit Windows, cross-built with mingw-w64 (Debian: g++-mingw-w64-x86-64-posix).
 set(CMAKE_SYSTEM_NAME Windows)
 set(CMAKE_SYSTEM_PROCESSOR x86_64)
-set(CMAKE_C_COMPILER x86_64-w64-mingw32-gcc-win32)
-set(CMAKE_CXX_COMPILER x86_64-w64-mingw32-g++-win32)
+set(CMAKE_C_COMPILER x86_64-w64-mingw32-gcc-posix)
+set(CMAKE_CXX_COMPILER x86_64-w64-mingw32-g++-posix)
 set(CMAKE_RC_COMPILER x86_64-w64-mingw32-windres)
 set(CMAKE_EXE_LINKER_FLAGS_INIT "-static")
 set(CMAKE_FIND_ROOT_PATH /usr/x86_64-w64-mingw32)
