@@ -18,7 +18,7 @@ class WindowsFilesTest : public LibraryTest {
     ASSERT_EQ(TEV8R1_PF_open(path.c_str()), PF_NEWFILE);
     add_list("L");
     ASSERT_EQ(TEV8R1_PF_close(1), PF_NORMAL);
-    ASSERT_EQ(read_file(path).size(), 120u);
+    ASSERT_EQ(fs::file_size(wide(path)), 120u);
   }
   static fs::path wide(const std::string& name) {
     return fs::path(std::u8string(name.begin(), name.end()));
@@ -37,7 +37,7 @@ TEST_F(WindowsFilesTest, NamesAreUtf8) {
   for (const std::string& path : {folder + "\\" + name, "$PFDIR/" + name}) {
     ASSERT_EQ(TEV8R1_PF_open(path.c_str()), PF_NORMAL) << path;
     ASSERT_EQ(TEV8R1_PF_save(nullptr), PF_NORMAL);
-    ASSERT_EQ(TEV8R1_PF_dump_file((path + ".txt").c_str()), PF_NORMAL);
+    ASSERT_EQ(TEV8R1_PF_dump_file((folder + "/\xE6\x96\x87").c_str()), PF_NORMAL);
     ASSERT_EQ(TEV8R1_PF_close(0), PF_NORMAL);
   }
   _wputenv(L"$PFDIR=");
@@ -78,6 +78,7 @@ TEST_F(WindowsFilesTest, AFileThatIsInUseIsWrittenPlainly) {
 TEST_F(WindowsFilesTest, AReadOnlyFileIsNotSaved) {
   make(at("a"));
   SetFileAttributesA(at("a").c_str(), FILE_ATTRIBUTE_READONLY);
+  if (std::ofstream(at("a"), std::ios::app)) GTEST_SKIP() << "Wine lets the administrator write it";
   ASSERT_EQ(TEV8R1_PF_open(at("a").c_str()), PF_NORMAL);
   expect_answer(TEV8R1_PF_save(nullptr), PF_NOPRIV, {at("a"), ""});
   ASSERT_EQ(TEV8R1_PF_save(at("copy").c_str()), PF_NORMAL);
