@@ -8,7 +8,7 @@ checks=("$@")
 scripts/install-packages.sh build tool test lint
 
 mapfile -t sources < <(git ls-files '*.cpp' '*.c' '*.h' '*.hpp')
-mapfile -t library < <(git ls-files 'core/*.cpp' 'values/*.cpp' 'lists/*.cpp' 'tables/*.cpp' 'reports/*.cpp' 'tools/*.cpp')
+mapfile -t library < <(git ls-files 'core/*.cpp' 'values/*.cpp' 'lists/*.cpp' 'tables/*.cpp' 'reports/*.cpp' 'sql/*.cpp' 'tools/*.cpp')
 
 check_format() { clang-format --dry-run -Werror "${sources[@]}"; }
 

@@ -12,10 +12,10 @@ import sys
 
 # From bottom to top; folders on the same line do not depend on each other.
 LAYERS = [["include"], ["core/base"], ["core/sequence"], ["core/io"], ["core"], ["values"],
-          ["lists", "tables"], ["reports"], ["include/tevpf"], ["tools"]]
+          ["lists", "tables"], ["reports"], ["include/tevpf"], ["sql"], ["tools"]]
 PUBLIC = {"include", "include/tevpf"}
-# These use only the public headers, as any program does.
-OUTSIDE = {"include/tevpf", "tools"}
+# These use only the public headers, as any program does; the tool the engine of SQL as well.
+OUTSIDE = {"include/tevpf": PUBLIC, "sql": PUBLIC, "tools": PUBLIC | {"sql"}}
 
 ROOT = pathlib.Path(__file__).resolve().parent.parent
 RANKS = {folder: rank for rank, folders in enumerate(LAYERS) for folder in folders}
@@ -28,7 +28,7 @@ def folder_of(unit):
 def is_allowed(unit, target):
     here, there = folder_of(unit), folder_of(target)
     if here in OUTSIDE:
-        return there in {here, *PUBLIC}
+        return there == here or there in OUTSIDE[here]
     return here == there or RANKS[there] < RANKS[here]
 
 

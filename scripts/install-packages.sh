@@ -5,8 +5,8 @@ set -euo pipefail
 
 declare -A groups=(
   [build]="cmake ninja-build g++"
-  [tool]="libcli11-dev nlohmann-json3-dev"
-  [test]="libgtest-dev pkg-config python3 strace"
+  [tool]="libcli11-dev nlohmann-json3-dev libsqlite3-dev"
+  [test]="libgtest-dev pkg-config python3 sqlite3 strace"
   [bench]="libbenchmark-dev libsqlite3-dev nlohmann-json3-dev python3"
   [x86]="g++-multilib googletest"
   [windows]="g++-mingw-w64-i686-win32"

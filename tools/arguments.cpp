@@ -31,11 +31,16 @@ const Argument kArguments[] = {
     {"VALUE", nullptr, nullptr, "The new value; put -- before one like -x", &Arguments::value},
     {"NEW", nullptr, nullptr, "The new name, at most 19 characters", &Arguments::new_name},
     {"CSV", nullptr, nullptr, "The CSV file, - for standard input", &Arguments::csv},
+    {"SQL", nullptr, nullptr, "The statements; without them, those on standard input",
+     &Arguments::statements},
     {"-o", "-o,--output", "OUT", "Write to OUT instead of standard output", &Arguments::output},
     {"--columns", "--columns", "A,B,...", "Show these columns, in this order", &Arguments::columns},
     {"--sort", "--sort", "COLUMN", "Show rows in the order of this column", &Arguments::sort},
     {"--from", "--from", "ROW", "First row to show, counted from 1", &Arguments::from},
     {"--to", "--to", "ROW", "Last row to show", &Arguments::to},
+    {"--with", "--with", "OTHER", "Another file, in SQL by its name without ending",
+     &Arguments::with},
+    {"--csv", "--csv", nullptr, "Write CSV", &Arguments::as_csv},
     {"--json", "--json", nullptr, "Write JSON", &Arguments::json},
     {"--names", "--names", nullptr, "Print the names of the elements alone", &Arguments::names},
     {"--list", "--list", nullptr, "The name is that of a list", &Arguments::list},
@@ -88,6 +93,7 @@ bool read_arguments(const Command& command, int argc, const char* const* argv, A
   app.allow_windows_style_options(false);
   declare_all(app, command.arguments, arguments);
   if (CLI::Option* list = app.get_option_no_throw("--list")) list->excludes("--table");
+  if (CLI::Option* csv = app.get_option_no_throw("--csv")) csv->excludes("--json");
   try {
     app.parse(argc, argv);
     return true;

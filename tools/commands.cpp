@@ -14,6 +14,7 @@ constexpr Command kCommands[] = {
     {"export", "Write a list or a table as CSV", "FILE ELEMENT -o --list --table", run_export},
     {"import", "Add the rows of a CSV file to a table, made when it is not there", "FILE TABLE CSV",
      run_import},
+    {"sql", "Run SQL statements over FILE", "FILE [SQL] --with --csv --json", run_sql},
     {"check", "Say whether FILE is in order, or what is wrong and where", "FILE", run_check},
     {"new", "Make an empty FILE", "FILE", run_new},
     {"rm", "Remove a list or a table", "FILE ELEMENT --list --table", run_rm},

@@ -13,10 +13,11 @@ namespace tool {
 
 // What the command line said. A command reads the members that its row in the table declares.
 struct Arguments {
-  std::string file, element, parameter, value, new_name, csv, output, sort;
-  std::vector<std::string> columns;
+  std::string file, element, parameter, value, new_name, csv, output, sort, statements;
+  std::vector<std::string> columns, with;
   std::size_t from = 0, to = 0;  // 0: not given
   bool json = false, names = false, list = false, table = false, force = false;
+  bool as_csv = false;
 
   Kind kind() const {
     return list ? Kind(tevpf::Kind::list) : table ? Kind(tevpf::Kind::table) : Kind();
@@ -44,5 +45,6 @@ ExitStatus run_new(const Arguments& arguments);
 ExitStatus run_rm(const Arguments& arguments);
 ExitStatus run_set(const Arguments& arguments);
 ExitStatus run_show(const Arguments& arguments);
+ExitStatus run_sql(const Arguments& arguments);
 
 }  // namespace tool
