@@ -38,4 +38,5 @@ if(TARGET tevpf_tool)
   install(FILES tools/tevpf.1 DESTINATION "${CMAKE_INSTALL_MANDIR}/man1" COMPONENT tool)
   install(FILES tools/tevpf.bash DESTINATION "${CMAKE_INSTALL_DATADIR}/bash-completion/completions"
     RENAME tevpf COMPONENT tool)
+  install(FILES tools/_tevpf DESTINATION "${CMAKE_INSTALL_DATADIR}/zsh/site-functions" COMPONENT tool)
 endif()

@@ -3,7 +3,7 @@
 find_package(SQLite3 3.38 QUIET)
 find_package(Threads QUIET)
 set(TEVPF_SQLITE_WORKS OFF)
-if(SQLite3_FOUND AND Threads_FOUND AND UNIX)
+if(PROJECT_IS_TOP_LEVEL AND SQLite3_FOUND AND Threads_FOUND AND UNIX)
   find_library(TEVPF_SQLITE_ARCHIVE libsqlite3.a)
   mark_as_advanced(TEVPF_SQLITE_ARCHIVE)
   set(libraries "${SQLite3_LIBRARIES}")

@@ -27,8 +27,8 @@
  *   Costs      n is the number of parameters, rows or elements that the operation works on. An
  *              operation whose comment states no cost takes O(1). Finding what is named comes on
  *              top: an element takes O(1), a column O(columns), a parameter O(1) by its exact name
- *              and O(log n) by a pattern. The first n / 16 look-ups by exact name after a change of
- *              the list's names or order also take O(log n).
+ *              and O(log n) by a pattern. The first n / 16 look-ups by exact name in a list also take
+ *              O(log n).
  *
  * This header declares the operations that programs need. The library also exports its internal
  * operations on records; the headers beside their sources declare them and are not installed.
@@ -366,11 +366,15 @@ TEVPF_API TEVPF_STATUS TEV8R1_string_compare(const char* text, const char* patte
  * Every operation that names a list, here and in the next two groups: PF_NOFILE, PF_NOELEM (no such
  * list). Every operation that names a parameter: PF_NOPARAM (no such parameter). A parameter name
  * whose first "*" is its last byte is a pattern: it finds the first parameter, in name order, that
- * starts with the bytes before the "*". Positions count from 0. */
+ * starts with the bytes before the "*". Positions count from 0.
+ *
+ * Adding, deleting, renaming and moving a parameter costs O(log n) comparisons and moves of a few
+ * hundred entries, at any size. What goes over the whole list afterwards (saving, dumps, copies) first
+ * takes O(n) to put it in order again, and may return PF_NOMEM. */
 
 /* Adds a parameter before the one at `position`. PF_END_POS or a position after the last one adds
  * it at the end, a negative position at the front. str.length is ignored, and a null str.value is
- * the empty text. O(n) moves of index entries; adding at the end moves no record.
+ * the empty text.
  *   PF_DUPLICATE  the list has a parameter of that name
  *   PF_BADNAME    the name starts with a blank
  *   PF_BADTYPE    no such value type
@@ -381,7 +385,7 @@ TEVPF_API TEVPF_STATUS TEV8R1_string_compare(const char* text, const char* patte
 TEVPF_API TEVPF_STATUS TEV8R1_PF_add_param(const char* list_name, const TEVPF_PARAM_DEF* definition,
                                            int32_t position) TEVPF_NOEXCEPT;
 
-/* Deletes a parameter. O(n). The cursor is a position and is not adjusted. */
+/* Deletes a parameter. The cursor is a position and is not adjusted. */
 TEVPF_API TEVPF_STATUS TEV8R1_PF_delete_param(const char* list_name,
                                               const char* param_name) TEVPF_NOEXCEPT;
 
@@ -391,12 +395,12 @@ TEVPF_API TEVPF_STATUS TEV8R1_PF_delete_param(const char* list_name,
 TEVPF_API TEVPF_STATUS TEV8R1_PF_modify_param_def(const char* list_name,
                                                   TEVPF_PARAM_DEF definition) TEVPF_NOEXCEPT;
 
-/* Renames a parameter. The new name is cut to 19 bytes and not checked for a blank. O(n).
+/* Renames a parameter. The new name is cut to 19 bytes and not checked for a blank.
  *   PF_DUPLICATE  another parameter has the new name */
 TEVPF_API TEVPF_STATUS TEV8R1_PF_modify_param_name(const char* list_name, const char* old_name,
                                                    const char* new_name) TEVPF_NOEXCEPT;
 
-/* Moves a parameter to new_position (PF_END_POS: last). O(n). The cursor is not adjusted.
+/* Moves a parameter to new_position (PF_END_POS: last). The cursor is not adjusted.
  *   PF_BADPOS  new_position is outside 0..n-1 */
 TEVPF_API TEVPF_STATUS TEV8R1_PF_move_param(const char* list_name, const char* param_name,
                                             int32_t new_position) TEVPF_NOEXCEPT;

@@ -38,6 +38,7 @@
 #include "tevpf/list.hpp"
 #include "tevpf/parameter.hpp"
 #include "tevpf/row.hpp"
+#include "tevpf/row_layout.hpp"
 #include "tevpf/row_range.hpp"
 #include "tevpf/table.hpp"
 #include "tevpf/value.hpp"

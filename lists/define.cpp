@@ -2,7 +2,6 @@
 // before it changes the list.
 #include <algorithm>
 #include <cstring>
-#include <limits>
 
 #include "core/base/heap.h"
 #include "core/base/status.h"
@@ -12,49 +11,27 @@
 #include "lists/name_index.h"
 #include "lists/param_check.h"
 #include "lists/param_record.h"
+#include "lists/param_store.h"
 #include "values/text_compare.h"
 
 namespace tevpf {
 namespace {
 
-constexpr std::int64_t kMostSlots = std::numeric_limits<std::int32_t>::max();
-
-// Gives both arrays at least `slots` slots; when out of memory, the list remains valid.
-bool make_room(TEVPF_LIST& list, std::int64_t slots) noexcept {
-  if (slots <= list.param_room) return true;
-  if (slots > kMostSlots) return false;
-  const std::int64_t room = std::min(grown_room(list.param_room, slots), kMostSlots);
-  const auto entries = static_cast<std::uint64_t>(room);
-  void* const params = heap_resize(list.param_ptr, entries, sizeof(TEVPF_PARAM));
-  if (params == nullptr) return false;
-  list.param_ptr = static_cast<TEVPF_PARAM*>(params);
-  void* const index = heap_resize(list.index_ptr, entries, sizeof(std::int32_t));
-  if (index == nullptr) return false;
-  list.index_ptr = static_cast<std::int32_t*>(index);
-  list.param_room = static_cast<std::int32_t>(room);
-  return true;
-}
-
-// Full arrays get the documented number of spare slots; the count does not depend on how many slots
-// are allocated.
+// A full list gets the documented number of spare slots; the count does not depend on how many
+// slots are allocated.
 TEVPF_STATUS ensure_free_slot(TEVPF_LIST& list) noexcept {
   if (list.free_params > 0) return PF_NORMAL;
   const std::int32_t increment = library.alloc_increment;
-  if (!make_room(list, std::int64_t{list.num_params} + increment)) return fail_empty(PF_NOMEM);
+  if (!reserve_params(list, std::int64_t{list.num_params} + increment)) return fail_empty(PF_NOMEM);
   list.free_params = increment;
   return PF_NORMAL;
 }
 
-// Stores a record that owns its texts at a position, and its index entry at a place.
-void insert_param(TEVPF_LIST& list, const TEVPF_PARAM& param, std::int32_t position,
+// Allocates what adding the parameter there can need, copies of its texts last.
+bool ready_to_add(TEVPF_LIST& list, TEVPF_PARAM_DEF& definition, std::int32_t position,
                   std::int32_t place) noexcept {
-  TEVPF_PARAM* const slot = list.param_ptr + position;
-  const auto behind = static_cast<std::size_t>(list.num_params - position);
-  std::memmove(slot + 1, slot, behind * sizeof *slot);
-  *slot = param;
-  index_param(list, position, place);
-  ++list.num_params;
-  --list.free_params;
+  return ready_to_insert_name(list, place, next_slot(list)) &&
+         ready_to_insert_param(list, position) && own_texts(definition);
 }
 
 // The new texts and the change in size of a parameter, prepared before it is redefined.
@@ -117,17 +94,27 @@ TEVPF_STATUS TEV8R1_PF_add_param(const char* list_name, const TEVPF_PARAM_DEF* d
   param.def = *definition;
   PF_TRY(normalise(param.def));
   const char* const name = param.def.name;
-  TEVPF_PARAM* other;
-  std::int32_t place;
-  if (TEV8R1_get_param_ptr(list, name, &other, &place) == PF_NORMAL) {
+  const NamePlace wanted = search_names(*list, name);
+  if (wanted.found) {
     return fail(PF_DUPLICATE, {"parameter ", name}, {"list ", list->header.elem_name});
   }
+  // The look-up of an absent name always sets the error context, even here, where absence is
+  // success.
+  static_cast<void>(fail(PF_NOPARAM, name));
   PF_TRY(TEV8R1_validate_param_def(list, param.def));
   const std::int64_t bytes = stored_size(param.def);
-  if (!btf_can_change(*list, bytes) || !own_texts(param.def)) return fail_empty(PF_NOMEM);
+  const std::int32_t target = std::clamp(position, 0, list->num_params);
+  if (!btf_can_change(*list, bytes) ||
+      !ready_to_add(*list, param.def, target, wanted.place.position)) {
+    return fail_empty(PF_NOMEM);
+  }
 
   param.desc_loc = description_place(param.def);
-  insert_param(*list, param, std::clamp(position, 0, list->num_params), place);
+  const std::int32_t slot = next_slot(*list);
+  insert_param(*list, target, param);
+  insert_name(*list, wanted.place, slot);
+  ++list->num_params;
+  --list->free_params;
   list->header.btf += static_cast<std::int32_t>(bytes);
   return PF_NORMAL;
 }
@@ -135,13 +122,13 @@ TEVPF_STATUS TEV8R1_PF_add_param(const char* list_name, const TEVPF_PARAM_DEF* d
 TEVPF_STATUS TEV8R1_PF_modify_param_def(const char* list_name,
                                         TEVPF_PARAM_DEF definition) noexcept {
   TEVPF_LIST* list;
-  std::int32_t position;
+  std::int32_t slot;
   PF_TRY(find_list(list_name, list));
   PF_TRY(normalise(definition));
-  PF_TRY(find_param(*list, definition.name, position));
+  PF_TRY(find_param(*list, definition.name, slot));
   PF_TRY(TEV8R1_validate_param_def(list, definition));
 
-  TEVPF_PARAM& param = list->param_ptr[position];
+  TEVPF_PARAM& param = param_in(*list, slot);
   Redefinition change;
   PF_TRY(prepare(*list, param.def, definition, change));
   redefine(*list, param, definition, change);

@@ -15,10 +15,6 @@ TEVPF_STATUS find_list(const char* name, TEVPF_LIST*& list) noexcept {
 
 using namespace tevpf;
 
-TEVPF_STATUS TEV8R1_get_list_ptr(const char* name, TEVPF_LIST** list_out) noexcept {
-  return find_list(name, *list_out);
-}
-
 TEVPF_STATUS TEV8R1_get_list_array_pos(const TEVPF_LIST* list, std::int32_t* pos_out) noexcept {
   return element_position(PF_ELEM_LIST, reinterpret_cast<const TEVPF_ELEM_HEADER*>(list), *pos_out);
 }

@@ -6,11 +6,6 @@
 
 extern "C" {
 
-// Find a list by its exact name.
-//   PF_NOFILE  no file is current; texts empty
-//   PF_NOELEM  no such list; texts: "list", the name
-TEVPF_API TEVPF_STATUS TEV8R1_get_list_ptr(const char* name, TEVPF_LIST** list_out) noexcept;
-
 TEVPF_API TEVPF_STATUS TEV8R1_get_list_array_pos(const TEVPF_LIST* list,
                                                  std::int32_t* pos_out) noexcept;
 TEVPF_API TEVPF_STATUS TEV8R1_create_list(TEVPF_ELEM_HEADER header, TEVPF_LIST** list_out) noexcept;
@@ -32,7 +27,9 @@ inline TEVPF_LIST* last_list(const char* name) noexcept {
   return as_list(last_element(PF_ELEM_LIST, name));
 }
 
-// Finds a list as TEV8R1_get_list_ptr does.
+// Finds a list of the current file by its exact name, whatever state it is in.
+//   PF_NOFILE  no file is current; texts empty
+//   PF_NOELEM  no such list; texts: "list", the name
 [[nodiscard]] TEVPF_STATUS find_list(const char* name, TEVPF_LIST*& list) noexcept;
 
 // The list at a position of the directory.

@@ -28,9 +28,9 @@ TEVPF_STATUS TEV8R1_PF_inq_param_size(const char* list_name, const char* param_n
                                       std::int32_t* type_out, std::int32_t* value_size_out,
                                       std::int32_t* desc_size_out) noexcept {
   TEVPF_LIST* list;
-  std::int32_t position;
-  PF_TRY(find_param_of(list_name, param_name, list, position));
-  return sizes_of(list->param_ptr[position].def, type_out, value_size_out, desc_size_out);
+  std::int32_t slot;
+  PF_TRY(find_param_of(list_name, param_name, list, slot));
+  return sizes_of(param_in(*list, slot).def, type_out, value_size_out, desc_size_out);
 }
 
 TEVPF_STATUS TEV8R1_PF_inq_param_size_by_pos(const char* list_name, std::int32_t position,
@@ -38,16 +38,16 @@ TEVPF_STATUS TEV8R1_PF_inq_param_size_by_pos(const char* list_name, std::int32_t
                                              std::int32_t* desc_size_out) noexcept {
   TEVPF_LIST* list;
   PF_TRY(find_list_with(list_name, position, list));
-  return sizes_of(list->param_ptr[position].def, type_out, value_size_out, desc_size_out);
+  return sizes_of(param_at(*list, position).def, type_out, value_size_out, desc_size_out);
 }
 
 TEVPF_STATUS TEV8R1_PF_inq_next_param_size(const char* list_name, std::int32_t* type_out,
                                            std::int32_t* value_size_out,
                                            std::int32_t* desc_size_out) noexcept {
   TEVPF_LIST* list;
-  PF_TRY(find_list(list_name, list));
+  PF_TRY(find_list_to_read(list_name, list));
   if (list->cur_param >= list->num_params - 1) return PF_NOMORE;
-  const TEVPF_PARAM_DEF& definition = list->param_ptr[list->cur_param + 1].def;
+  const TEVPF_PARAM_DEF& definition = param_at(*list, list->cur_param + 1).def;
   return sizes_of(definition, type_out, value_size_out, desc_size_out);
 }
 
@@ -61,24 +61,24 @@ TEVPF_STATUS TEV8R1_PF_inq_num_params(const char* list_name, std::int32_t* count
 TEVPF_STATUS TEV8R1_inq_param_pos(const char* list_name, const char* param_name,
                                   std::int32_t* position_out) noexcept {
   TEVPF_LIST* list;
-  std::int32_t position;
-  PF_TRY(find_param_of(list_name, param_name, list, position));
-  *position_out = position;
+  std::int32_t slot;
+  PF_TRY(find_param_of(list_name, param_name, list, slot));
+  *position_out = position_of(*list, slot);
   return PF_NORMAL;
 }
 
 TEVPF_STATUS TEV8R1_inq_param_exists(const char* list_name, const char* param_name) noexcept {
   TEVPF_LIST* list;
-  std::int32_t position;
-  return find_param_of(list_name, param_name, list, position);
+  std::int32_t slot;
+  return find_param_of(list_name, param_name, list, slot);
 }
 
 TEVPF_STATUS TEV8R1_get_param_type(const char* list_name, const char* param_name,
                                    std::int32_t* type_out) noexcept {
   TEVPF_LIST* list;
-  std::int32_t position;
-  PF_TRY(find_param_of(list_name, param_name, list, position));
-  *type_out = list->param_ptr[position].def.type;
+  std::int32_t slot;
+  PF_TRY(find_param_of(list_name, param_name, list, slot));
+  *type_out = param_in(*list, slot).def.type;
   return PF_NORMAL;
 }
 

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <cstring>
+#include <utility>
 
 #include "core/base/permutation.h"
 #include "core/base/status.h"
@@ -11,6 +12,7 @@
 #include "lists/list_fields.h"
 #include "lists/name_index.h"
 #include "lists/param_record.h"
+#include "lists/param_store.h"
 
 namespace tevpf {
 
@@ -139,10 +141,9 @@ Parsed take_body(Body& body, TEVPF_LIST& list) noexcept {
   if (count > body.left() / stored_size(kParamFields))
     return Parsed::kBroken;  // whatever their types
   if (count != 0) {
-    list.param_ptr = new_array<TEVPF_PARAM>(static_cast<std::uint64_t>(count)).release();
-    list.index_ptr = new_array<std::int32_t>(static_cast<std::uint64_t>(count)).release();
-    if (list.param_ptr == nullptr || list.index_ptr == nullptr) return Parsed::kNoMemory;
-    list.param_room = count;
+    auto index = new_array<std::int32_t>(static_cast<std::uint64_t>(count));
+    if (!index || !reserve_params(list, count)) return Parsed::kNoMemory;
+    adopt_names(list, std::move(index), count);
   }
   const Parsed parsed = take_params(body, count, list);
   // A truncated body is invalid, whatever it contains.

@@ -5,6 +5,7 @@
 #include "lists/list_builder.h"
 #include "lists/list_fields.h"
 #include "lists/list_writer.h"
+#include "lists/settle.h"
 
 namespace tevpf {
 
@@ -21,7 +22,7 @@ const ElementKind list_kind = {
         },
     .copy =
         [](TEVPF_ELEM_HEADER& source, TEVPF_ELEM_HEADER& copy) noexcept {
-          return copy_list_body(*as_list(&source), *as_list(&copy));
+          return settle(*as_list(&source)) && copy_list_body(*as_list(&source), *as_list(&copy));
         },
     .release = [](TEVPF_ELEM_HEADER* element) noexcept { release_list(as_list(element)); },
     .read = build_list,

@@ -1,12 +1,16 @@
 // Whole list records: their release, their copy and their first storage.
+#include <algorithm>
 #include <cstring>
+#include <utility>
 
 #include "core/base/heap.h"
 #include "core/base/text_field.h"
 #include "lists/default_table.h"
 #include "lists/list.h"
+#include "lists/name_index.h"
 #include "lists/name_table.h"
 #include "lists/param_record.h"
+#include "lists/param_store.h"
 
 namespace tevpf {
 namespace {
@@ -22,9 +26,9 @@ std::int64_t text_bytes(const TEVPF_LIST& list) noexcept {
 
 // Copies the records into `half`; its num_params counts the complete ones.
 bool copy_params(const TEVPF_LIST& source, TEVPF_LIST& half) noexcept {
-  half.param_ptr = new_array<TEVPF_PARAM>(static_cast<std::uint32_t>(source.num_params)).release();
+  if (!reserve_params(half, source.num_params)) return false;
   TextPacker packer;
-  if (half.param_ptr == nullptr || !packer.reserve(text_bytes(source), half.texts)) return false;
+  if (!packer.reserve(text_bytes(source), half.texts)) return false;
   for (std::int32_t& i = half.num_params; i < source.num_params; ++i) {
     TEVPF_PARAM_DEF& definition = (half.param_ptr[i] = source.param_ptr[i]).def;
     if (!own_texts(definition, text_sizes(definition), packer, half.texts)) return false;
@@ -33,24 +37,23 @@ bool copy_params(const TEVPF_LIST& source, TEVPF_LIST& half) noexcept {
 }
 
 bool copy_index(const TEVPF_LIST& source, TEVPF_LIST& half) noexcept {
-  half.index_ptr = static_cast<std::int32_t*>(heap_copy(
-      source.index_ptr,
-      std::uint64_t{sizeof(std::int32_t)} * static_cast<std::uint32_t>(source.num_params)));
-  return half.index_ptr != nullptr;
+  const auto count = static_cast<std::uint64_t>(source.num_params);
+  auto index = new_array<std::int32_t>(count);
+  if (!index) return false;
+  std::copy_n(source.index_ptr, count, index.get());
+  adopt_names(half, std::move(index), source.num_params);
+  half.index.in_order = source.index.in_order;
+  return true;
 }
 
 }  // namespace
 
 void release_contents(TEVPF_LIST& list) noexcept {
-  if (list.param_ptr != nullptr) {
-    for (std::int32_t i = 0; i < list.num_params; ++i)
-      release_texts(list.param_ptr[i].def, list.texts);
-  }
+  release_params(list);
   heap_free(list.texts.begin);
   release_defaults(list.dft_ptr);
   drop_table(list.names);
-  heap_free(list.index_ptr);
-  heap_free(list.param_ptr);
+  list.index.order.clear();
 }
 
 void release_list(TEVPF_LIST* list) noexcept {
@@ -72,20 +75,18 @@ bool copy_list_body(const TEVPF_LIST& source, TEVPF_LIST& copy) noexcept {
   set_field(half.header.elem_name, copy.header.elem_name);
   std::memcpy(half.RESERVED, source.RESERVED, sizeof half.RESERVED);
   half.cur_param = source.cur_param;
-  half.param_room = half.num_params;
-  half.names.in_order = source.names.in_order;
   copy = half;
   return true;
 }
 
 bool reserve_first_params(TEVPF_LIST& list, std::int32_t slots) noexcept {
-  Owned<TEVPF_PARAM> params = new_zeroed<TEVPF_PARAM>(static_cast<std::uint32_t>(slots));
-  Owned<std::int32_t> index = new_zeroed<std::int32_t>(static_cast<std::uint32_t>(slots));
+  const auto count = static_cast<std::uint64_t>(slots);
+  Owned<TEVPF_PARAM> params = new_zeroed<TEVPF_PARAM>(count);
+  Owned<std::int32_t> index = new_zeroed<std::int32_t>(count);
   if (!params || !index) return false;
-  list.param_ptr = params.release();
-  list.index_ptr = index.release();
+  adopt_params(list, std::move(params), slots);
+  adopt_names(list, std::move(index), slots);
   list.free_params = slots;
-  list.param_room = slots;
   return true;
 }
 

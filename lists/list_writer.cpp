@@ -5,6 +5,7 @@
 #include "core/base/status.h"
 #include "core/writer.h"
 #include "lists/list_fields.h"
+#include "lists/settle.h"
 #include "values/value_type.h"
 
 namespace tevpf {
@@ -35,6 +36,7 @@ TEVPF_STATUS put_param(Sink& sink, const TEVPF_PARAM& param) noexcept {
 }  // namespace
 
 TEVPF_STATUS store_list(Sink& sink, TEVPF_LIST& list) noexcept {
+  if (!settle(list)) return fail_empty(PF_NOMEM);
   sink.put(&list.header, sizeof list.header);
   put_fields<kListFields>(sink, &list);
   TEVPF_STATUS status = PF_NORMAL;

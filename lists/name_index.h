@@ -1,11 +1,13 @@
-// The name index of a list: the positions of its parameters, ordered by name. Apart from the
-// reader, the writer and the operations on whole records, only these functions access it.
+// The name index of a list: the slots of its parameters, ordered by name. Apart from the reader,
+// the writer and the operations on whole records, only these functions access it.
 //
-// Terms: a position counts parameters as the list presents them; a place counts them in name order.
+// An index from a file is accepted in any order; searches of it end, stay in bounds and change
+// nothing.
 #pragma once
 
 #include <cstdint>
 
+#include "core/base/heap.h"
 #include "lists/list.h"
 
 extern "C" {
@@ -15,43 +17,53 @@ extern "C" {
 TEVPF_API TEVPF_STATUS TEV8R1_list_binary_search(const TEVPF_PARAM* params, std::int32_t count,
                                                  const std::int32_t* index, const char* name,
                                                  std::int32_t* place_out) noexcept;
-TEVPF_API TEVPF_STATUS TEV8R1_get_param_ptr(TEVPF_LIST* list, const char* name,
-                                            TEVPF_PARAM** param_out,
-                                            std::int32_t* place_out) noexcept;
-
-// Removes the entry at a place; higher positions decrease by one. Always PF_NORMAL. The caller
-// updates num_params and the records.
-TEVPF_API TEVPF_STATUS TEV8R1_remove_param_from_index(TEVPF_LIST* list,
-                                                      std::int32_t place) noexcept;
 }
 
 namespace tevpf {
 
-// The position of the parameter that matches the name or pattern. Exact names take O(1) once there
+// The slot of the parameter that matches the name or pattern. Exact names take O(1) once there
 // have been enough look-ups to build the name table.
 //   PF_NOPARAM  none; texts: the name
 [[nodiscard]] TEVPF_STATUS find_param(TEVPF_LIST& list, const char* name,
-                                      std::int32_t& position) noexcept;
+                                      std::int32_t& slot) noexcept;
 
 struct NamePlace {
-  std::int32_t place;  // of the parameter found, otherwise the insertion place of the name
+  SequencePlace place;  // of the parameter found, otherwise the insertion place of the name
   bool found;
 };
 
-// The same as TEV8R1_list_binary_search over all parameters except the one at place `without`;
-// places are counted as if it were absent.
-NamePlace search_others(const TEVPF_LIST& list, std::int32_t without, const char* name) noexcept;
+// The place of the first parameter that matches the name or pattern.
+NamePlace search_names(TEVPF_LIST& list, const char* name) noexcept;
 
-// Adds a parameter whose record is already at `position`, before num_params counts it. Positions
-// from there on increase by one.
-void index_param(TEVPF_LIST& list, std::int32_t position, std::int32_t place) noexcept;
+// The same among all parameters except the one at place `without`; places are counted as if it were
+// absent.
+NamePlace search_others(TEVPF_LIST& list, std::int32_t without, const char* name) noexcept;
 
-// Moves the entry at place `from` to place `to`, counted without that entry.
-void move_place(TEVPF_LIST& list, std::int32_t from, std::int32_t to) noexcept;
+// ---- Changes; num_params is the count before them -----------------------------------------------
 
-// Updates the index for a parameter that moves between positions and for those that shift in
-// between.
-void move_position(TEVPF_LIST& list, std::int32_t from, std::int32_t to) noexcept;
+// Each allocates what the change may need. False when out of memory, and nothing has changed;
+// places stay valid.
+[[nodiscard]] bool ready_to_insert_name(TEVPF_LIST& list, std::int32_t place,
+                                        std::int32_t slot) noexcept;
+[[nodiscard]] bool ready_to_erase_name(TEVPF_LIST& list, std::int32_t place) noexcept;
+[[nodiscard]] bool ready_to_move_name(TEVPF_LIST& list, std::int32_t from,
+                                      std::int32_t to) noexcept;
+
+// Enters the name of the parameter in a slot, whose record is already there.
+void insert_name(TEVPF_LIST& list, const SequencePlace& place, std::int32_t slot) noexcept;
+// Removes the entry of a slot at a place; the record is still there.
+void erase_name(TEVPF_LIST& list, const SequencePlace& place, std::int32_t slot) noexcept;
+// Renames the parameter at place `from`; `to` counts the others.
+void change_name(TEVPF_LIST& list, std::int32_t from, std::int32_t to,
+                 const NameField& name) noexcept;
+
+// ---- The whole ----------------------------------------------------------------------------------
+
+// Makes the index one array with room for `room` names. False when out of memory, and nothing has
+// changed.
+[[nodiscard]] bool flatten_names(TEVPF_LIST& list, std::int32_t room) noexcept;
+// Replaces the index by an array of `room` entries.
+void adopt_names(TEVPF_LIST& list, Owned<std::int32_t> index, std::int32_t room) noexcept;
 
 // Fills an index of `count` entries with the positions in name order.
 void sort_names(const TEVPF_PARAM* params, std::int32_t count, std::int32_t* index) noexcept;

@@ -1,7 +1,6 @@
 // Finds parameters by exact name in O(1). The table only speeds up look-ups; the list's sorted name
-// index is authoritative. The table is built after enough look-ups to repay its cost, extended when
-// parameters are appended, and dropped on any other change of positions or names. If there is no
-// memory for it, the index is searched.
+// index is authoritative. The table is built after enough look-ups to repay its cost, and then
+// follows the changes of the list. If there is no memory for it, the index is searched.
 #pragma once
 
 #include <cstdint>
@@ -16,13 +15,18 @@ struct TextPattern;
 // the number of look-ups reaches about a sixteenth of the number of parameters.
 bool table_answers(TEVPF_LIST& list) noexcept;
 
-// The position of the parameter with exactly that name, or -1. The table must be built.
+// The slot of the parameter with exactly that name, or -1. The table must be built.
 std::int32_t look_up(const TEVPF_LIST& list, const TextPattern& name) noexcept;
 
-// Adds the parameter that was stored after the last one, before num_params counts it.
-void append_name(TEVPF_LIST& list) noexcept;
+// ---- Changes; without a table they do nothing ---------------------------------------------------
 
-// Must be called before positions or names change in any other way.
+// Makes room for one more name. Drops the table when out of memory.
+void reserve_entry(TEVPF_LIST& list) noexcept;
+// Enters the name of the parameter in a slot, or removes it.
+void enter_name(TEVPF_LIST& list, std::int32_t slot) noexcept;
+void remove_name(TEVPF_LIST& list, std::int32_t slot) noexcept;
+// Gives each parameter the slot numbers[slot].
+void renumber_table(NameTable& table, const std::int32_t* numbers) noexcept;
 void drop_table(NameTable& table) noexcept;
 
 }  // namespace tevpf

@@ -18,7 +18,7 @@ void copy_text(char* out, const char* text) noexcept {
 // Makes a parameter the current one and copies its definition into the caller's record, whose two
 // pointers refer to the caller's buffers and are kept.
 void deliver(TEVPF_LIST& list, std::int32_t position, TEVPF_PARAM_DEF& out) noexcept {
-  const TEVPF_PARAM_DEF& definition = list.param_ptr[position].def;
+  const TEVPF_PARAM_DEF& definition = param_at(list, position).def;
   TEVPF_PARAM_DEF copy = definition;
   copy.description = out.description;
   if (definition.type == PF_TYPE_STRING) {
@@ -30,10 +30,13 @@ void deliver(TEVPF_LIST& list, std::int32_t position, TEVPF_PARAM_DEF& out) noex
   list.cur_param = position;
 }
 
-inline TEVPF_STATUS step(TEVPF_LIST& list, char* name_out, void* value_out) noexcept {
+// slot_at(position) is the slot there.
+template <class SlotAt>
+inline TEVPF_STATUS step(TEVPF_LIST& list, char* name_out, void* value_out,
+                         SlotAt slot_at) noexcept {
   if (list.cur_param < std::numeric_limits<std::int32_t>::max()) ++list.cur_param;
   if (list.cur_param >= list.num_params) return PF_NOMORE;
-  const TEVPF_PARAM_DEF& definition = list.param_ptr[list.cur_param].def;
+  const TEVPF_PARAM_DEF& definition = param_in(list, slot_at(list.cur_param)).def;
   fetch_along(&definition, sizeof definition);
   copy_field_text(name_out, definition.name);
   copy_value(definition, value_out);
@@ -43,8 +46,9 @@ inline TEVPF_STATUS step(TEVPF_LIST& list, char* name_out, void* value_out) noex
 [[gnu::noinline]] TEVPF_STATUS find_and_step(const char* list_name, char* name_out,
                                              void* value_out) noexcept {
   TEVPF_LIST* list;
-  PF_TRY(find_list(list_name, list));
-  return step(*list, name_out, value_out);
+  PF_TRY(find_list_to_read(list_name, list));
+  return step(*list, name_out, value_out,
+              [&](std::int32_t position) { return list->slots.order.at(position); });
 }
 
 }  // namespace
@@ -52,19 +56,19 @@ inline TEVPF_STATUS step(TEVPF_LIST& list, char* name_out, void* value_out) noex
 
 using namespace tevpf;
 
-// Callers walk millions of parameters, one call for each: the common path keeps no values across a
-// call.
+// Callers walk millions of parameters, one call for each: the common path, parameters in position
+// order, keeps no values across a call.
 TEVPF_STATUS TEV8R1_PF_get_next_param(const char* list_name, char* name_out,
                                       void* value_out) noexcept {
   TEVPF_LIST* const list = last_list(list_name);
-  return list != nullptr ? step(*list, name_out, value_out)
-                         : find_and_step(list_name, name_out, value_out);
+  if (list == nullptr || !is_in_place(*list)) return find_and_step(list_name, name_out, value_out);
+  return step(*list, name_out, value_out, [](std::int32_t position) { return position; });
 }
 
 TEVPF_STATUS TEV8R1_PF_get_next_param_def(const char* list_name,
                                           TEVPF_PARAM_DEF* definition) noexcept {
   TEVPF_LIST* list;
-  PF_TRY(find_list(list_name, list));
+  PF_TRY(find_list_to_read(list_name, list));
   if (list->cur_param >= list->num_params - 1) return PF_NOMORE;
   deliver(*list, list->cur_param + 1, *definition);
   return PF_NORMAL;
@@ -73,7 +77,7 @@ TEVPF_STATUS TEV8R1_PF_get_next_param_def(const char* list_name,
 TEVPF_STATUS TEV8R1_PF_get_prev_param_def(const char* list_name,
                                           TEVPF_PARAM_DEF* definition) noexcept {
   TEVPF_LIST* list;
-  PF_TRY(find_list(list_name, list));
+  PF_TRY(find_list_to_read(list_name, list));
   if (list->cur_param <= 0 || list->num_params == 0) return PF_NOMORE;
   // A cursor past the last parameter steps back to the last one.
   deliver(*list, std::min(list->cur_param, list->num_params) - 1, *definition);
@@ -83,9 +87,9 @@ TEVPF_STATUS TEV8R1_PF_get_prev_param_def(const char* list_name,
 TEVPF_STATUS TEV8R1_PF_get_param_def(const char* list_name, const char* param_name,
                                      TEVPF_PARAM_DEF* definition) noexcept {
   TEVPF_LIST* list;
-  std::int32_t position;
-  PF_TRY(find_param_of(list_name, param_name, list, position));
-  deliver(*list, position, *definition);
+  std::int32_t slot;
+  PF_TRY(find_param_of(list_name, param_name, list, slot));
+  deliver(*list, position_of(*list, slot), *definition);
   return PF_NORMAL;
 }
 

@@ -26,9 +26,9 @@ TEVPF_STATUS tevpf_get_value(const char* list_name, const char* param_name, std:
                              void* value_out, std::size_t size,
                              std::size_t* value_size_out) noexcept {
   TEVPF_LIST* list;
-  std::int32_t position;
-  PF_TRY(find_param_of(list_name, param_name, list, position));
-  const TEVPF_PARAM_DEF& definition = list->param_ptr[position].def;
+  std::int32_t slot;
+  PF_TRY(find_param_of(list_name, param_name, list, slot));
+  const TEVPF_PARAM_DEF& definition = param_in(*list, slot).def;
   if (definition.type != type) {
     return fail(PF_BADTYPE, {"parameter ", definition.name}, word_of(definition.type));
   }

@@ -59,10 +59,10 @@ using namespace tevpf;
 TEVPF_STATUS TEV8R1_PF_modify_param(const char* list_name, const char* param_name,
                                     const void* value) noexcept {
   TEVPF_LIST* list;
-  std::int32_t position;
-  PF_TRY(find_param_of(list_name, param_name, list, position));
+  std::int32_t slot;
+  PF_TRY(find_param_of(list_name, param_name, list, slot));
 
-  TEVPF_PARAM_DEF& definition = list->param_ptr[position].def;
+  TEVPF_PARAM_DEF& definition = param_in(*list, slot).def;
   if (!is_value_type(definition.type)) return bad_type(definition.type);
   if (definition.type == PF_TYPE_STRING) {
     return change_string(*list, definition, static_cast<const char*>(value));
@@ -75,10 +75,10 @@ TEVPF_STATUS TEV8R1_PF_modify_param(const char* list_name, const char* param_nam
 TEVPF_STATUS TEV8R1_PF_get_param_value(const char* list_name, const char* param_name,
                                        void* value_out) noexcept {
   TEVPF_LIST* list;
-  std::int32_t position;
-  PF_TRY(find_param_of(list_name, param_name, list, position));
-  list->cur_param = position;
-  copy_value(list->param_ptr[position].def, value_out);
+  std::int32_t slot;
+  PF_TRY(find_param_of(list_name, param_name, list, slot));
+  list->cur_param = position_of(*list, slot);
+  copy_value(param_in(*list, slot).def, value_out);
   return PF_NORMAL;
 }
 

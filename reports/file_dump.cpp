@@ -4,6 +4,7 @@
 #include "core/file.h"
 #include "core/library.h"
 #include "lists/directory.h"
+#include "lists/param_store.h"
 #include "reports/definition_text.h"
 #include "reports/display.h"
 #include "reports/list_dump.h"
@@ -40,7 +41,7 @@ void write_file_block(TextOut& out, const TEVPF_FILE& file) noexcept {
   TEVPF_LIST* header = nullptr;
   if (find_list(kHeaderList, header) == PF_NORMAL) {
     for (std::int32_t pos = 0; pos < header->num_params; ++pos) {
-      write_header_value(out, header->param_ptr[pos].def);
+      write_header_value(out, param_at(*header, pos).def);
     }
   }
   out.print("\f\n");
@@ -51,7 +52,7 @@ TEVPF_STATUS write_file(TextOut& out, const TEVPF_FILE& file) noexcept {
   TEVPF_STATUS status = PF_NORMAL;
   const std::int32_t num_lists = directory_of(file, PF_ELEM_LIST).count;
   for (std::int32_t n = 0; n < num_lists && status == PF_NORMAL; ++n) {
-    const TEVPF_LIST& list = list_at(file, n);
+    TEVPF_LIST& list = list_at(file, n);
     if (std::strcmp(list.header.elem_name, kHeaderList) == 0) continue;
     status = write_list(out, list);
     out.print(kElementEnd);

@@ -5,6 +5,7 @@
 
 #include "core/library.h"
 #include "lists/directory.h"
+#include "lists/settle.h"
 #include "reports/debug_text.h"
 #include "reports/definition_text.h"
 #include "reports/display.h"
@@ -146,7 +147,8 @@ TEVPF_STATUS ListWriter::write_entry(const TEVPF_PARAM& param) noexcept {
 
 }  // namespace
 
-TEVPF_STATUS write_list(TextOut& out, const TEVPF_LIST& list) noexcept {
+TEVPF_STATUS write_list(TextOut& out, TEVPF_LIST& list) noexcept {
+  if (!settle(list)) return fail_empty(PF_NOMEM);
   ListWriter writer(out, list);
   if (!writer.reserve()) return fail_empty(PF_NOMEM);
   writer.write_head();
@@ -160,7 +162,7 @@ TEVPF_STATUS write_list(TextOut& out, const TEVPF_LIST& list) noexcept {
 
 using namespace tevpf;
 
-TEVPF_STATUS TEV8R1_list_dump(const TEVPF_LIST* list, std::FILE* stream) noexcept {
+TEVPF_STATUS TEV8R1_list_dump(TEVPF_LIST* list, std::FILE* stream) noexcept {
   TextOut out(stream);
   return write_list(out, *list);
 }

@@ -8,14 +8,14 @@
 
 extern "C" {
 
-// Writes the list's dump.
+// Writes the list's dump. Settles the list first.
 //   PF_NOMEM  the output written so far remains
-TEVPF_API TEVPF_STATUS TEV8R1_list_dump(const TEVPF_LIST* list, std::FILE* stream) noexcept;
+TEVPF_API TEVPF_STATUS TEV8R1_list_dump(TEVPF_LIST* list, std::FILE* stream) noexcept;
 }
 
 namespace tevpf {
 
 // Same as TEV8R1_list_dump, for an open stream buffer.
-[[nodiscard]] TEVPF_STATUS write_list(TextOut& out, const TEVPF_LIST& list) noexcept;
+[[nodiscard]] TEVPF_STATUS write_list(TextOut& out, TEVPF_LIST& list) noexcept;
 
 }  // namespace tevpf

@@ -12,10 +12,12 @@ import sys
 
 # From bottom to top; folders on the same line do not depend on each other.
 LAYERS = [["include"], ["core/base"], ["core/sequence"], ["core/io"], ["core"], ["values"],
-          ["lists", "tables"], ["reports"], ["include/tevpf"], ["sql"], ["tools"]]
+          ["lists", "tables"], ["reports"], ["include/tevpf"], ["sql"],
+          ["tools", "python/src"]]
 PUBLIC = {"include", "include/tevpf"}
 # These use only the public headers, as any program does; the tool the engine of SQL as well.
-OUTSIDE = {"include/tevpf": PUBLIC, "sql": PUBLIC, "tools": PUBLIC | {"sql"}}
+OUTSIDE = {"include/tevpf": PUBLIC, "sql": PUBLIC, "tools": PUBLIC | {"sql"},
+           "python/src": PUBLIC}
 
 ROOT = pathlib.Path(__file__).resolve().parent.parent
 RANKS = {folder: rank for rank, folders in enumerate(LAYERS) for folder in folders}

@@ -1,6 +1,7 @@
 #!/usr/bin/env bash
 # full.sh [SECONDS]: all checks before a release: the static checks, all builds with all tests, a
-# save with a fault at each of its system calls, and each fuzz target for SECONDS (default 1800).
+# save with a fault at each of its system calls, the page of `tevpf report` in a browser (pictures of it
+# are left in build/report), and each fuzz target for SECONDS (default 1800).
 # Takes about 20 minutes plus twice SECONDS on two cores. Inputs found by fuzzing are kept in
 # build/fuzz/found; copy them to tests/fuzz/corpus to test them in every run.
 set -euo pipefail
@@ -15,10 +16,14 @@ seconds=${1:-1800}
 scripts/check.sh
 scripts/test.sh
 
-scripts/install-packages.sh build test fuzz
+scripts/install-packages.sh build test fuzz browser
 echo "== kill sweep"
 cmake --build --preset dev --target save_once
 tests/robustness/kill_sweep.py build/dev/tests/robustness/save_once
+
+echo "== report in a browser"
+# The packages of Debian are for its own Python.
+/usr/bin/python3 tests/tools/report_browser.py build/dev/tools/tevpf build/report
 
 cmake --preset fuzz
 cmake --build --preset fuzz

@@ -1,17 +1,20 @@
 #!/usr/bin/env bash
 # install-packages.sh GROUP...: installs the missing Debian packages of these groups.
-# Groups: build tool test bench x86 windows fuzz lint
+# Groups: build tool test python bench x86 windows fuzz lint browser
 set -euo pipefail
 
 declare -A groups=(
   [build]="cmake ninja-build g++"
   [tool]="libcli11-dev nlohmann-json3-dev libsqlite3-dev"
   [test]="libgtest-dev pkg-config python3 sqlite3 strace"
+  [python]="python3-dev python3-pip python3-setuptools python3-wheel python3-venv pybind11-dev python3-pybind11
+    python3-numpy python3-pandas python3-matplotlib python3-pytest"
   [bench]="libbenchmark-dev libsqlite3-dev nlohmann-json3-dev python3"
   [x86]="g++-multilib googletest"
   [windows]="g++-mingw-w64-i686-win32"
   [fuzz]="clang libclang-rt-14-dev llvm"
   [lint]="clang-format clang-tidy cppcheck shellcheck python3"
+  [browser]="chromium chromium-driver python3-selenium"
 )
 
 missing=()

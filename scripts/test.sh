@@ -12,7 +12,8 @@ esac
 legs=("$@")
 ((${#legs[@]})) || legs=(dev asan x86 mingw)
 
-declare -A packages=([dev]=test [asan]=test [x86]="test x86" [mingw]=windows)
+declare -A packages=([dev]="test python" [asan]="test python" [x86]="test x86" [mingw]=windows)
+declare -A options=([dev]=-DTEVPF_BUILD_PYTHON=ON [asan]=-DTEVPF_BUILD_PYTHON=ON)
 groups=(build tool)
 for leg in "${legs[@]}"; do
   [[ -n ${packages[$leg]:-} ]] || { echo "test.sh: no leg '$leg'; see --help" >&2; exit 2; }
@@ -25,7 +26,7 @@ jobs=$(nproc)
 mkdir -p build/all
 : >build/all/CTestTestfile.cmake
 for leg in "${legs[@]}"; do
-  cmake --preset "$leg"
+  cmake --preset "$leg" ${options[$leg]:+"${options[$leg]}"}
   cmake --build --preset "$leg" --parallel "$jobs"
   echo "subdirs(../$leg)" >>build/all/CTestTestfile.cmake
 done

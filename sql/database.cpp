@@ -17,6 +17,14 @@ struct Database::State {
     std::shared_ptr<SharedFile> shared;
   };
 
+  struct Attaching {
+    explicit Attaching(bool& state) : is_attaching(state) { is_attaching = true; }
+    ~Attaching() { is_attaching = false; }
+    Attaching(const Attaching&) = delete;
+    Attaching& operator=(const Attaching&) = delete;
+    bool& is_attaching;
+  };
+
   sqlite3* connection = nullptr;
   std::map<std::string, Attached> files;  // by schema
   std::string denied;                     // why the last statement was not prepared
@@ -115,13 +123,12 @@ Database::~Database() { sqlite3_close_v2(state_->connection); }
 
 void Database::attach(tevpf::File& file, const std::string& schema) {
   State& state = *state_;
-  state.is_attaching = true;
+  const State::Attaching attaching(state.is_attaching);
   if (schema != "main") state.run("ATTACH ':memory:' AS " + identifier(schema));
   state.files[schema] = {&file, std::make_shared<SharedFile>(file)};
   state.run("BEGIN");
   for (const NamedElement& named : named_elements(file)) state.link(named, schema);
   state.run("COMMIT");
-  state.is_attaching = false;
 }
 
 // ---- Statements ---------------------------------------------------------------------------------

@@ -70,7 +70,6 @@ bool IndexOrder::is_exact(std::size_t rows) {
 // more than the tolerance; twice, for what is lost in computing.
 void IndexOrder::value_added(const unsigned char* row) noexcept {
   is_counted_ = false;
-  if (!is_known_) return;
   if (field_.is_text()) {
     is_known_ = is_sorted_ && !field_.text(row).ends_with('*');
   } else if (field_.tolerance > 0) {

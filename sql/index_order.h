@@ -43,6 +43,8 @@ class IndexOrder {
   Range find(const std::optional<Key>& least, const std::optional<Key>& greatest);
   Range not_numbers() const noexcept { return {rows_count_ - missing_, rows_count_}; }
 
+  // The index has been looked through: it wants to know of changes.
+  bool is_known() const noexcept { return is_known_; }
   // A row holds a new value, or the table has lost a row.
   void value_added(const unsigned char* row) noexcept;
   void row_removed() noexcept { is_counted_ = false; }

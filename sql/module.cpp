@@ -196,21 +196,30 @@ void check_id_is_left_out(sqlite3_value* id) {
                 "the rowid follows from the place of the row and cannot be given");
 }
 
-// SQLite's protocol: one value deletes, the first two being NULL insert, else they update.
+// SQLite's protocol: one value deletes, the first one being NULL inserts, else they update.
+void change(Link& link, int argc, sqlite3_value** argv, sqlite3_int64* id_out) {
+  Relation& relation = link.current();
+  if (argc == 1) return relation.remove(sqlite3_value_int64(argv[0]));
+  const Values values(argv + 2, static_cast<std::size_t>(argc) - 2);
+  const bool replaces = sqlite3_vtab_on_conflict(link.connection) == SQLITE_REPLACE;
+  if (sqlite3_value_type(argv[0]) == SQLITE_NULL) {
+    check_id_is_left_out(argv[1]);
+    *id_out = relation.insert(values, replaces);
+    return;
+  }
+  const sqlite3_int64 id = sqlite3_value_int64(argv[0]);
+  if (sqlite3_value_int64(argv[1]) != id) check_id_is_left_out(argv[1]);
+  relation.update(id, values, replaces);
+}
+
 int update(sqlite3_vtab* table, int argc, sqlite3_value** argv, sqlite3_int64* id_out) {
   return locked(table, [&](Link& link, Lock&) {
-    Relation& relation = link.current();
-    if (argc == 1) return relation.remove(sqlite3_value_int64(argv[0]));
-    const Values values(argv + 2, static_cast<std::size_t>(argc) - 2);
-    const bool replaces = sqlite3_vtab_on_conflict(link.connection) == SQLITE_REPLACE;
-    if (sqlite3_value_type(argv[0]) == SQLITE_NULL) {
-      check_id_is_left_out(argv[1]);
-      *id_out = relation.insert(values, replaces);
-      return;
+    try {
+      change(link, argc, argv, id_out);
+    } catch (const std::bad_alloc&) {
+      link.file->journal().set_broken();  // a change may have been made that does not stand in it
+      throw;
     }
-    const sqlite3_int64 id = sqlite3_value_int64(argv[0]);
-    if (sqlite3_value_int64(argv[1]) != id) check_id_is_left_out(argv[1]);
-    relation.update(id, values, replaces);
   });
 }
 

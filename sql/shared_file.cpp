@@ -155,6 +155,8 @@ void SharedFile::begin_writing(Connection connection, Lock& lock) {
     return writer_ == connection || (writer_ == nullptr && !has_other_readers(connection));
   });
   read_again_if_changed();
+  // A value out of range, once removed from a list, is not taken back.
+  if (journal_.is_broken()) throw Refusal(SQLITE_ERROR, "an earlier change could not be undone");
   const tevpf::File& opened = file();
   if (opened.damage()) throw Refusal(SQLITE_READONLY, "the file is damaged and not changed");
   if (opened.is_read_only()) throw Refusal(SQLITE_READONLY, "the file may not be written");
@@ -193,11 +195,13 @@ void SharedFile::commit() noexcept {
 
 // Where another file of the transaction could not be saved, this one was, and is put back.
 void SharedFile::rollback() noexcept {
-  bool is_lost = false;
+  bool is_lost = journal_.is_broken();
   try {
-    journal_.undo_to(0);
-    if (is_saved_) file_->save();
-    if (is_saved_) stamp_ = stamp();
+    if (!is_lost) journal_.undo_to(0);
+    if (!is_lost && is_saved_) {
+      file_->save();
+      stamp_ = stamp();
+    }
   } catch (...) {
     is_lost = true;
   }

@@ -45,7 +45,8 @@ class SharedFile {
   std::shared_ptr<Relation> relation(tevpf::Kind kind, const std::string& name);
   // Changes when relations that were handed out are not good any more.
   std::uint64_t generation() const noexcept { return generation_; }
-  bool was_changed() const noexcept { return was_changed_; }  // by a transaction that was committed
+  // By transactions that were committed, and all others were undone.
+  bool was_changed() const noexcept { return was_changed_ && !journal_.is_broken(); }
 
   // Wait as long as the connection's busy timeout says; throw Refusal (SQLITE_BUSY).
   void begin_reading(Connection connection, Lock& lock);

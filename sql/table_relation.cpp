@@ -68,10 +68,11 @@ void TableRelation::refuse(const tevpf::Error& error, std::size_t number) const 
 
 void TableRelation::values_added(std::size_t number) {
   ++version_;
-  RowBlocks rows(table_, shape_.row_size, {});
-  const unsigned char* const row = rows.probe(number);
+  std::optional<RowBlocks> rows;
   for (auto& order : orders_) {
-    if (order) order->value_added(row);
+    if (!order || !order->is_known()) continue;
+    if (!rows) rows.emplace(table_, shape_.row_size, std::string());
+    order->value_added(rows->probe(number));
   }
 }
 
@@ -86,8 +87,11 @@ void TableRelation::fill(Row& row, Values values) const {
 void TableRelation::remove_equal(const Row& row, std::optional<RowIds::Id> but) {
   for (std::size_t i = 0; i < shape_.fields.size(); ++i) {
     if (!shape_.fields[i].is_unique) continue;
-    const auto same = table_.find(shape_.fields[i].name, row.value(i));
-    if (same && ids_.id_at(same->number()) != but) remove(ids_.id_at(same->number()));
+    while (const auto same = table_.find(shape_.fields[i].name, row.value(i))) {
+      const RowIds::Id id = ids_.id_at(same->number());
+      if (id == but) break;
+      remove(id);
+    }
   }
 }
 

@@ -115,19 +115,21 @@ template <class Key>
 IndexPlace search_blocks(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
                          const Key& key) noexcept {
   const Values values = values_of(table, column);
-  SequencePlace place;
   if constexpr (Key::kIsNumber) {
     using T = typename Key::Number;
-    place = search_keys(
-        column.index, table.num_rows, [&](std::int32_t slot) { return load<T>(values.of(slot)); },
-        [&](T value, std::int32_t) { return key.is_above(value); });
+    const auto value_of = [&](std::int32_t slot) { return load<T>(values.of(slot)); };
+    const SequencePlace place =
+        search_keys(column.index, table.num_rows, value_of,
+                    [&](T value, std::int32_t) { return key.is_above(value); });
+    return {place,
+            place.position < table.num_rows && key.equals(key_at(column.index, place, value_of))};
   } else {
-    place = search_items(column.index, table.num_rows,
-                         [&](std::int32_t slot) { return key.is_above(values.of(slot)); });
+    const SequencePlace place = search_items(column.index, table.num_rows, [&](std::int32_t slot) {
+      return key.is_above(values.of(slot));
+    });
+    return {place,
+            place.position < table.num_rows && key.equals(values.of(column.index.at(place)))};
   }
-  const bool found =
-      place.position < table.num_rows && key.equals(values.of(column.index.at(place.position)));
-  return {place, found};
 }
 
 // Searches all entries. Reals in blocks are looked up probe by probe.
@@ -180,6 +182,18 @@ Found search_along_keys(const unsigned char* keys, std::int32_t first, std::int3
   } else {
     return search_along_fences(values, first, count, entries, key);
   }
+}
+
+// The same for a column of any number type whose index is flat.
+IndexPlace search_with_keys(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
+                            const unsigned char* keys, std::int32_t first,
+                            const void* key) noexcept {
+  return with_number(column.def.type, [&](auto tag) -> IndexPlace {
+    const NumberKey<decltype(tag)> prepared(key, column.tolerance);
+    const Found found =
+        search_along_keys(keys, first, table.num_rows, column.index.items, prepared);
+    return {{found.position}, found.equal};
+  });
 }
 
 // The column that TEV8R1_sort_comp compares by: the one whose index was built last.
@@ -262,6 +276,14 @@ bool some_neighbours(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
   });
 }
 
+// Search keys belong to a flat index. Blocks made of an index of integers continue to use them.
+void pass_on_search_keys(TEVPF_COLUMN& column) noexcept {
+  if (column.index.blocks == nullptr || column.keys.values == nullptr) return;
+  if (is_floating_type(column.def.type)) return;
+  column.index.blocks->adopt_keys(column.keys.values, value_type(column.def.type).size);
+  column.keys = {};
+}
+
 // The value as the key that blocks keep for it; null for texts, for which blocks keep no keys.
 const void* key_of_value(const TEVPF_COLUMN& column, const void* value) noexcept {
   return column.def.type == PF_TYPE_STRING ? nullptr : value;
@@ -274,7 +296,11 @@ const void* key_of_value(const TEVPF_COLUMN& column, const void* value) noexcept
 bool build_index(const TEVPF_TABLE& table, const TEVPF_COLUMN& column, std::int64_t room,
                  NewIndex& out) noexcept {
   if (!make_block(table.num_rows, room, out)) return false;
-  return !out.entries || sort_rows(table, column, out.entries.get());
+  if (!out.entries) return true;
+  out.keys = new_search_keys(column, table.num_rows);
+  if (!sort_rows(table, column, out.entries.get(), out.keys.get())) return false;
+  if (out.keys) add_fences(column, table.num_rows, out.keys.get());
+  return true;
 }
 
 void sort_from_now_on(const TEVPF_TABLE& table, const TEVPF_COLUMN& column) noexcept {
@@ -296,6 +322,7 @@ bool copy_index(const TEVPF_COLUMN& column, std::int32_t count, NewIndex& out) n
 void adopt_index(TEVPF_COLUMN& column, NewIndex index) noexcept {
   drop_search_keys(column);
   column.index.adopt(std::move(index.entries), index.room);
+  column.keys.values = index.keys.release();
 }
 
 void release_index(TEVPF_COLUMN& column) noexcept {
@@ -320,6 +347,9 @@ bool has_equal_neighbours(const TEVPF_TABLE& table, const std::int32_t* entries,
 IndexPlace search_index(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
                         const void* key) noexcept {
   if (table.num_rows < 1) return {{0}, false};
+  if (column.index.items != nullptr && column.keys.values != nullptr) {
+    return search_with_keys(table, column, column.keys.values, 0, key);
+  }
   return with_key(column.def.type, column.tolerance, key, readable_bytes(table, column),
                   [&](const auto& prepared) { return search_all(table, column, prepared); });
 }
@@ -351,11 +381,7 @@ IndexPlace find_in_index(const TEVPF_TABLE& table, TEVPF_COLUMN& column, std::in
   if (entries != nullptr && column.def.type != PF_TYPE_STRING) {
     count_search(column, kRowsPerSearch);
     if (const unsigned char* const keys = search_keys(table, column, entries)) {
-      return with_number(column.def.type, [&](auto tag) -> IndexPlace {
-        const NumberKey<decltype(tag)> prepared(key, column.tolerance);
-        const Found found = search_along_keys(keys, first, count, entries, prepared);
-        return {{found.position}, found.equal};
-      });
+      return search_with_keys(table, column, keys, first, key);
     }
   }
   return with_key(column.def.type, column.tolerance, key, readable_bytes(table, column),
@@ -363,6 +389,7 @@ IndexPlace find_in_index(const TEVPF_TABLE& table, TEVPF_COLUMN& column, std::in
                     const ValuesOfIndex values = entries_of(table, column);
                     if constexpr (Key::kTotalOrder) {
                       const IndexPlace whole = search_all(table, column, prepared);
+                      if (whole.found) (void)column.index.at(whole.place);  // its row is read next
                       if (whole.place.position >= first) return whole;
                       return {{first}, prepared.equals(values.at(first))};
                     } else {
@@ -374,6 +401,47 @@ IndexPlace find_in_index(const TEVPF_TABLE& table, TEVPF_COLUMN& column, std::in
                   });
 }
 
+// Smaller tables fit the cache.
+#ifdef TEVPF_TEST_HOOKS
+constexpr std::int32_t kRowsWorthFetching = 0;
+#else
+constexpr std::int32_t kRowsWorthFetching = 50'000;
+#endif
+
+void fetch_places(const TEVPF_TABLE& table, const unsigned char* row) noexcept {
+  constexpr std::int32_t kMost = 4;
+  if (table.num_rows < kRowsWorthFetching) return;
+  const TEVPF_COLUMN* columns[kMost];
+  SearchAhead searches[kMost];
+  std::int32_t count = 0;
+  for (std::int32_t i = 0; i < table.num_cols && count < kMost; ++i) {
+    const TEVPF_COLUMN& column = table.col_array[i];
+    const bool has_keys = is_indexed(column) && column.index.blocks != nullptr &&
+                          is_number_type(column.def.type) && !is_floating_type(column.def.type);
+    if (has_keys) columns[count++] = &column;
+  }
+  if (count < 2) return;
+  const auto for_each = [&](auto step) {
+    for (std::int32_t i = 0; i < count; ++i) {
+      const TEVPF_COLUMN& column = *columns[i];
+      with_number(column.def.type, [&](auto tag) {
+        using T = decltype(tag);
+        const NumberKey<T> key(row + column.offset, column.tolerance);
+        step(searches[i], *column.index.blocks, tag, [&](T value) { return key.is_above(value); });
+      });
+    }
+  };
+  for_each([](SearchAhead& search, const SequenceBlocks& blocks, auto tag, auto is_less) {
+    search.fetch_group<decltype(tag)>(blocks, is_less);
+  });
+  for_each([](SearchAhead& search, const SequenceBlocks&, auto tag, auto is_less) {
+    search.fetch_block<decltype(tag)>(is_less);
+  });
+  for_each([](SearchAhead& search, const SequenceBlocks&, auto tag, auto) {
+    search.fetch_keys<decltype(tag)>();
+  });
+}
+
 // An entry is among those of equal value, usually near the first. Where many are equal, or values
 // have drifted within the tolerance, the sequence finds it.
 SequencePlace entry_of(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
@@ -383,7 +451,7 @@ SequencePlace entry_of(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
   const IndexPlace first = search_index(table, column, value);
   if (first.found) {
     const std::int32_t at = first.place.position;
-    if (column.index.at(at) == slot) return first.place;
+    if (column.index.at(first.place) == slot) return first.place;
     const std::int32_t end = std::min(table.num_rows, at + kNear);
     for (std::int32_t next = at + 1; next < end; ++next) {
       if (column.index.at(next) == slot) return column.index.place_at(next);
@@ -393,6 +461,26 @@ SequencePlace entry_of(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
 }
 
 // ---- Entries ------------------------------------------------------------------------------------
+
+bool ready_to_insert_entry(const TEVPF_TABLE& table, TEVPF_COLUMN& column,
+                           const SequencePlace& place, std::int32_t slot) noexcept {
+  if (!column.index.make_ready_to_insert(table.num_rows, place.position, slot)) return false;
+  pass_on_search_keys(column);
+  return true;
+}
+
+bool ready_to_erase_entry(const TEVPF_TABLE& table, TEVPF_COLUMN& column,
+                          const SequencePlace& place) noexcept {
+  if (!column.index.make_ready_to_erase(table.num_rows, place.position)) return false;
+  pass_on_search_keys(column);
+  return true;
+}
+
+bool ready_to_move_entry(const TEVPF_TABLE& table, TEVPF_COLUMN& column, EntryMove move) noexcept {
+  if (!column.index.make_ready_to_move(table.num_rows, move.from, move.to)) return false;
+  pass_on_search_keys(column);
+  return true;
+}
 
 void insert_entry(const TEVPF_TABLE& table, TEVPF_COLUMN& column, SequencePlace place,
                   std::int32_t slot, const void* value) noexcept {

@@ -16,7 +16,8 @@ namespace tevpf {
 // An index that does not yet belong to a column.
 struct NewIndex {
   Owned<std::int32_t> entries;
-  std::int32_t room = 0;  // entries that the block holds
+  std::int32_t room = 0;      // entries that the block holds
+  Owned<unsigned char> keys;  // search keys, or null
 };
 
 // ---- Whole indexes ------------------------------------------------------------------------------
@@ -90,26 +91,38 @@ struct IndexPlace {
 [[nodiscard]] IndexPlace find_in_index(const TEVPF_TABLE& table, TEVPF_COLUMN& column,
                                        std::int32_t first, const void* key) noexcept;
 
+// Requests the cache lines that searches of all indexes for the values of a row will read.
+void fetch_places(const TEVPF_TABLE& table, const unsigned char* row) noexcept;
+
 // The place of a stored row's entry.
 [[nodiscard]] SequencePlace entry_of(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
                                      std::int32_t slot) noexcept;
 
-// ---- Entries, as rows are inserted, moved and deleted
-// --------------------------------------------
-// num_rows is the count before the change. Allocate first with column.index.make_ready_to_...; the
-// functions below cannot fail.
-
-// Inserts the slot of a row with that value.
-void insert_entry(const TEVPF_TABLE& table, TEVPF_COLUMN& column, SequencePlace place,
-                  std::int32_t slot, const void* value) noexcept;
-
-void erase_entry(const TEVPF_TABLE& table, TEVPF_COLUMN& column, SequencePlace place) noexcept;
+// ---- Entries, as rows are inserted, moved and deleted -------------------------------------------
+// num_rows is the count before the change.
 
 // Where an entry is, and where it moves to, counted without the entry itself.
 struct EntryMove {
   std::int32_t from;
   std::int32_t to;
 };
+
+// Each allocates whatever the corresponding change may need; false when out of memory, and the
+// entries are as they were. An index that becomes blocks takes its search keys along.
+[[nodiscard]] bool ready_to_insert_entry(const TEVPF_TABLE& table, TEVPF_COLUMN& column,
+                                         const SequencePlace& place, std::int32_t slot) noexcept;
+[[nodiscard]] bool ready_to_erase_entry(const TEVPF_TABLE& table, TEVPF_COLUMN& column,
+                                        const SequencePlace& place) noexcept;
+[[nodiscard]] bool ready_to_move_entry(const TEVPF_TABLE& table, TEVPF_COLUMN& column,
+                                       EntryMove move) noexcept;
+
+// The functions below cannot fail afterwards.
+
+// Inserts the slot of a row with that value.
+void insert_entry(const TEVPF_TABLE& table, TEVPF_COLUMN& column, SequencePlace place,
+                  std::int32_t slot, const void* value) noexcept;
+
+void erase_entry(const TEVPF_TABLE& table, TEVPF_COLUMN& column, SequencePlace place) noexcept;
 
 // Moves an entry, whose row gets this value. An entry that stays in place needs no call: blocks
 // keep only integers beside their slots, and equal integers are the same.

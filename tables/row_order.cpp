@@ -16,6 +16,10 @@ std::uint32_t sort_key(std::int32_t value) noexcept {
   return static_cast<std::uint32_t>(value) ^ 0x80000000u;
 }
 std::uint32_t sort_key(std::int16_t value) noexcept { return sort_key(std::int32_t{value}); }
+template <class T>
+T value_of_sort_key(std::uint32_t key) noexcept {
+  return static_cast<T>(static_cast<std::int32_t>(key ^ 0x80000000u));
+}
 
 template <class Bits, class T>
 Bits floating_sort_key(T value) noexcept {
@@ -40,7 +44,8 @@ void sort_entries(Entry* entries, std::int32_t count, Less less) noexcept {
 
 // A 32-bit key and its row number form one 64-bit number.
 template <class T>
-bool sort_rows_by_short_key(const Values& values, std::int32_t count, std::int32_t* out) noexcept {
+bool sort_rows_by_short_key(const Values& values, std::int32_t count, std::int32_t* out,
+                            unsigned char* sorted) noexcept {
   const auto keys = new_array<std::uint64_t>(static_cast<std::uint64_t>(count));
   if (!keys) return false;
   for (std::int32_t row = 0; row < count; ++row) {
@@ -49,6 +54,12 @@ bool sort_rows_by_short_key(const Values& values, std::int32_t count, std::int32
   }
   sort_entries(keys.get(), count, [](std::uint64_t a, std::uint64_t b) { return a < b; });
   for (std::int32_t i = 0; i < count; ++i) out[i] = static_cast<std::int32_t>(keys[i]);
+  if constexpr (!kIsFloating<T>) {
+    auto* const values_out = reinterpret_cast<T*>(sorted);
+    for (std::int32_t i = 0; values_out != nullptr && i < count; ++i) {
+      values_out[i] = value_of_sort_key<T>(static_cast<std::uint32_t>(keys[i] >> 32));
+    }
+  }
   return true;
 }
 
@@ -84,7 +95,8 @@ bool sort_rows_by_text(const Values& values, std::int64_t readable, std::int32_t
 
 }  // namespace
 
-bool sort_rows(const TEVPF_TABLE& table, const TEVPF_COLUMN& column, std::int32_t* out) noexcept {
+bool sort_rows(const TEVPF_TABLE& table, const TEVPF_COLUMN& column, std::int32_t* out,
+               [[maybe_unused]] unsigned char* sorted) noexcept {
   const Values values = values_of(table, column);
   const std::int32_t count = table.num_rows;
   if (column.def.type == PF_TYPE_STRING) {
@@ -93,7 +105,7 @@ bool sort_rows(const TEVPF_TABLE& table, const TEVPF_COLUMN& column, std::int32_
   return with_number(column.def.type, [&](auto tag) {
     using T = decltype(tag);
     if constexpr (sizeof(T) <= 4) {
-      return sort_rows_by_short_key<T>(values, count, out);
+      return sort_rows_by_short_key<T>(values, count, out, sorted);
     } else {
       return sort_rows_by_long_key(
           count, out, [&](std::int32_t row) { return sort_key(load<T>(values.of(row))); },

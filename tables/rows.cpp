@@ -109,7 +109,7 @@ bool prepare_entries(TEVPF_TABLE& table, const unsigned char* row, const Inserti
     const bool is_known = is_unique(column) && known < points.count;
     places[i] =
         is_known ? points.place[known++] : search_index(table, column, row + column.offset).place;
-    if (!column.index.make_ready_to_insert(table.num_rows, places[i].position, slot)) return false;
+    if (!ready_to_insert_entry(table, column, places[i], slot)) return false;
   }
   return true;
 }
@@ -132,6 +132,7 @@ TEVPF_STATUS add_row(TEVPF_TABLE& table, const void* row, std::int32_t row_numbe
   const GivenRow given(table, row);
   if (given.get() == nullptr) return fail_empty(PF_NOMEM);
   if (table.free_rows <= 0) PF_TRY(make_space(table));
+  fetch_places(table, given.get());
   InsertionPoints points;
   if (library.interactive == 0) PF_TRY(check_row(table, given.get(), kNobody, points));
 
@@ -160,11 +161,11 @@ void find_entries(const TEVPF_TABLE& table, std::int32_t slot, Places& places) n
 TEVPF_STATUS delete_row(TEVPF_TABLE& table, std::int32_t slot, std::int32_t row_number) noexcept {
   Places places(table);
   if (!places.exists()) return fail_empty(PF_NOMEM);
+  fetch_places(table, row_at(table, slot));
   find_entries(table, slot, places);
   for (std::int32_t i = 0; i < table.num_cols; ++i) {
     TEVPF_COLUMN& column = table.col_array[i];
-    if (is_indexed(column) &&
-        !column.index.make_ready_to_erase(table.num_rows, places[i].position)) {
+    if (is_indexed(column) && !ready_to_erase_entry(table, column, places[i])) {
       return fail_empty(PF_NOMEM);
     }
   }
@@ -191,7 +192,7 @@ bool prepare_move(const TEVPF_TABLE& table, TEVPF_COLUMN& column, std::int32_t s
                   const unsigned char* row, EntryMove& move) noexcept {
   move.from = entry_of(table, column, slot).position;
   move.to = search_others(table, column, move.from, row + column.offset).place.position;
-  return column.index.make_ready_to_move(table.num_rows, move.from, move.to);
+  return ready_to_move_entry(table, column, move);
 }
 
 // A moved row leaves its place in every index and is reinserted before the rows of equal value,
@@ -227,6 +228,12 @@ bool values_differ(const TEVPF_COLUMN& column, const unsigned char* stored_row,
                         column.tolerance) != PF_NORMAL;
 }
 
+bool has_same_bytes(const TEVPF_COLUMN& column, const unsigned char* stored_row,
+                    const unsigned char* new_row) noexcept {
+  return std::memcmp(stored_row + column.offset, new_row + column.offset,
+                     static_cast<std::size_t>(column_size(column))) == 0;
+}
+
 TEVPF_STATUS replace_row(TEVPF_TABLE& table, std::int32_t slot, const unsigned char* row) noexcept {
   Moves moves(table);
   if (!moves.exists()) return fail_empty(PF_NOMEM);
@@ -239,9 +246,10 @@ TEVPF_STATUS replace_row(TEVPF_TABLE& table, std::int32_t slot, const unsigned c
       return fail_empty(PF_NOMEM);
     }
   }
-  note_change(table);
+  table.reads = 0;
   for (std::int32_t i = 0; i < table.num_cols; ++i) {
     TEVPF_COLUMN& column = table.col_array[i];
+    if (!has_same_bytes(column, stored, row)) drop_search_keys(column);
     const bool moves_entry = is_indexed(column) && moves[i].from >= 0;
     if (moves_entry) move_entry(column, moves[i], row + column.offset);
   }

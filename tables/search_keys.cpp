@@ -37,14 +37,20 @@ unsigned char* gather_by_row(const TEVPF_TABLE& table, const TEVPF_COLUMN& colum
 }
 
 template <class T>
+void add_fences(T* values, std::int32_t count) noexcept {
+  T* const behind = values + count;
+  for (std::int32_t i = 0; i < fence_count(count); ++i)
+    behind[i] = values[(i + 1) * kFenceStep - 1];
+}
+
+template <class T>
 unsigned char* gather_by_index(const Values& stored, const std::int32_t* index,
                                std::int32_t count) noexcept {
   const std::int32_t fences = kIsFloating<T> ? 0 : fence_count(count);
   auto values = new_array<T>(static_cast<std::uint64_t>(count) + fences);
   if (!values) return nullptr;
   for (std::int32_t i = 0; i < count; ++i) values[i] = load<T>(stored.of(index[i]));
-  T* const behind = values.get() + count;
-  for (std::int32_t i = 0; i < fences; ++i) behind[i] = values[(i + 1) * kFenceStep - 1];
+  if constexpr (!kIsFloating<T>) add_fences(values.get(), count);
   return reinterpret_cast<unsigned char*>(values.release());
 }
 
@@ -65,6 +71,21 @@ const unsigned char* search_keys(const TEVPF_TABLE& table, TEVPF_COLUMN& column,
     });
   }
   return column.keys.values;
+}
+
+Owned<unsigned char> new_search_keys(const TEVPF_COLUMN& column, std::int32_t count) noexcept {
+  const std::int32_t type = column.def.type;
+  if (count < kRowsWorthKeys || !is_number_type(type) || is_floating_type(type)) return nullptr;
+  const auto size = static_cast<std::uint64_t>(value_type(type).size);
+  return Owned<unsigned char>(static_cast<unsigned char*>(heap_alloc(
+      static_cast<std::uint64_t>(count) + static_cast<std::uint64_t>(fence_count(count)), size)));
+}
+
+void add_fences(const TEVPF_COLUMN& column, std::int32_t count, unsigned char* values) noexcept {
+  with_number(column.def.type, [&](auto tag) {
+    using T = decltype(tag);
+    if constexpr (!kIsFloating<T>) add_fences(reinterpret_cast<T*>(values), count);
+  });
 }
 
 }  // namespace tevpf

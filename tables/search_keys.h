@@ -26,6 +26,13 @@ constexpr std::int32_t fence_count(std::int32_t values) noexcept { return values
 [[nodiscard]] const unsigned char* search_keys(const TEVPF_TABLE& table, TEVPF_COLUMN& column,
                                                const std::int32_t* index) noexcept;
 
+// Sorting rows by integers brings the values in index order at no further cost. new_search_keys
+// allocates a block for these values and their fences; null if the table is too small to need
+// search keys, if the column is not one of integers, or when out of memory.
+[[nodiscard]] Owned<unsigned char> new_search_keys(const TEVPF_COLUMN& column,
+                                                   std::int32_t count) noexcept;
+void add_fences(const TEVPF_COLUMN& column, std::int32_t count, unsigned char* values) noexcept;
+
 // Counts a search that cost as much as scanning this many rows.
 inline void count_search(TEVPF_COLUMN& column, std::int64_t rows) noexcept {
   if (column.keys.values == nullptr) column.keys.effort += rows;

@@ -115,7 +115,8 @@ TEVPF_STATUS read_index(TEVPF_COLUMN& column, std::int32_t count, Input& input) 
     case Input::Got::kAll:
       break;
   }
-  NewIndex index{Owned<std::int32_t>(reinterpret_cast<std::int32_t*>(block.release())), count};
+  NewIndex index{Owned<std::int32_t>(reinterpret_cast<std::int32_t*>(block.release())), count,
+                 nullptr};
   const std::optional<bool> usable = is_permutation(index.entries.get(), count);
   if (!usable) return fail_empty(PF_NOMEM);
   if (*usable) adopt_index(column, std::move(index));

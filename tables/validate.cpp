@@ -43,7 +43,7 @@ TEVPF_STATUS check_value(const TEVPF_TABLE& table, const TEVPF_COLUMN& column, c
   const IndexPlace found = search_index(table, column, value);
   place = found.place;
   if (!found.found) return PF_NORMAL;
-  holder = column.index.at(place.position);
+  holder = column.index.at(place);
   return duplicate(column, value, row_number_of(table, holder));
 }
 

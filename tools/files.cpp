@@ -2,9 +2,11 @@
 
 #include <cstdio>
 #include <filesystem>
+#include <optional>
 #include <system_error>
 #include <utility>
 
+#include "output.h"
 #include "platform.h"
 #include "text.h"
 
@@ -92,6 +94,15 @@ std::string obstacle_to_saving(const tevpf::Error& error) {
   return visible(error.what());
 }
 
+void refuse_damage(const tevpf::File& file, const std::string& path, const char* consequence) {
+  if (!file.damage()) return;
+  throw Failure(kUnreadable, visible(path) + ": it is damaged: " + damage_of(file) + consequence);
+}
+
+[[noreturn]] void refuse_new_file(const std::string& path, const std::error_code& error) {
+  throw save_failure(path, error.message(), OnDisk::kAsBefore);
+}
+
 }  // namespace
 
 tevpf::File open_to_read(const std::string& path) { return open(path); }
@@ -103,13 +114,22 @@ ExitStatus finish_reading(const tevpf::File& file) {
   return kUnreadable;
 }
 
+tevpf::File open_undamaged(const std::string& path) {
+  tevpf::File file = open(path);
+  refuse_damage(file, path, "; nothing was copied, because what cannot be read would be lost");
+  return file;
+}
+
+void refuse_same_file(const std::string& read, const std::string& changed) {
+  std::error_code ignored;
+  if (!fs::equivalent(read, changed, ignored)) return;
+  throw Failure(kRefused,
+                visible(read) + " and " + visible(changed) + " are one file; name another one");
+}
+
 tevpf::File open_to_change(const std::string& path) {
   tevpf::File file = open(path);
-  if (file.damage()) {
-    throw Failure(kUnreadable,
-                  visible(path) + ": it is damaged: " + damage_of(file) +
-                      "; it was not changed, because what cannot be read would be lost");
-  }
+  refuse_damage(file, path, "; it was not changed, because what cannot be read would be lost");
   if (file.is_read_only()) {
     throw Failure(kCannotWrite, visible(path) +
                                     ": it may only be read; change its permissions or "
@@ -128,6 +148,55 @@ void save(tevpf::File& file) {
     const bool is_touched = Stamp(file.name()) != before;
     throw save_failure(file.name(), obstacle_to_saving(error),
                        is_touched ? OnDisk::kTouched : OnDisk::kAsBefore);
+  }
+}
+
+void take_lock(const std::string& path, std::optional<FileLock>& lock) {
+  lock.emplace(path, [&] {
+    if (!is_terminal(stderr)) return;
+    std::fprintf(stderr, "tevpf: %s: another program changes it; waiting\n", visible(path).c_str());
+  });
+  switch (lock->state()) {
+    case FileLock::State::kHeld:
+      return;
+    case FileLock::State::kNoFile:
+      throw Failure(kUnreadable, visible(path) + ": " + obstacle_to_opening(path));
+    case FileLock::State::kRefused:
+      throw Failure(kCannotWrite,
+                    visible(path) + ": it cannot be locked: " + lock->error().message() +
+                        "; --no-lock changes it without a lock, when no other program does");
+  }
+}
+
+bool exists(const std::string& path) {
+  std::error_code ignored;
+  return fs::symlink_status(path, ignored).type() != fs::file_type::not_found;
+}
+
+bool change_file(const Target& target, Missing missing,
+                 const std::function<void(tevpf::File& file)>& change) {
+  while (missing == Missing::kMade && !exists(target.path)) {
+    NewFile made = NewFile::create(target.path);
+    change(made.file());
+    const std::error_code error = made.save();
+    if (!error) return true;
+    if (!exists(target.path)) refuse_new_file(target.path, error);
+  }
+  check_length(target.path);
+  std::optional<FileLock> lock;
+  if (target.is_locked) take_lock(target.path, lock);
+  tevpf::File file = open_to_change(target.path);
+  change(file);
+  save(file);
+  return false;
+}
+
+void report(const Target& target, const std::string& done) {
+  try {
+    print(done + "\n");
+  } catch (const Failure& failure) {
+    throw Failure(failure.status(),
+                  visible(target.path) + " is changed: " + done + "; but " + failure.what());
   }
 }
 
@@ -152,7 +221,7 @@ NewFile NewFile::create(const std::string& path) {
 NewFile::NewFile(const std::string& path, tevpf::File file)
     : path_(path), temp_(file.name()), file_(std::move(file)) {}
 
-void NewFile::save() {
+std::error_code NewFile::save() {
   const HoldInterrupts hold;
   try {
     file_.save();
@@ -161,9 +230,12 @@ void NewFile::save() {
   }
   file_.close();
   if (!rename_to_new(temp_.path(), path_)) {
-    throw save_failure(path_, last_error().message(), OnDisk::kAsBefore);
+    const std::error_code error = last_error();
+    if (error == std::errc::file_exists) return error;
+    throw save_failure(path_, error.message(), OnDisk::kAsBefore);
   }
   temp_.forget();
+  return {};
 }
 
 std::string damage_of(const tevpf::File& file) {

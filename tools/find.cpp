@@ -24,8 +24,12 @@ tevpf::Element find_element(const tevpf::File& file, const std::string& name, Ki
     const std::string other =
         named.empty() ? ""
                       : std::string(", only a ") + word_of(named.front().kind) + " of that name";
+    std::vector<std::string> names;
+    for (const tevpf::Element& element : file.elements()) names.push_back(element.name);
+    const std::string guess = named.empty() ? did_you_mean(name, names) : "";
     throw Failure(kRefused, visible(file.name()) + ": there is no " + word_of(kind) + " " +
-                                in_quotes(name) + other + "; 'tevpf info' shows what there is");
+                                in_quotes(name) + other +
+                                (guess.empty() ? "; 'tevpf info' shows what there is" : guess));
   }
   if (named.size() > 1 && !kind) {
     throw Failure(kRefused, visible(file.name()) + ": both a list and a table are named " +
@@ -37,9 +41,12 @@ tevpf::Element find_element(const tevpf::File& file, const std::string& name, Ki
 tevpf::Parameter find_parameter(const tevpf::File& file, const std::string& list,
                                 const std::string& name) {
   if (auto found = file.list(list).find(name)) return *std::move(found);
+  std::vector<std::string> names;
+  for (const tevpf::Parameter& parameter : file.list(list)) names.push_back(parameter.name());
+  const std::string guess = did_you_mean(name, names);
   throw Failure(kRefused, visible(file.name()) + ": list " + in_quotes(list) +
                               " has no parameter " + in_quotes(name) +
-                              "; 'tevpf show' shows those it has");
+                              (guess.empty() ? "; 'tevpf show' shows those it has" : guess));
 }
 
 Columns::Columns(const tevpf::File& file, const tevpf::Table& table)
@@ -51,14 +58,16 @@ bool Columns::has(const std::string& name) const {
 }
 
 std::size_t Columns::position_of(const std::string& name) const {
-  std::string names;
+  std::vector<std::string> names;
+  std::string listed;
   for (std::size_t i = 0; i < all_.size(); ++i) {
     if (all_[i].name() == name) return i;
-    if (i > 0) names += ", ";
-    names += visible(all_[i].name());
+    if (i > 0) listed += ", ";
+    listed += visible(all_[i].name());
+    names.push_back(all_[i].name());
   }
   throw Failure(kRefused, table_ + " has no column " + in_quotes(name) + "; it has " +
-                              (names.empty() ? "none" : names));
+                              (listed.empty() ? "none" : listed) + did_you_mean(name, names));
 }
 
 void check_new_name(const std::string& name, const std::string& what) {

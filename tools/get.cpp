@@ -1,5 +1,6 @@
-// tevpf get: the value of one parameter, exactly, and nothing else.
+// tevpf get: the value of one parameter, exactly and nothing else; with --json its definition, too.
 #include "commands.h"
+#include "element_json.h"
 #include "files.h"
 #include "output.h"
 #include "platform.h"
@@ -11,10 +12,14 @@ namespace tool {
 ExitStatus run_get(const Arguments& arguments) {
   const tevpf::File file = open_to_read(arguments.file);
   const tevpf::Element list = find_element(file, arguments.element, tevpf::Kind::list);
-  const std::string value =
-      exact_text(find_parameter(file, list.name, arguments.parameter).value());
-  // A script gets the very bytes; a terminal must not act upon them.
-  print((is_terminal(stdout) ? visible(value) : value) + "\n");
+  const tevpf::Parameter parameter = find_parameter(file, list.name, *arguments.member);
+  const std::string value = exact_text(parameter.value());
+  if (arguments.json) {
+    print(parameter_json(parameter) + "\n");
+  } else {
+    // A script gets the very bytes; a terminal must not act upon them.
+    print((is_terminal(stdout) ? visible(value) : value) + "\n");
+  }
   return finish_reading(file);
 }
 

@@ -1,26 +1,46 @@
-// Values and texts as JSON. What JSON cannot hold becomes null (numbers) or a replacement
-// character.
+// Values and texts as JSON that reads back as the same bytes. Numbers are written in the fewest
+// digits; what is not a number is null, the infinities are "inf" and "-inf", and a text that is not
+// UTF-8 is {"bytes": "..."} with its bytes in hexadecimal.
 #pragma once
 
-#include <nlohmann/json.hpp>
+#include <optional>
 #include <string>
+#include <string_view>
 
 #include "values.h"
 
 namespace tool {
 
-using Json = nlohmann::ordered_json;
+// Control characters are escapes, also those from DEL on.
+std::string text_json(std::string_view text);
 
-inline Json value_json(const Value& value) {
-  // A real by its shortest text: 0.1, not 0.10000000149011612. "nan" and "inf" are no JSON.
-  if (std::holds_alternative<float>(value)) {
-    const Json number = Json::parse(exact_text(value), nullptr, false);
-    return number.is_discarded() ? Json(nullptr) : number;
+std::string value_json(const Value& value);
+
+// {"name": "x", ...}, on one line. Members are in the order in which they are added.
+class JsonObject {
+ public:
+  void add(std::string_view key, std::string_view json);
+  void add_text(std::string_view key, std::string_view text) { add(key, text_json(text)); }
+  std::string text() const { return "{" + members_ + "}"; }
+
+ private:
+  std::string members_;
+};
+
+// A member whose value is an array with one line for each item.
+class JsonLines {
+ public:
+  explicit JsonLines(std::string& text) : text_(text) { text_ += "["; }
+  void add(std::string_view item) {
+    text_ += is_first_ ? "\n" : ",\n";
+    text_ += item;
+    is_first_ = false;
   }
-  return std::visit([](const auto& v) { return Json(v); }, value);
-}
+  void finish() { text_ += is_first_ ? "]" : "\n]"; }
 
-// As UTF-8, with escapes for all control characters: JSON itself leaves those from DEL on as they are.
-std::string json_text(const Json& json, int indent = -1);
+ private:
+  std::string& text_;
+  bool is_first_ = true;
+};
 
 }  // namespace tool

@@ -3,7 +3,9 @@
 #include <cstdio>
 #include <exception>
 #include <new>
+#include <span>
 #include <string>
+#include <vector>
 
 #include "arguments.h"
 #include "commands.h"
@@ -24,7 +26,7 @@ std::string version() {
 
 std::string overview() {
   std::string text =
-      "Look at parameter files, check and change them.\n"
+      "Make parameter files, look at them, check and change them.\n"
       "Usage: tevpf COMMAND FILE ...\n\nCommands:\n";
   for (const Command& command : tool::commands()) {
     std::string line = "  " + std::string(command.name);
@@ -33,7 +35,7 @@ std::string overview() {
   }
   return text +
          "\n'tevpf COMMAND --help' describes a command, 'tevpf --version' prints the version.\n"
-         "Exit status: 0 done, 1 refused or not found, 2 wrong command line,\n"
+         "Exit status: 0 done, 1 refused or not found (diff: different), 2 wrong command line,\n"
          "3 a file is missing, damaged or unreadable, 4 a file cannot be written.\n";
 }
 
@@ -45,6 +47,12 @@ tool::Failure refusal(const std::string& file, const tevpf::Error& error) {
                                                               : "";
   return {cannot_write ? tool::kCannotWrite : tool::kRefused,
           tool::visible(file) + ": " + tool::visible(error.what()) + advice};
+}
+
+std::vector<std::string> names_of(std::span<const Command> commands) {
+  std::vector<std::string> names;
+  for (const Command& command : commands) names.emplace_back(command.name);
+  return names;
 }
 
 int run(int argc, char** argv) {
@@ -63,7 +71,9 @@ int run(int argc, char** argv) {
   if (command == all.end()) {
     std::fprintf(stderr, "tevpf: %s; 'tevpf --help' lists the commands\n",
                  name.empty() ? "no command is given"
-                              : ("there is no command " + tool::in_quotes(name)).c_str());
+                              : ("there is no command " + tool::in_quotes(name) +
+                                 tool::did_you_mean(name, names_of(all)))
+                                    .c_str());
     return tool::kUsage;
   }
   tool::Arguments arguments;

@@ -1,5 +1,6 @@
 #include "output.h"
 
+#include <algorithm>
 #include <cerrno>
 #include <system_error>
 #include <utility>
@@ -30,6 +31,7 @@ Output::Output(const std::string& name, const fs::path& source) : name_(name) {
     }
     stream_ = stdout;
     to_terminal_ = is_terminal(stdout);
+    if (to_terminal_) screen_ = terminal_size();
     return;
   }
   std::error_code ignored;
@@ -54,7 +56,11 @@ Output::Output(const std::string& name, const fs::path& source) : name_(name) {
 }
 
 Output::~Output() {
-  if (stream_ != nullptr && stream_ != stdout && !temp_) std::fclose(stream_);
+  if (pager_ != nullptr) {
+    close_pager(pager_);
+  } else if (stream_ != nullptr && stream_ != stdout && !temp_) {
+    std::fclose(stream_);
+  }
 }
 
 void Output::fail(const std::error_code& error) {
@@ -68,20 +74,44 @@ void Output::put(std::string_view text) {
   if (std::fwrite(text.data(), 1, text.size(), stream_) != text.size()) fail(last_error());
 }
 
+// The user's pager, where one is wanted.
+void Output::start_pager() {
+  static constexpr const char* kLess =
+      "if command -v less >/dev/null; then exec less; else exec cat; fi";
+  const std::string command = environment("PAGER").value_or(kLess);
+  if (!command.empty() && command != "cat") pager_ = open_pager(command);
+  if (pager_ != nullptr) stream_ = pager_;
+  screen_.rows = 0;  // from now on, nothing is held
+  put(std::exchange(held_, {}));
+}
+
+// Keeps what one screen holds, until it is known that there is more.
+void Output::hold(std::string_view text) {
+  held_ += text;
+  const auto lines = static_cast<std::size_t>(std::count(held_.begin(), held_.end(), '\n'));
+  if (lines >= screen_.rows) start_pager();
+}
+
 void Output::write(std::string_view text) {
   if (!to_terminal_) return put(text);
   line_ += text;
   const std::size_t whole_lines = line_.rfind('\n') + 1;
-  put(visible_lines(std::string_view(line_).substr(0, whole_lines)));
+  const std::string shown = visible_lines(std::string_view(line_).substr(0, whole_lines));
+  screen_.rows > 0 ? hold(shown) : put(shown);
   line_.erase(0, whole_lines);
 }
 
 void Output::finish() {
+  put(std::exchange(held_, {}));
   put(visible_lines(line_));
   if (std::fflush(stream_) != 0) fail(last_error());
   if (temp_) {
     if (const std::error_code error = temp_->replace_target()) fail(error);
     return;
+  }
+  if (pager_ != nullptr) {
+    stream_ = nullptr;
+    return close_pager(std::exchange(pager_, nullptr));
   }
   if (stream_ != stdout && std::fclose(std::exchange(stream_, nullptr)) != 0) fail(last_error());
 }
@@ -91,5 +121,7 @@ void print(const std::string& text) {
   output.write(text);
   output.finish();
 }
+
+void note(const std::string& sentence) { std::fprintf(stderr, "tevpf: %s\n", sentence.c_str()); }
 
 }  // namespace tool

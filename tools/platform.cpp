@@ -12,10 +12,16 @@
 #include <memory>
 #include <random>
 #include <string>
+#include <utility>
 
 #ifdef _WIN32
 #include <io.h>
+#define NOMINMAX
+#define WIN32_LEAN_AND_MEAN
+#include <windows.h>
 #else
+#include <sys/file.h>
+#include <sys/ioctl.h>
 #include <unistd.h>
 
 #include <future>
@@ -63,6 +69,12 @@ void remove_on_interrupt(const fs::path& file) {
   }
 }
 
+std::optional<std::string> environment(const char* name) {
+  const char* const value = std::getenv(name);
+  if (value == nullptr) return std::nullopt;
+  return value;
+}
+
 std::string unused_path_beside(const fs::path& target) {
   static constexpr std::string_view kLetters = "abcdefghijklmnopqrstuvwxyz0123456789";
   static constexpr int kLength = 8;
@@ -85,6 +97,10 @@ void prepare_process() {
 
 bool is_terminal(std::FILE* stream) { return _isatty(_fileno(stream)) != 0; }
 
+TerminalSize terminal_size() { return {}; }
+std::FILE* open_pager(const std::string&) { return nullptr; }
+void close_pager(std::FILE*) {}
+
 bool stdout_is(const fs::path&) { return false; }  // an open file has no cheap identity there
 
 HoldInterrupts::HoldInterrupts() = default;
@@ -104,6 +120,29 @@ bool flush_to_disk(std::FILE* stream) {
 
 bool rename_to_new(const fs::path& from, const fs::path& to) {
   return std::rename(from.string().c_str(), to.string().c_str()) == 0;
+}
+
+// Locked is a byte far behind the end: other programs may read and write the file.
+FileLock::FileLock(const fs::path& file, const std::function<void()>& wait_begins)
+    : file_(_wopen(file.c_str(), _O_RDONLY | _O_BINARY)) {
+  if (file_ < 0) {
+    error_ = last_error();
+    state_ = State::kNoFile;
+    return;
+  }
+  const auto handle = reinterpret_cast<HANDLE>(_get_osfhandle(file_));
+  OVERLAPPED place{};
+  place.OffsetHigh = 0x7FFFFFFF;
+  constexpr DWORD kNow = LOCKFILE_EXCLUSIVE_LOCK | LOCKFILE_FAIL_IMMEDIATELY;
+  if (LockFileEx(handle, kNow, 0, 1, 0, &place) != 0) return;
+  wait_begins();
+  if (LockFileEx(handle, LOCKFILE_EXCLUSIVE_LOCK, 0, 1, 0, &place) != 0) return;
+  error_ = {static_cast<int>(GetLastError()), std::system_category()};
+  state_ = State::kRefused;
+}
+
+FileLock::~FileLock() {
+  if (file_ >= 0) _close(file_);
 }
 
 // By way of a file in the user's own folder for temporary files.
@@ -163,6 +202,27 @@ void occupy_closed_streams() {
   }
 }
 
+bool is_same_file(int file, const fs::path& path) {
+  struct stat open_one, named;
+  return fstat(file, &open_one) == 0 && stat(path.c_str(), &named) == 0 &&
+         open_one.st_dev == named.st_dev && open_one.st_ino == named.st_ino;
+}
+
+// Some network file systems lock only what is open for writing.
+int open_to_lock(const fs::path& path) {
+  const int file = open(path.c_str(), O_RDWR | O_NONBLOCK | O_CLOEXEC);
+  return file >= 0 ? file : open(path.c_str(), O_RDONLY | O_NONBLOCK | O_CLOEXEC);
+}
+
+bool lock_now(int file) { return flock(file, LOCK_EX | LOCK_NB) == 0; }
+
+bool lock_later(int file) {
+  while (flock(file, LOCK_EX) != 0) {
+    if (errno != EINTR) return false;
+  }
+  return true;
+}
+
 mode_t mode_of_new_files() {
   const mode_t mask = umask(0);
   umask(mask);
@@ -180,11 +240,24 @@ void prepare_process() {
 
 bool is_terminal(std::FILE* stream) { return isatty(fileno(stream)) != 0; }
 
-bool stdout_is(const fs::path& file) {
-  struct stat output, other;
-  return fstat(STDOUT_FILENO, &output) == 0 && stat(file.c_str(), &other) == 0 &&
-         output.st_dev == other.st_dev && output.st_ino == other.st_ino;
+TerminalSize terminal_size() {
+  winsize size{};
+  if (ioctl(STDOUT_FILENO, TIOCGWINSZ, &size) != 0) return {};
+  return {size.ws_col, size.ws_row};
 }
+
+// Without a choice of the user's, less leaves a short text on the screen and keeps colours.
+std::FILE* open_pager(const std::string& command) {
+  (void)setenv("LESS", "FRX", 0);
+  std::fflush(stdout);
+  std::FILE* const pager = popen(command.c_str(), "w");
+  if (pager != nullptr) std::signal(SIGINT, SIG_IGN);
+  return pager;
+}
+
+void close_pager(std::FILE* pager) { (void)pclose(pager); }
+
+bool stdout_is(const fs::path& file) { return is_same_file(STDOUT_FILENO, file); }
 
 HoldInterrupts::HoldInterrupts() {
   const sigset_t set = interrupts();
@@ -226,6 +299,33 @@ bool rename_to_new(const fs::path& from, const fs::path& to) {
   if (errno != EINVAL && errno != ENOSYS) return false;
   // Not every file system knows the flag. A link never replaces a file either.
   return link(from.c_str(), to.c_str()) == 0 && unlink(from.c_str()) == 0;
+}
+
+// The library opens and closes the file meanwhile, which would release a lock of fcntl's.
+FileLock::FileLock(const fs::path& file, const std::function<void()>& wait_begins) {
+  for (bool has_waited = false;; close(file_)) {
+    file_ = open_to_lock(file);
+    if (file_ < 0) {
+      error_ = last_error();
+      state_ = State::kNoFile;
+      return;
+    }
+    bool is_locked = lock_now(file_);
+    if (!is_locked && errno == EWOULDBLOCK) {
+      if (!std::exchange(has_waited, true)) wait_begins();
+      is_locked = lock_later(file_);
+    }
+    if (!is_locked) {
+      error_ = last_error();
+      state_ = State::kRefused;
+      return;
+    }
+    if (is_same_file(file_, file)) return;
+  }
+}
+
+FileLock::~FileLock() {
+  if (file_ >= 0) close(file_);
 }
 
 // By way of a pipe: writing into it cannot fail, and what `take` throws ends the writing.

@@ -2,9 +2,11 @@
 // with a branch for Windows.
 #pragma once
 
+#include <cstddef>
 #include <cstdio>
 #include <filesystem>
 #include <functional>
+#include <optional>
 #include <string>
 #include <string_view>
 #include <system_error>
@@ -20,6 +22,21 @@ std::error_code last_error();
 void prepare_process();
 
 bool is_terminal(std::FILE* stream);
+
+struct TerminalSize {
+  std::size_t columns = 0, rows = 0;  // 0: not known
+};
+TerminalSize terminal_size();  // of the terminal behind standard output
+
+// Starts a command of the shell that shows on the terminal what is written to the stream. From then on
+// interrupts are the command's to handle. Null when it cannot be started.
+std::FILE* open_pager(const std::string& command);
+
+// Waits until the user has seen enough.
+void close_pager(std::FILE* pager);
+
+// The value of a variable of the environment, none when it is not set.
+std::optional<std::string> environment(const char* name);
 
 // Standard output is redirected to this very file.
 bool stdout_is(const std::filesystem::path& file);
@@ -52,6 +69,28 @@ bool flush_to_disk(std::FILE* stream);
 
 // Renames a file to a name that must be free. False: errno says why.
 bool rename_to_new(const std::filesystem::path& from, const std::filesystem::path& to);
+
+// A lock on a file, which one program at a time holds. The system releases it when the process ends.
+// Only programs that ask for it notice it. It stays valid when the file is replaced by renaming
+// another one over it: whoever waited for the old file then asks for the new one.
+class FileLock {
+ public:
+  enum class State { kHeld, kNoFile, kRefused };
+
+  // Waits until it is free; `wait_begins` is called when that is not at once.
+  FileLock(const std::filesystem::path& file, const std::function<void()>& wait_begins);
+  ~FileLock();
+  FileLock(const FileLock&) = delete;
+  FileLock& operator=(const FileLock&) = delete;
+
+  State state() const { return state_; }
+  const std::error_code& error() const { return error_; }  // why it is not held
+
+ private:
+  int file_ = -1;
+  State state_ = State::kHeld;
+  std::error_code error_;
+};
 
 // Calls `make` with a path to write to, and `take` with all that is written there, as it comes.
 void collect(const std::function<void(const std::string& path)>& make,

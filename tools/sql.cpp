@@ -1,13 +1,16 @@
 // tevpf sql: statements over FILE and other files, their results as aligned text, CSV or JSON.
 #include <deque>
 #include <filesystem>
+#include <optional>
+#include <set>
 
 #include "commands.h"
-#include "csv.h"
+#include "csv_writer.h"
 #include "files.h"
 #include "input.h"
 #include "json.h"
 #include "output.h"
+#include "platform.h"
 #include "sql/database.h"
 #include "text.h"
 #include "text_table.h"
@@ -38,9 +41,9 @@ std::string field_json(const Statement& row, int column) {
     case SqlType::integer:
       return std::to_string(row.integer(column));
     case SqlType::real:
-      return json_text(value_json(real_value(row, column)));
+      return value_json(real_value(row, column));
     default:
-      return json_text(Json(row.text(column)));
+      return text_json(row.text(column));
   }
 }
 
@@ -67,21 +70,15 @@ void write_text(Output& output, Statement& rows) {
              [&](std::size_t row, std::size_t c) { return cells[row * columns + c]; });
 }
 
-template <class Field>
-void write_csv_line(Output& output, int columns, Field field) {
-  std::string line;
-  for (int c = 0; c < columns; ++c) {
-    if (c > 0) line += ',';
-    append_csv(line, field(c), columns == 1);
-  }
-  output.write(line += "\r\n");
-}
-
 void write_csv(Output& output, Statement& rows) {
-  write_csv_line(output, rows.columns(), [&](int c) { return rows.name(c); });
+  CsvWriter writer(output, {});
+  for (int c = 0; c < rows.columns(); ++c) writer.text(rows.name(c));
+  writer.end_record();
   while (rows.step()) {
-    write_csv_line(output, rows.columns(), [&](int c) { return field_text(rows, c); });
+    for (int c = 0; c < rows.columns(); ++c) writer.text(field_text(rows, c));
+    writer.end_record();
   }
+  writer.finish();
 }
 
 void write_json(Output& output, Statement& rows) {
@@ -90,7 +87,7 @@ void write_json(Output& output, Statement& rows) {
   while (rows.step()) {
     std::string line = separator;
     for (int c = 0; c < rows.columns(); ++c) {
-      line += (c == 0 ? "{" : ",") + json_text(Json(rows.name(c))) + ":" + field_json(rows, c);
+      line += (c == 0 ? "{" : ",") + text_json(rows.name(c)) + ":" + field_json(rows, c);
     }
     output.write(line += "}");
     separator = ",\n";
@@ -150,6 +147,7 @@ void run_all(sql::Database& database, std::string_view statements, Results& resu
 class Sources {
  public:
   explicit Sources(const Arguments& arguments) {
+    if (!arguments.no_lock) lock(arguments);
     add(arguments.file, "main");
     for (const std::string& path : arguments.with) {
       add(path, std::filesystem::path(path).stem().string());
@@ -177,6 +175,17 @@ class Sources {
     std::string schema;
   };
 
+  // In one order for all programs, so that no two of them wait for each other.
+  void lock(const Arguments& arguments) {
+    std::set<std::string> paths;
+    std::error_code ignored;
+    for (const std::string& path : arguments.with) {
+      paths.insert(std::filesystem::weakly_canonical(path, ignored).string());
+    }
+    paths.insert(std::filesystem::weakly_canonical(arguments.file, ignored).string());
+    for (const std::string& path : paths) take_lock(path, locks_.emplace_back());
+  }
+
   void add(const std::string& path, const std::string& schema) {
     for (const Source& other : sources_) {
       if (other.schema == schema) {
@@ -188,6 +197,7 @@ class Sources {
     database_.attach(sources_.back().file, schema);
   }
 
+  std::deque<std::optional<FileLock>> locks_;
   std::deque<Source> sources_;  // they stay where they are
   sql::Database database_;      // closed before its files
 };

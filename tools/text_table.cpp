@@ -5,6 +5,12 @@
 #include "text.h"
 
 namespace tool {
+namespace {
+
+constexpr std::size_t kGap = 2;               // blanks between columns
+constexpr std::string_view kMark = "\u2026";  // for what is cut
+
+}  // namespace
 
 void TextTable::add_column(std::string heading, Align align) {
   heading = visible(heading);
@@ -12,10 +18,44 @@ void TextTable::add_column(std::string heading, Align align) {
   columns_.push_back({std::move(heading), align, width});
 }
 
+std::size_t TextTable::total_width() const {
+  std::size_t width = is_cut_ ? kGap + display_width(kMark) : 0;
+  for (const Column& column : columns_) width += column.width + kGap;
+  return width - std::min(width, kGap);
+}
+
+void TextTable::shrink_columns() {
+  static constexpr std::size_t kShortest = 12;
+  if (line_width_ == 0) return;
+  while (total_width() > line_width_) {
+    Column* widest = nullptr;
+    for (Column& column : columns_) {
+      if (column.align == Align::kLeft && column.width > kShortest &&
+          (widest == nullptr || column.width > widest->width)) {
+        widest = &column;
+      }
+    }
+    if (widest != nullptr) {
+      const std::size_t excess = total_width() - line_width_;
+      widest->width -= std::min(excess, std::max<std::size_t>((widest->width - kShortest) / 2, 1));
+    } else if (columns_.size() > 1) {
+      columns_.pop_back();
+      is_cut_ = true;
+    } else {
+      return;
+    }
+  }
+}
+
 void TextTable::append(std::string& line, std::size_t column, std::string_view text) const {
   const Column& c = columns_[column];
+  std::string shortened;
+  if (display_width(text) > c.width) {
+    shortened = first_characters(text, c.width - display_width(kMark));
+    text = shortened += kMark;
+  }
   const std::size_t gap = c.width - std::min(c.width, display_width(text));
-  if (column > 0) line += "  ";
+  if (column > 0) line.append(kGap, ' ');
   if (c.align == Align::kRight) line.append(gap, ' ');
   line += text;
   if (c.align == Align::kLeft) line.append(gap, ' ');
@@ -27,8 +67,10 @@ void TextTable::write(Output& output, std::size_t rows, const Cell& cell) {
       columns_[c].width = std::max(columns_[c].width, display_width(visible(cell(row, c))));
     }
   }
+  shrink_columns();
   std::string line;
   const auto end_line = [&] {
+    if (is_cut_) line.append(kGap, ' ') += kMark;
     line.erase(line.find_last_not_of(' ') + 1);
     line += '\n';
     output.write(line);

@@ -39,16 +39,15 @@ class NumberKey {
       : key_(load<T>(key)), tolerance_(tolerance) {}
 
   // Compares the value stored at `place` with the key: negative, 0 or positive.
-  int compare(const unsigned char* place) const noexcept {
-    return compare_numbers(load<T>(place), key_, tolerance_);
-  }
+  int compare(T value) const noexcept { return compare_numbers(value, key_, tolerance_); }
+  int compare(const unsigned char* place) const noexcept { return compare(load<T>(place)); }
   bool is_above(T value) const noexcept { return value < key_; }
   bool is_above(const unsigned char* place) const noexcept { return is_above(load<T>(place)); }
   // compare() == 0 in fewer steps.
-  bool equals(const unsigned char* place) const noexcept {
-    const T value = load<T>(place);
+  bool equals(const unsigned char* place) const noexcept { return equals(load<T>(place)); }
+  bool equals(T value) const noexcept {
     if constexpr (kIsFloating<T>) {
-      if (!(tolerance_ >= 0)) return compare(place) == 0;
+      if (!(tolerance_ >= 0)) return compare(value) == 0;
       const double x = value, y = key_;
       return !((x - tolerance_ > y) | (x + tolerance_ < y));
     } else {

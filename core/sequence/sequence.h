@@ -46,6 +46,12 @@ struct Sequence {
     return blocks == nullptr ? position : blocks->read(position);
   }
 
+  // The item at a place. Makes the next reads of positions around it cheap.
+  std::int32_t at(const SequencePlace& place) const noexcept {
+    if (place.group < 0) return at(place.position);
+    return blocks->read(place);
+  }
+
   // The longest chunk that starts at a position, 0 .. count - 1. Valid until the next change.
   SequenceChunk chunk_at(std::int32_t count, std::int32_t position) const noexcept;
 
@@ -67,12 +73,17 @@ struct Sequence {
     return blocks == nullptr ? SequencePlace{position} : blocks->locate(position);
   }
 
-  // The place of an item, at position -1 if it is not in the sequence. In blocks the first calls
-  // scan; once they have cost as much as a map from items to blocks, there is one, and calls are
-  // O(1).
+  // The place of an item, at position -1 if it is not in the sequence. In blocks, an item that does
+  // not stand in ascending order with the others takes a scan at first; once scans have cost as
+  // much as a map from items to blocks, there is one, and calls are O(1).
   SequencePlace place_of(std::int32_t count, std::int32_t item) const noexcept;
   std::int32_t position_of(std::int32_t count, std::int32_t item) const noexcept {
     return place_of(count, item).position;
+  }
+  // To be called before items of a large sequence are found again and again: an array, which has to
+  // be scanned, becomes blocks if memory allows.
+  void expect_finding(std::int32_t count) noexcept {
+    if (items != nullptr && count > kFlatReach) (void)become_blocks(count);
   }
 
   // ---- Changes ----------------------------------------------------------------------------------

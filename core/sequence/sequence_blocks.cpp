@@ -113,7 +113,7 @@ void SequenceBlocks::append_group(std::int32_t all) noexcept {
   do {
     const std::int32_t b = group.count++;
     const std::int32_t size = std::min(all - count, filled(kBlockRoom));
-    group.block[b] = {flat == nullptr ? nullptr : flat + count, nullptr, 0, 0};
+    group.block[b] = {flat == nullptr ? nullptr : flat + count, nullptr, false, false, 0};
     group.id[b] = new_id(group);
     group.start[b + 1] = static_cast<std::int16_t>(group.start[b] + size);
     count += size;
@@ -127,9 +127,10 @@ void SequenceBlocks::release(SequenceBlocks* blocks) noexcept {
   for (Pool* pool : {&blocks->item_pieces, &blocks->group_pieces, &blocks->key_pieces}) {
     pool->release();
   }
-  for (void* array : {static_cast<void*>(blocks->groups), static_cast<void*>(blocks->starts),
-                      static_cast<void*>(blocks->homes), static_cast<void*>(blocks->flat),
-                      static_cast<void*>(blocks->map)}) {
+  for (void* array :
+       {static_cast<void*>(blocks->groups), static_cast<void*>(blocks->starts),
+        static_cast<void*>(blocks->homes), static_cast<void*>(blocks->flat),
+        static_cast<void*>(blocks->top_keys), blocks->flat_keys, static_cast<void*>(blocks->map)}) {
     heap_free(array);
   }
   heap_free(blocks);
@@ -146,7 +147,7 @@ bool SequenceBlocks::reserve_groups(std::int32_t more) noexcept {
   const std::int64_t needed = std::int64_t{num_groups} + more;
   if (needed <= group_room) return true;
   const std::int64_t room = grown_room(group_room, needed);
-  if (!grow(groups, room) || !grow(starts, room)) return false;
+  if (!grow(groups, room) || !grow(starts, room) || !grow(top_keys, room)) return false;
   group_room = static_cast<std::int32_t>(room);
   return true;
 }
@@ -188,9 +189,12 @@ SequencePlace SequenceBlocks::locate(std::int32_t position) const noexcept {
 }
 
 std::int32_t SequenceBlocks::read_elsewhere(std::int32_t position) noexcept {
-  const SequencePlace place = locate(position);
+  return read(locate(position));
+}
+
+std::int32_t SequenceBlocks::read(const SequencePlace& place) noexcept {
   SequenceGroup& group = *groups[place.group];
-  hint = {position - place.offset, group.chunk(place.block), &group, place.block};
+  hint = {place.position - place.offset, group.chunk(place.block), &group, place.block};
   return hint.chunk[place.offset];
 }
 
@@ -230,16 +234,16 @@ void SequenceBlocks::count_items(const SequencePlace& place, std::int32_t change
 
 // Copies the items of a block that is changed for the first time.
 void SequenceBlocks::give_own_piece(SequenceBlock& block, const SequenceChunk& chunk) noexcept {
-  if (block.own != 0) return;
+  if (block.own) return;
   auto* const items = static_cast<std::int32_t*>(item_pieces.take());
   copy_chunk(chunk, items);
   release_items(block);
   block.items = items;
-  block.own = 1;
+  block.own = true;
 }
 
 void SequenceBlocks::release_items(const SequenceBlock& block) noexcept {
-  if (block.own != 0) {
+  if (block.own) {
     item_pieces.give_back(block.items);
   } else if (block.items != nullptr && --borrowed == 0) {
     heap_free(flat);
@@ -261,7 +265,7 @@ SequencePlace SequenceBlocks::split(SequencePlace place) noexcept {
   ++group.count;
   group.start[b + 1] = static_cast<std::int16_t>(group.start[b] + kept);
   auto* const items = static_cast<std::int32_t*>(item_pieces.take());
-  group.block[b + 1] = {items, nullptr, 1, group.block[b].heat};
+  group.block[b + 1] = {items, nullptr, true, false, group.block[b].heat};
   group.id[b + 1] = new_id(group);
   move_entries(items, group.block[b].items + kept, kBlockRoom - kept);
   group.last[b + 1] = group.last[b];
@@ -310,6 +314,7 @@ SequenceGroup& SequenceBlocks::add_group(std::int32_t g) noexcept {
   move_entries(starts + g + 1, starts + g, num_groups - g);
   groups[g] = group;
   starts[g] = count;
+  has_top_keys = false;
   ++num_groups;
   number_groups(g);
   return *group;
@@ -370,6 +375,7 @@ void SequenceBlocks::join(SequenceGroup& group, std::int32_t b) noexcept {
 // Drops a block that is empty, or whose items the previous block has taken over.
 void SequenceBlocks::drop_block(SequenceGroup& group, std::int32_t b) noexcept {
   drop_keys(group, b);
+  if (b == group.count - 1) has_top_keys = false;
   release_items(group.block[b]);
   release_id(group.id[b]);
   close_block(group, b);
@@ -399,6 +405,7 @@ void SequenceBlocks::shrink_group(std::int32_t g) noexcept {
 // Drops a group whose blocks are gone or have moved.
 void SequenceBlocks::drop_group(std::int32_t g) noexcept {
   group_pieces.give_back(groups[g]);
+  has_top_keys = false;
   --num_groups;
   move_entries(groups + g, groups + g + 1, num_groups - g);
   move_entries(starts + g, starts + g + 1, num_groups - g);

@@ -15,7 +15,7 @@ namespace tevpf {
 inline constexpr std::int32_t kBlockRoom = 4;  // small sequences too have many blocks and groups
 inline constexpr std::int32_t kGroupRoom = 4;
 #else
-inline constexpr std::int32_t kBlockRoom = 256;
+inline constexpr std::int32_t kBlockRoom = 128;
 inline constexpr std::int32_t kGroupRoom = 64;
 #endif
 
@@ -66,8 +66,10 @@ std::int32_t count_less(std::int32_t length, IsLess is_less) noexcept {
 // pieces are written to.
 struct SequenceBlock {
   std::int32_t* items;
-  void* keys;         // one for each item, in a piece of their own; null: not gathered
-  std::int32_t own;   // 1 or 0
+  void* keys;         // one for each item, in a piece of their own or in an adopted array; null:
+                      // not gathered
+  bool own;           // whether `items` is a piece
+  bool own_keys;      // whether `keys` is one
   std::int32_t heat;  // searches that missed keys
 };
 
@@ -99,8 +101,10 @@ struct SequenceGroup {
 // Invariants: groups[g]->number == g; starts[g] is the number of items in front of group g, and
 // `count` that of all. homes[id].group is the group of the block with that id; unused ids are
 // chained from free_id on, -1 at the end. `borrowed` counts the blocks that lie in `flat`, which is
-// released with the last of them. If there is a map, it covers every item held: map[item] is the id
-// of the item's block, or -1 for items that are not held. Gathered keys equal those of the items.
+// released with the last of them; borrowed_keys counts those whose keys lie in flat_keys. If there
+// is a map, it covers every item held: map[item] is the id of the item's block, or -1 for items
+// that are not held. Gathered keys equal those of the items. With has_top_keys, top_keys[g] holds
+// the key of the last item of group g, in its first key_size bytes.
 // The keys, the map and the hint only save time: each may be missing, and is dropped where memory
 // is short.
 struct SequenceBlocks {
@@ -124,6 +128,8 @@ struct SequenceBlocks {
   std::int32_t free_id;
   SequenceGroup** groups;
   std::int32_t* starts;
+  std::uint64_t* top_keys;
+  bool has_top_keys;
   Home* homes;
   Hint hint;
 
@@ -134,6 +140,8 @@ struct SequenceBlocks {
   std::int64_t effort;  // items scanned for want of a map
   Pool item_pieces, group_pieces, key_pieces;
   std::int32_t key_size;  // bytes; 0: no block has keys
+  std::int32_t borrowed_keys;
+  void* flat_keys;
 
   // Blocks over a flat array, which they take over, or over the items 0 .. count - 1 where it is
   // null. O(count / kBlockRoom). Null when memory runs out.
@@ -158,6 +166,7 @@ struct SequenceBlocks {
     if (offset >= static_cast<std::uint32_t>(hint.chunk.count)) return read_elsewhere(position);
     return hint.chunk[static_cast<std::int32_t>(offset)];
   }
+  std::int32_t read(const SequencePlace& place) noexcept;
   std::int32_t read_elsewhere(std::int32_t position) noexcept;
   void forget_hint() noexcept { hint.chunk.count = 0; }
 
@@ -170,6 +179,8 @@ struct SequenceBlocks {
   void change_key_size(std::int32_t size) noexcept;
   // Gives a block a piece for its keys, to be filled by the caller; null when memory runs out.
   void* make_keys(SequenceGroup& group, std::int32_t b) noexcept;
+  // Takes over an array of the keys of all items, to be called before the first change.
+  void adopt_keys(void* keys, std::int32_t size) noexcept;
   void drop_keys(SequenceGroup& group, std::int32_t b) noexcept;
   void drop_all_keys() noexcept;
   // Replaces the key of the item at a place, where it has been gathered.
@@ -203,10 +214,13 @@ struct SequenceBlocks {
   void remember(const SequenceChunk& chunk, std::int32_t id) noexcept;
   SequencePlace place_in(const SequenceGroup& group, std::int32_t b,
                          std::int32_t offset) const noexcept;
+  SequencePlace look_in_order(std::int32_t item) const noexcept;
   SequencePlace look_everywhere(std::int32_t item) noexcept;
 
   // In sequence_keys.cpp; the last four are called before the change to the items.
   void* take_keys() noexcept;
+  void release_keys(SequenceBlock& block) noexcept;
+  void give_own_keys(SequenceGroup& group, std::int32_t b) noexcept;
   unsigned char* key_bytes(const SequenceBlock& block, std::int32_t offset) const noexcept;
   void set_last_key(SequenceGroup& group, std::int32_t b, const void* key) noexcept;
   void insert_key(SequenceGroup& group, const SequencePlace& place, const void* key) noexcept;

@@ -2,6 +2,7 @@
 // kept are dropped.
 #include <cstring>
 
+#include "core/base/heap.h"
 #include "core/sequence/sequence_blocks.h"
 
 namespace tevpf {
@@ -23,20 +24,70 @@ void* SequenceBlocks::take_keys() noexcept {
 }
 
 void* SequenceBlocks::make_keys(SequenceGroup& group, std::int32_t b) noexcept {
-  return group.block[b].keys = take_keys();
+  SequenceBlock& block = group.block[b];
+  block.keys = take_keys();
+  block.own_keys = block.keys != nullptr;
+  return block.keys;
+}
+
+void SequenceBlocks::adopt_keys(void* keys, std::int32_t size) noexcept {
+  expect_keys(size);
+  drop_all_keys();
+  flat_keys = keys;
+  auto* at = static_cast<unsigned char*>(keys);
+  for (std::int32_t g = 0; g < num_groups; ++g) {
+    SequenceGroup& group = *groups[g];
+    for (std::int32_t b = 0; b < group.count && group.items_of(b) > 0; ++b) {
+      group.block[b].keys = at;
+      ++borrowed_keys;
+      at += group.items_of(b) * size;
+      std::memcpy(&group.last_key[b], at - size, static_cast<std::size_t>(size));
+    }
+    group.has_last_keys = borrowed_keys > 0;
+  }
+}
+
+void SequenceBlocks::release_keys(SequenceBlock& block) noexcept {
+  if (block.own_keys) {
+    key_pieces.give_back(block.keys);
+  } else if (block.keys != nullptr && --borrowed_keys == 0) {
+    heap_free(flat_keys);
+    flat_keys = nullptr;
+  }
+  block.keys = nullptr;
+  block.own_keys = false;
+}
+
+// Copies adopted keys that are about to change; drops them when memory runs out.
+void SequenceBlocks::give_own_keys(SequenceGroup& group, std::int32_t b) noexcept {
+  SequenceBlock& block = group.block[b];
+  if (block.keys == nullptr || block.own_keys) return;
+  void* const own = take_keys();
+  if (own != nullptr) {
+    std::memcpy(own, block.keys, static_cast<std::size_t>(group.items_of(b) * key_size));
+  }
+  release_keys(block);
+  block.keys = own;
+  block.own_keys = own != nullptr;
 }
 
 void SequenceBlocks::drop_keys(SequenceGroup& group, std::int32_t b) noexcept {
-  if (group.block[b].keys != nullptr) key_pieces.give_back(group.block[b].keys);
-  group.block[b].keys = nullptr;
+  release_keys(group.block[b]);
 }
 
 void SequenceBlocks::drop_all_keys() noexcept {
+  has_top_keys = false;
   for (std::int32_t g = 0; g < num_groups; ++g) {
     groups[g]->has_last_keys = false;
-    for (std::int32_t b = 0; b < groups[g]->count; ++b) groups[g]->block[b].keys = nullptr;
+    for (std::int32_t b = 0; b < groups[g]->count; ++b) {
+      groups[g]->block[b].keys = nullptr;
+      groups[g]->block[b].own_keys = false;
+    }
   }
   key_pieces.release();
+  heap_free(flat_keys);
+  flat_keys = nullptr;
+  borrowed_keys = 0;
 }
 
 void SequenceBlocks::change_key_size(std::int32_t size) noexcept {
@@ -49,6 +100,7 @@ void SequenceBlocks::set_key(SequencePlace place, const void* key) noexcept {
   if (place.group < 0) place = locate(place.position);
   SequenceGroup& group = *groups[place.group];
   const std::int32_t b = place.block;
+  give_own_keys(group, b);
   if (group.block[b].keys != nullptr) {
     std::memcpy(key_bytes(group.block[b], place.offset), key, static_cast<std::size_t>(key_size));
   }
@@ -56,11 +108,15 @@ void SequenceBlocks::set_key(SequencePlace place, const void* key) noexcept {
 }
 
 void SequenceBlocks::set_last_key(SequenceGroup& group, std::int32_t b, const void* key) noexcept {
+  const bool of_group = b == group.count - 1;
   if (key == nullptr) {
     group.has_last_keys = false;
-  } else if (group.has_last_keys) {
-    std::memcpy(&group.last_key[b], key, static_cast<std::size_t>(key_size));
+    has_top_keys = has_top_keys && !of_group;
+    return;
   }
+  const auto size = static_cast<std::size_t>(key_size);
+  if (group.has_last_keys) std::memcpy(&group.last_key[b], key, size);
+  if (has_top_keys && of_group) std::memcpy(&top_keys[group.number], key, size);
 }
 
 void SequenceBlocks::insert_key(SequenceGroup& group, const SequencePlace& place,
@@ -68,8 +124,9 @@ void SequenceBlocks::insert_key(SequenceGroup& group, const SequencePlace& place
   const SequenceBlock& block = group.block[place.block];
   const std::int32_t behind = group.items_of(place.block) - place.offset;
   if (behind == 0) set_last_key(group, place.block, key);
-  if (block.keys == nullptr) return;
   if (key == nullptr) return drop_keys(group, place.block);
+  give_own_keys(group, place.block);
+  if (block.keys == nullptr) return;
   unsigned char* const at = key_bytes(block, place.offset);
   move_bytes(at + key_size, at, behind * key_size);
   std::memcpy(at, key, static_cast<std::size_t>(key_size));
@@ -78,6 +135,7 @@ void SequenceBlocks::insert_key(SequenceGroup& group, const SequencePlace& place
 void SequenceBlocks::erase_key(SequenceGroup& group, const SequencePlace& place) noexcept {
   const SequenceBlock& block = group.block[place.block];
   const std::int32_t behind = group.items_of(place.block) - place.offset - 1;
+  give_own_keys(group, place.block);
   if (block.keys == nullptr) {
     if (behind == 0) set_last_key(group, place.block, nullptr);
     return;
@@ -96,14 +154,14 @@ void SequenceBlocks::split_keys(SequenceGroup& group, std::int32_t b, std::int32
   }
   set_last_key(group, b, key_bytes(left, kept - 1));
   SequenceBlock& right = group.block[b + 1];
-  right.keys = take_keys();
-  if (right.keys == nullptr) return;
+  if (make_keys(group, b + 1) == nullptr) return;
   move_bytes(key_bytes(right, 0), key_bytes(left, kept), (kBlockRoom - kept) * key_size);
 }
 
 void SequenceBlocks::join_keys(SequenceGroup& group, std::int32_t b) noexcept {
   const SequenceBlock& left = group.block[b];
   const SequenceBlock& right = group.block[b + 1];
+  give_own_keys(group, b);
   if (right.keys == nullptr) drop_keys(group, b);
   if (left.keys == nullptr) return;
   move_bytes(key_bytes(left, group.items_of(b)), key_bytes(right, 0),

@@ -22,7 +22,7 @@ namespace tevpf {
 inline constexpr std::int32_t kSearchesPerGathering = 2;
 #else
 // Gathering the keys of a block costs about as much as this many searches without them.
-inline constexpr std::int32_t kSearchesPerGathering = 4;
+inline constexpr std::int32_t kSearchesPerGathering = 2;
 #endif
 
 // Probes that reach values through the items.
@@ -30,10 +30,15 @@ template <class Less>
 struct ItemProbes {
   Less less;
 
+  void get_ready(SequenceBlocks&) const noexcept {}
+  bool is_group_less(const SequenceBlocks& blocks, std::int32_t g) const noexcept {
+    const SequenceGroup& group = *blocks.groups[g];
+    return less(group.last[group.count - 1]);
+  }
+  void get_ready(SequenceGroup&) const noexcept {}
   bool is_last_less(const SequenceGroup& group, std::int32_t b) const noexcept {
     return less(group.last[b]);
   }
-  void get_ready(SequenceGroup&) const noexcept {}
   std::int32_t count_less_in(SequenceBlocks&, SequenceGroup& group, std::int32_t b) const noexcept {
     return count_less_in(group.chunk(b));
   }
@@ -79,20 +84,38 @@ struct KeyProbes {
 
   bool is_item_less(std::int32_t item) const noexcept { return less(key_of(item), item); }
 
-  bool is_last_less(const SequenceGroup& group, std::int32_t b) const noexcept {
-    if (!group.has_last_keys) return is_item_less(group.last[b]);
+  static Key load(const std::uint64_t& from) noexcept {
     Key key;
-    std::memcpy(&key, &group.last_key[b], sizeof key);
-    return less(key, group.last[b]);
+    std::memcpy(&key, &from, sizeof key);
+    return key;
+  }
+  static void store(std::uint64_t& to, Key key) noexcept { std::memcpy(&to, &key, sizeof key); }
+
+  void get_ready(SequenceBlocks& blocks) const noexcept {
+    if (blocks.has_top_keys) return;
+    for (std::int32_t g = 0; g < blocks.num_groups; ++g) {
+      const SequenceGroup& group = *blocks.groups[g];
+      const std::int32_t b = group.count - 1;
+      store(blocks.top_keys[g],
+            group.has_last_keys ? load(group.last_key[b]) : key_of(group.last[b]));
+    }
+    blocks.has_top_keys = true;
+  }
+  bool is_group_less(const SequenceBlocks& blocks, std::int32_t g) const noexcept {
+    const SequenceGroup& group = *blocks.groups[g];
+    return less(load(blocks.top_keys[g]), group.last[group.count - 1]);
   }
 
   void get_ready(SequenceGroup& group) const noexcept {
-    if (group.has_last_keys || ++group.heat < kSearchesPerGathering) return;
+    prefetch(group.last_key, kGroupRoom);
+    if (group.has_last_keys) return;
     for (std::int32_t b = 0; b < group.count; ++b) {
-      const Key key = key_of(group.last[b]);
-      std::memcpy(&group.last_key[b], &key, sizeof key);
+      store(group.last_key[b], key_of(group.last[b]));
     }
     group.has_last_keys = true;
+  }
+  bool is_last_less(const SequenceGroup& group, std::int32_t b) const noexcept {
+    return less(load(group.last_key[b]), group.last[b]);
   }
 
   std::int32_t count_less_in(SequenceBlocks& blocks, SequenceGroup& group,
@@ -100,13 +123,56 @@ struct KeyProbes {
     const SequenceChunk chunk = group.chunk(b);
     const Key* const keys = keys_of_block(blocks, group, b, key_of);
     if (keys == nullptr) return count_less_in(chunk);
-    prefetch(chunk.items, chunk.count);  // whoever searches will read or insert an item
     prefetch(keys, chunk.count);
+    prefetch(chunk.items, chunk.count);  // whoever searches will read or insert an item
     return count_less(chunk.count, [&](std::int32_t i) { return less(keys[i], chunk[i]); });
   }
   std::int32_t count_less_in(const SequenceChunk& chunk) const noexcept {
     return count_less(chunk.count, [&](std::int32_t i) { return is_item_less(chunk[i]); });
   }
+};
+
+// Requests the cache lines that search_keys will read, as far as keys have been gathered. Whoever is
+// going to search several sequences takes each step for all of them before the next one, so that
+// their cache misses overlap. is_less(key) as in search_keys, without the item.
+class SearchAhead {
+ public:
+  template <class Key, class IsLess>
+  void fetch_group(const SequenceBlocks& blocks, IsLess is_less) noexcept {
+    group_ = nullptr;
+    if (!blocks.has_top_keys || blocks.key_size != std::int32_t{sizeof(Key)}) return;
+    group_ = blocks.groups[count_in<Key>(blocks.top_keys, blocks.num_groups - 1, is_less)];
+    __builtin_prefetch(group_);
+    prefetch(group_->last_key, kGroupRoom);
+  }
+  template <class Key, class IsLess>
+  void fetch_block(IsLess is_less) noexcept {
+    if (group_ != nullptr && !group_->has_last_keys) group_ = nullptr;
+    if (group_ == nullptr) return;
+    block_ = &group_->block[count_in<Key>(group_->last_key, group_->count - 1, is_less)];
+    __builtin_prefetch(block_);
+    prefetch(group_->start, kGroupRoom + 1);  // for the insertion
+  }
+  template <class Key>
+  void fetch_keys() const noexcept {
+    if (group_ == nullptr) return;
+    prefetch(static_cast<const Key*>(block_->keys), kBlockRoom);
+    prefetch(block_->items, kBlockRoom);
+  }
+
+ private:
+  template <class Key, class IsLess>
+  static std::int32_t count_in(const std::uint64_t* keys, std::int32_t count,
+                               IsLess is_less) noexcept {
+    return count_less(count, [&](std::int32_t i) {
+      Key key;
+      std::memcpy(&key, keys + i, sizeof key);
+      return is_less(key);
+    });
+  }
+
+  const SequenceGroup* group_ = nullptr;
+  const SequenceBlock* block_ = nullptr;
 };
 
 template <class Probes>
@@ -116,10 +182,9 @@ SequencePlace search_sequence(const Sequence& sequence, std::int32_t count,
   if (sequence.blocks == nullptr) return {probes.count_less_in(sequence.chunk_at(count, 0))};
   SequenceBlocks& blocks = *sequence.blocks;
   // The last group, and the last block, are not compared: what is not in an earlier one is there.
-  const std::int32_t g = count_less(blocks.num_groups - 1, [&](std::int32_t i) {
-    const SequenceGroup& some = *blocks.groups[i];
-    return probes.is_last_less(some, some.count - 1);
-  });
+  probes.get_ready(blocks);
+  const std::int32_t g = count_less(
+      blocks.num_groups - 1, [&](std::int32_t i) { return probes.is_group_less(blocks, i); });
   SequenceGroup& group = *blocks.groups[g];
   probes.get_ready(group);
   const std::int32_t b =
@@ -143,6 +208,17 @@ SequencePlace search_keys(const Sequence& sequence, std::int32_t count, KeyOf ke
   using Probes = KeyProbes<KeyOf, Less>;
   if (sequence.blocks != nullptr) sequence.blocks->expect_keys(sizeof(typename Probes::Key));
   return search_sequence(sequence, count, Probes{key_of, less});
+}
+
+// The key of the item at a place where a search has ended; not the end of the sequence.
+template <class KeyOf>
+auto key_at(const Sequence& sequence, const SequencePlace& place, KeyOf key_of) noexcept {
+  using Key = decltype(key_of(place.position));
+  if (sequence.blocks != nullptr && sequence.blocks->key_size == std::int32_t{sizeof(Key)}) {
+    const SequenceBlock& block = sequence.blocks->groups[place.group]->block[place.block];
+    if (block.keys != nullptr) return static_cast<const Key*>(block.keys)[place.offset];
+  }
+  return key_of(sequence.at(place));
 }
 
 // The key of the item at a position, for searches with probes of their own.

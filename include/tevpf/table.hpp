@@ -1,6 +1,7 @@
 // Tables: rows of typed columns.
 #pragma once
 
+#include <algorithm>
 #include <cstddef>
 #include <cstdint>
 #include <cstring>
@@ -18,6 +19,7 @@
 #include "column.hpp"
 #include "element.hpp"
 #include "row.hpp"
+#include "row_layout.hpp"
 #include "row_range.hpp"
 #include "table_ref.hpp"
 #include "value.hpp"
@@ -109,6 +111,26 @@ class Table {
   template <Number T>
   std::size_t column(std::string_view column, std::span<T> values_out) const;
 
+  // ---- Rows as bytes ----
+  // Beside PF_TYPECHG (the columns are no longer those of the layout):
+
+  RowLayout row_layout() const;
+
+  // Copies whole rows from a position on, in storage order or in that of an indexed column, as many
+  // as there are and as rows_out has room for; gives how many. O(rows copied).
+  //   numbers_out  receives their row numbers; empty, or room for as many as rows_out
+  //   PF_NOCOLUMN; PF_BADSEARCH: no index
+  //   PF_BADARG  numbers_out is too small
+  std::size_t read_rows(const RowLayout& layout, std::size_t first, std::span<std::byte> rows_out,
+                        std::string_view order = {},
+                        std::span<std::int32_t> numbers_out = {}) const;
+
+  // Appends rows that lie one behind the other, all or none. Refuses as append does; the sentence says
+  // which row it was, counted from 0.
+  //   PF_BADARG  not a whole number of rows
+  //   std::bad_alloc  the first rows may have been added, when there was no memory to take them back
+  void append_rows(const RowLayout& layout, std::span<const std::byte> rows);
+
   // ---- Changing rows ----
   // Refused beside PF_BADPOS (no such row):
   //   PF_RANGE      a value lies outside its column's bounds; the Error's value() names the column
@@ -169,8 +191,14 @@ class Table {
   void make_current(std::size_t number) const;
   // The row's bytes, ahead of handing them to the library.
   const unsigned char* checked(const Row& row) const;
+  void require_layout(const detail::LayoutPtr& layout, const char* made) const;
   void require_number(std::size_t number, std::size_t count) const;
-  void check_added(TEVPF_STATUS status, const Row& row) const;
+  void check_added(TEVPF_STATUS status, const detail::Layout& layout,
+                   const unsigned char* row) const;
+  void check_added(TEVPF_STATUS status, const Row& row) const {
+    check_added(status, *row.layout_, row.bytes());
+  }
+  void cut_rows(std::size_t count);
   void change_columns(TEVPF_STATUS status, std::string_view subject) const;
 
   mutable detail::TableRef table_;  // keeps what it knows of the columns up to date
@@ -361,25 +389,30 @@ inline Row Table::make_row(std::initializer_list<Cell> values) const {
   return result;
 }
 
+inline void Table::require_layout(const detail::LayoutPtr& layout, const char* made) const {
+  const detail::Layout& now = this->layout();
+  if (table_.layout() == layout || now.is_same(*layout)) return;
+  throw Error(
+      PF_TYPECHG, std::string(name()), {},
+      std::string(made) + " made for other columns than table '" + std::string(name()) + "' has");
+}
+
 inline const unsigned char* Table::checked(const Row& row) const {
-  const detail::Layout& now = layout();
-  if (table_.layout() != row.layout_ && !now.is_same(*row.layout_)) {
-    throw Error(PF_TYPECHG, std::string(name()), {},
-                "the row was made for other columns than table '" + std::string(name()) + "' has");
-  }
+  require_layout(row.layout_, "the row was");
   return row.bytes();
 }
 
 // Throws when the library refused a row. For a value out of range it does not say of which column.
-inline void Table::check_added(TEVPF_STATUS status, const Row& row) const {
+inline void Table::check_added(TEVPF_STATUS status, const detail::Layout& layout,
+                               const unsigned char* row) const {
   if (status == PF_NORMAL) {
     ++detail::row_changes;
     return;
   }
   if (status == PF_RANGE) {
-    for (const detail::Place& place : row.layout_->places) {
+    for (const detail::Place& place : layout.places) {
       const char* const column = place.name.c_str();
-      if (TEV8R1_validate_row_value(table_.name().c_str(), column, row.bytes() + place.offset) ==
+      if (TEV8R1_validate_row_value(table_.name().c_str(), column, row + place.offset) ==
           PF_RANGE) {
         detail::raise(status, column);
       }
@@ -433,6 +466,60 @@ inline void Table::remove(std::size_t number) {
   make_current(number);
   detail::check(TEV8R1_PF_delete_row(table_.name().c_str()));
   ++detail::row_changes;
+}
+
+// ---- Implementation: rows as bytes --------------------------------------------------------------
+
+inline RowLayout Table::row_layout() const {
+  layout();
+  return RowLayout(table_.layout());
+}
+
+inline std::size_t Table::read_rows(const RowLayout& layout, std::size_t first,
+                                    std::span<std::byte> rows_out, std::string_view order,
+                                    std::span<std::int32_t> numbers_out) const {
+  require_layout(layout.layout_, "the room for rows was");
+  const detail::Name column = detail::lookup_name(order, PF_NOCOLUMN);
+  const std::size_t rows = size();
+  if (first >= rows || layout.row_size() == 0) return 0;
+  const std::size_t count = (std::min)(rows - first, rows_out.size() / layout.row_size());
+  if (!numbers_out.empty() && numbers_out.size() < count) {
+    throw Error(PF_BADARG, std::to_string(numbers_out.size()), std::to_string(count),
+                "there is no room for the numbers of " + std::to_string(count) + " rows");
+  }
+  return table_.read(order.empty() ? nullptr : column.c_str(), first, count,
+                     reinterpret_cast<unsigned char*>(rows_out.data()),
+                     numbers_out.empty() ? nullptr : numbers_out.data());
+}
+
+inline void Table::append_rows(const RowLayout& layout, std::span<const std::byte> rows) {
+  require_layout(layout.layout_, "the rows were");
+  const std::size_t row_size = layout.row_size();
+  if (row_size == 0 ? !rows.empty() : rows.size() % row_size != 0) {
+    throw Error(PF_BADARG, std::to_string(rows.size()), std::to_string(row_size),
+                std::to_string(rows.size()) + " bytes are no rows of " + std::to_string(row_size) +
+                    " bytes");
+  }
+  const std::size_t before = size();
+  std::size_t done = 0;
+  try {
+    for (; done * row_size < rows.size(); ++done) {
+      const auto* row = reinterpret_cast<const unsigned char*>(rows.data() + done * row_size);
+      check_added(TEV8R1_PF_add_row(table_.name().c_str(), row), *layout.layout_, row);
+    }
+  } catch (const Error& refusal) {
+    cut_rows(before);
+    throw Error(refusal.status(), refusal.item(), refusal.value(),
+                "row " + std::to_string(done) + ": " + refusal.what());
+  } catch (...) {
+    cut_rows(before);
+    throw;
+  }
+}
+
+// Removes rows from the end until `count` are left.
+inline void Table::cut_rows(std::size_t count) {
+  for (std::size_t rows = size(); rows > count; --rows) remove(rows - 1);
 }
 
 // ---- Implementation: the element ----------------------------------------------------------------

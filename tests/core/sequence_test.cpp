@@ -19,7 +19,7 @@ using Items = std::vector<std::int32_t>;
 template <class KeyOf>
 const char* broken_rule(const SequenceBlocks& blocks, KeyOf key_of) {
   using Key = decltype(key_of(0));
-  std::int32_t position = 0, borrowed = 0;
+  std::int32_t position = 0, borrowed = 0, borrowed_keys = 0;
   std::vector<std::int32_t> ids;
   for (std::int32_t g = 0; g < blocks.num_groups; ++g) {
     const SequenceGroup& group = *blocks.groups[g];
@@ -33,8 +33,9 @@ const char* broken_rule(const SequenceBlocks& blocks, KeyOf key_of) {
       if (chunk.count > 0 && chunk[chunk.count - 1] != group.last[b]) return "last item";
       if (blocks.homes[group.id[b]].group != &group) return "home";
       ids.push_back(group.id[b]);
-      if (block.items == nullptr && block.own != 0) return "run with a piece";
-      borrowed += block.items != nullptr && block.own == 0;
+      if (block.items == nullptr && block.own) return "run with a piece";
+      borrowed += block.items != nullptr && !block.own;
+      borrowed_keys += block.keys != nullptr && !block.own_keys;
       for (std::int32_t i = 0; i < chunk.count; ++i) {
         if (blocks.map != nullptr && blocks.map[chunk[i]] != group.id[b]) return "map";
         if (block.keys != nullptr && static_cast<Key*>(block.keys)[i] != key_of(chunk[i]))
@@ -46,6 +47,10 @@ const char* broken_rule(const SequenceBlocks& blocks, KeyOf key_of) {
         return "last key";
       position += chunk.count;
     }
+    Key top;
+    std::memcpy(&top, &blocks.top_keys[g], sizeof top);
+    if (blocks.has_top_keys && blocks.count > 0 && top != key_of(group.last[group.count - 1]))
+      return "key of a group's last item";
     for (std::int32_t b = group.count + 1; b <= kGroupRoom; ++b)
       if (group.start[b] != SequenceGroup::kNoStart) return "start of no block";
   }
@@ -59,6 +64,8 @@ const char* broken_rule(const SequenceBlocks& blocks, KeyOf key_of) {
                                     [](std::int32_t id) { return id >= 0; });
   if (blocks.map != nullptr && mapped != blocks.count) return "map of no item";
   if (borrowed != blocks.borrowed || (borrowed > 0) != (blocks.flat != nullptr)) return "borrowed";
+  if (borrowed_keys != blocks.borrowed_keys || (borrowed_keys > 0) != (blocks.flat_keys != nullptr))
+    return "borrowed keys";
   return position == blocks.count ? nullptr : "count";
 }
 
@@ -69,7 +76,7 @@ std::int64_t pieces(const SequenceBlocks& blocks) {
     all += pool->spare;
   for (std::int32_t g = 0; g < blocks.num_groups; ++g)
     for (std::int32_t b = 0; b < blocks.groups[g]->count; ++b)
-      all += blocks.groups[g]->block[b].own + (blocks.groups[g]->block[b].keys != nullptr);
+      all += blocks.groups[g]->block[b].own + blocks.groups[g]->block[b].own_keys;
   return all;
 }
 
@@ -139,6 +146,7 @@ class Model {
   }
 
   int in_blocks = 0;  // comparisons made in that state
+  int adoptions = 0;
 
  private:
   std::int32_t count() const { return static_cast<std::int32_t>(items_.size()); }
@@ -161,6 +169,15 @@ class Model {
     return by_key;
   }
 
+  // A sequence that has just become blocks may take over the keys of all items.
+  void maybe_adopt_keys(const Sequence& before) {
+    if (before.blocks != nullptr || sequence_.blocks == nullptr || pick(2) == 0) return;
+    auto keys = new_array<Key>(items_.size());
+    for (std::size_t i = 0; keys && i < items_.size(); ++i) keys[i] = key_of()(items_[i]);
+    if (keys) sequence_.blocks->adopt_keys(keys.release(), sizeof(Key));
+    ++adoptions;
+  }
+
   // For changes at the end.
   void expect_same_state(const Sequence& before) const {
     EXPECT_EQ(sequence_.is_identity(), before.is_identity());
@@ -180,6 +197,7 @@ class Model {
     SequencePlace place = by_value_ ? search(value) : some_place();
     const Sequence before = sequence_;
     while (!sequence_.make_ready_to_insert(count(), place.position, item)) compare();
+    maybe_adopt_keys(before);
     if (place.position == count() && (!before.is_identity() || item == count()))
       expect_same_state(before);
     if (fresh) {
@@ -200,6 +218,7 @@ class Model {
         pick(2) != 0 ? sequence_.place_of(count(), item) : SequencePlace{position};
     const Sequence before = sequence_;
     while (!sequence_.make_ready_to_erase(count(), position)) compare();
+    maybe_adopt_keys(before);
     if (position == count() - 1) expect_same_state(before);
     sequence_.erase(count(), place);
     items_.erase(items_.begin() + position);
@@ -279,6 +298,7 @@ TYPED_TEST(SequenceTest, HoldsWhatAVectorHolds) {
       model.step();
     }
     EXPECT_GT(model.in_blocks, 4'000);
+    EXPECT_GT(model.adoptions, 20);
   }
 }
 

@@ -1,7 +1,9 @@
 // Runs a fuzz target as an ordinary test: over the files of a corpus folder, and over each of them with
-// every byte changed or every four bytes overwritten in one of several ways.
+// every byte changed or every four bytes overwritten in one of several ways; with a step of n, at every
+// n-th place.
 #include <cstdint>
 #include <cstdio>
+#include <cstdlib>
 #include <cstring>
 #include <filesystem>
 #include <fstream>
@@ -33,6 +35,7 @@ std::string damaged(std::string input, std::size_t place, std::size_t way) {
 }  // namespace
 
 int main(int argc, char** argv) {
+  const std::size_t step = argc > 2 ? std::strtoul(argv[2], nullptr, 10) : 1;
   std::size_t inputs = 0;
   for (const auto& entry : std::filesystem::directory_iterator(argc > 1 ? argv[1] : ".")) {
     std::ifstream file(entry.path(), std::ios::binary);
@@ -40,7 +43,9 @@ int main(int argc, char** argv) {
     std::printf("%s\n", entry.path().c_str());
     std::fflush(stdout);
     run(bytes);
-    for (std::size_t i = 0; i < bytes.size(); ++i) run(damaged(bytes, i, (i + inputs) % 8));
+    for (std::size_t i = inputs % step; i < bytes.size(); i += step) {
+      run(damaged(bytes, i, (i / step + inputs) % 8));
+    }
     ++inputs;
   }
   return inputs > 0 ? 0 : 1;

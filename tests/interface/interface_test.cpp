@@ -42,6 +42,13 @@ class InterfaceTest : public LibraryTest {
     table.append({80, "Hg", 200.59, -38.83});
   }
 
+  static std::vector<std::byte> bytes_of(const Table& table, std::string_view order = {}) {
+    std::vector<std::byte> rows(table.size() * table.row_size());
+    const std::size_t count = table.read_rows(table.row_layout(), 0, rows, order);
+    EXPECT_EQ(count, table.size());
+    return rows;
+  }
+
   static std::string symbols(auto&& rows) {
     std::string all;
     for (const auto& row : rows) all += row.template get<std::string>("symbol") + ' ';
@@ -99,10 +106,14 @@ TEST_F(InterfaceTest, RefusalsSayWhatIsWrongAndChangeNothing) {
   Table shape = file.create_table("shape");
   shape.add_column(Column("a", Type::int32));
   const Row stranger = shape.new_row();
+  const tevpf::RowLayout strange_layout = shape.row_layout();
   table.add_column(Column("state", Type::string).width(6));
   const std::string before = dump(file);
   file.save();
   const std::string bytes = read_file(dir_ / "file");
+  std::vector<std::byte> new_rows = bytes_of(table);  // with new numbers, but for the last row
+  for (int i = 0; i < 2; ++i)
+    new_rows[static_cast<std::size_t>(i) * table.row_size()] = std::byte(90 + i);
 
   const struct {
     std::function<void()> call;
@@ -158,6 +169,15 @@ TEST_F(InterfaceTest, RefusalsSayWhatIsWrongAndChangeNothing) {
        PF_BADPOS, "4", "3", "position 4 is out of range; the number of entries is 3"},
       {[&] { table.append(stranger); }, PF_TYPECHG, "elements", "",
        "the row was made for other columns than table 'elements' has"},
+      {[&] { table.append_rows(table.row_layout(), new_rows); }, PF_DUPLICATE, "value 80",
+       "column number", "row 2: value '80' is already in column 'number'"},
+      {[&] { table.append_rows(strange_layout, new_rows); }, PF_TYPECHG, "elements", "",
+       "the rows were made for other columns than table 'elements' has"},
+      {[&] { table.append_rows(table.row_layout(), std::span(new_rows).subspan(1)); }, PF_BADARG,
+       nullptr, nullptr, nullptr},
+      {[&] { table.read_rows(strange_layout, 0, new_rows); }, PF_TYPECHG, "elements", "", nullptr},
+      {[&] { table.read_rows(table.row_layout(), 0, new_rows, "mass"); }, PF_BADSEARCH, "mass", "",
+       "column 'mass' has no index"},
       {[&] { table.replace(old_row); }, PF_TYPECHG, "elements", "",
        "the row was made for other columns than table 'elements' has"},
       {[&] { table.set(1, "number", 26); }, PF_DUPLICATE, "value 26", "column number",
@@ -191,7 +211,9 @@ TEST_F(InterfaceTest, RefusalsSayWhatIsWrongAndChangeNothing) {
       if (item != nullptr) {
         EXPECT_EQ(error.item(), item) << error.what();
       }
-      EXPECT_EQ(error.value(), value) << error.what();
+      if (value != nullptr) {
+        EXPECT_EQ(error.value(), value) << error.what();
+      }
       if (sentence != nullptr) {
         EXPECT_STREQ(error.what(), sentence);
       }
@@ -226,7 +248,15 @@ TEST_F(InterfaceTest, RowsAreThoseOfAModelWhateverChanges) {
     const std::size_t at = below(model.size()), to = below(model.size());
     const auto place = model.begin() + static_cast<std::ptrdiff_t>(at);
     const int choice = model.empty() ? 0 : static_cast<int>(below(step < 900 ? 7 : 12));
-    if (choice < 4) {
+    if (choice == 3) {
+      const std::size_t count = below(4);
+      const std::vector<std::byte> rows = bytes_of(table);
+      table.append_rows(table.row_layout(),
+                        std::span(rows).first((std::min)(count * table.row_size(), rows.size())));
+      for (std::size_t i = 0, all = model.size(); i < (std::min)(count, all); ++i) {
+        model.push_back(Item(model[i]));
+      }
+    } else if (choice < 4) {
       table.append({item.key, item.text, item.measure});
       model.push_back(item);
     } else if (choice == 4) {
@@ -277,6 +307,18 @@ TEST_F(InterfaceTest, RowsAreThoseOfAModelWhateverChanges) {
     }
     ASSERT_EQ(static_cast<std::ptrdiff_t>(seen),
               std::ranges::count_if(model, [](const Item& i) { return i.key >= 50; }));
+
+    const std::size_t from = below(model.size() + 2);
+    std::vector<std::byte> block(5 * table.row_size());
+    std::vector<std::int32_t> numbers(5, -1);
+    const std::size_t count = table.read_rows(table.row_layout(), from, block, "key", numbers);
+    ASSERT_EQ(count, from >= model.size() ? 0 : (std::min<std::size_t>)(5, model.size() - from));
+    for (std::size_t i = 0; i < count; ++i) {
+      std::int32_t key;
+      std::memcpy(&key, &block[i * table.row_size()], sizeof key);
+      ASSERT_EQ(key, keys.at(from + i));
+      ASSERT_EQ(key, model.at(static_cast<std::size_t>(numbers[i])).key);
+    }
 
     const auto found = table.find("text", item.text);
     const auto wanted = std::ranges::find(model, item.text, &Item::text);

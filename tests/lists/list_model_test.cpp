@@ -1,5 +1,6 @@
-// Random operations on several lists and on a plain model of them. After every one: status, both error
-// texts, every parameter, cursor, spare slots, and the invariants of the record.
+// Random operations on several lists and on a plain model of them. After every one: status, both
+// error texts, every parameter, cursor, spare slots, and the invariants of the record, which is
+// compared in whatever state it is; now and then it is handed out and must be settled.
 #include <gtest/gtest.h>
 
 #include <algorithm>
@@ -9,7 +10,9 @@
 #include <map>
 #include <random>
 
+#include "lists/directory.h"
 #include "lists/name_index.h"
+#include "lists/settle.h"
 #include "support/param_def.h"
 #include "support/temp_file.h"
 
@@ -46,8 +49,8 @@ class ListModel : public TempFileTest {
         &M::add, &M::add, &M::add, &M::add, &M::add, &M::remove, &M::redefine, &M::redefine,
         &M::rename, &M::move, &M::change_value, &M::change_value, &M::value, &M::value,
         &M::definition, &M::definition, &M::definition, &M::sizes, &M::sizes, &M::inquire,
-        &M::set_cursor, &M::reset, &M::inquire_default, &M::set_default, &M::replace_by_copy,
-        &M::reopen};
+        &M::set_cursor, &M::reset, &M::inquire_default, &M::set_default, &M::replace,
+        &M::reopen, &M::hand_out, &M::walk};
     // clang-format on
     for (int step = 0; step < steps && !HasFailure(); ++step) {
       name_ = chance(2) ? "alpha" : "beta";
@@ -63,7 +66,14 @@ class ListModel : public TempFileTest {
     }
   }
 
-  int tables_seen_ = 0;
+  static void create(const std::string& name, ModelList& model) {
+    model = {};
+    ASSERT_EQ(TEV8R1_PF_create_elem(name.c_str(), "", PF_ELEM_LIST), PF_NORMAL);
+    std::strcpy(list(name).RESERVED, "carried");
+  }
+
+  std::map<std::string, ModelList> lists_{{"alpha", {}}, {"beta", {}}};
+  int tables_seen_ = 0, blocks_seen_ = 0, keys_seen_ = 0;
 
  private:
   // ---- chance
@@ -77,8 +87,10 @@ class ListModel : public TempFileTest {
     return text;
   }
   // Few enough to be met again, some of them patterns, blank in front, or too long.
+  // Those of beta usually begin alike.
   std::string any_name() {
     if (chance(12)) return std::string(18, 'l') + letters(6, "lm*");
+    if (name_ == "beta" && !chance(60)) return std::string(14, 'l') + letters(4, "abc\xE9");
     return (chance(10) ? " " : "") + letters(3, "abc\xE9") + (chance(12) ? "*" : "");
   }
   std::string known_name() {
@@ -154,15 +166,18 @@ class ListModel : public TempFileTest {
     return expected == PF_NORMAL;
   }
   void compare(const std::string& name, ModelList& model) {
-    const TEVPF_LIST& record = list(name);
-    tables_seen_ += record.names.slots != nullptr;
-    ASSERT_EQ(broken_rule(record), nullptr) << name;
+    const TEVPF_LIST& record = unsettled(name);
+    const tevpf::SequenceBlocks* const blocks = record.index.order.blocks;
+    tables_seen_ += record.names.entries != nullptr;
+    blocks_seen_ += record.slots.order.blocks != nullptr;
+    keys_seen_ += blocks != nullptr && blocks->key_size > 0 && record.index.beginning_length > 12;
+    ASSERT_STREQ(broken_rule(record), nullptr) << name;
     ASSERT_EQ(record.num_params, model.count());
     EXPECT_EQ(record.cur_param, model.cursor);
     EXPECT_EQ(record.free_params, model.free);
     EXPECT_STREQ(record.RESERVED, "carried");
     for (std::int32_t i = 0; i < model.count(); ++i) {
-      EXPECT_EQ(text_of(record.param_ptr[i].def), text_of(model.at(i))) << "position " << i;
+      EXPECT_EQ(text_of(tevpf::param_at(record, i).def), text_of(model.at(i))) << "position " << i;
     }
   }
   // A text as it stands in a buffer that was full of question marks.
@@ -230,7 +245,7 @@ class ListModel : public TempFileTest {
       std::swap(changed.max, changed.min);  // as only a file may have them
       if (tevpf::is_floating_type(changed.type) && chance(4)) changed.max = NAN;
       model_->at(found_) = changed;
-      list(name_).param_ptr[found_].def.part = to_c(changed).part;
+      tevpf::param_at(unsettled(name_), found_).def.part = to_c(changed).part;
     }
     changed.value = any_value(changed.type);
     if (changed.type == PF_TYPE_DOUBLE && chance(4)) {
@@ -329,18 +344,26 @@ class ListModel : public TempFileTest {
   }
 
   void inquire() {
-    std::int32_t count = -1, position = -1, type = -1, place = -1;
-    const TEVPF_LIST& record = list(name_);
+    std::int32_t count = -1, position = -1, type = -1;
     expect(TEV8R1_PF_inq_num_params(list_name(), &count), PF_NORMAL);
     expect(TEV8R1_inq_param_pos(list_name(), wanted(), &position), find_wanted());
     expect(TEV8R1_inq_param_exists(list_name(), wanted()), find_wanted());
     expect(TEV8R1_get_param_type(list_name(), wanted(), &type), find_wanted());
-    expect(TEV8R1_list_binary_search(record.param_ptr, record.num_params, record.index_ptr,
-                                     wanted(), &place),
-           find_wanted());
     EXPECT_EQ(count, model_->count());
     EXPECT_EQ(position, found_);
     EXPECT_EQ(type, found_ < 0 ? -1 : model_->at(found_).type);
+  }
+  void hand_out() {
+    TEVPF_LIST& record = list(name_);
+    TEVPF_PARAM* param = nullptr;
+    std::int32_t place = -1, same_place = -1;
+    ASSERT_STREQ(broken_settled_rule(record), nullptr);
+    expect(TEV8R1_list_binary_search(record.param_ptr, record.num_params, record.index_ptr,
+                                     wanted(), &place),
+           find_wanted());
+    expect(TEV8R1_get_param_ptr(&record, wanted(), &param, &same_place), find_wanted());
+    EXPECT_EQ(place, same_place);
+    EXPECT_EQ(param, found_ < 0 ? nullptr : record.param_ptr + found_);
     // Where it stands in the name index, or where it would be inserted.
     const std::string bound = found_ < 0 ? wanted_ : model_->at(found_).name;
     EXPECT_EQ(place, std::count_if(model_->params.begin(), model_->params.end(),
@@ -353,7 +376,22 @@ class ListModel : public TempFileTest {
   void reset() {
     expect(TEV8R1_PF_reset_param(list_name()), PF_NORMAL);
     model_->cursor = -1;
-    if (chance(2)) list(name_).cur_param = model_->cursor = INT_MAX - number(0, 1);
+    if (chance(2)) unsettled(name_).cur_param = model_->cursor = INT_MAX - number(0, 1);
+  }
+  // From the start to the end, again and again: in the end the list is settled.
+  void walk() {
+    std::string value(kRoom, '?');
+    char name[TEVPF_NAME_SIZE];
+    const bool changed = !unsettled(name_).slots.order.is_identity();
+    for (int pass = 0; pass < 6; ++pass) {
+      expect(TEV8R1_PF_reset_param(list_name()), PF_NORMAL);
+      for (std::int32_t i = 0; i < model_->count(); ++i) {
+        expect(TEV8R1_PF_get_next_param(list_name(), name, value.data()), PF_NORMAL);
+        EXPECT_EQ(name, model_->at(i).name);
+      }
+    }
+    model_->cursor = model_->count() - 1;
+    EXPECT_TRUE(!changed || broken_settled_rule(unsettled(name_)) == nullptr);
   }
   void inquire_default() {
     const std::int32_t type = number(10, 16);
@@ -373,10 +411,11 @@ class ListModel : public TempFileTest {
     model_->default_of(def.type) = as_kept(def);
     model_->default_of(def.type).length = def.length;
   }
-  void replace_by_copy() {
+  void replace() {
     if (!chance(10)) return;
     const std::string source = name_ == "alpha" ? "beta" : "alpha";
     expect(TEV8R1_PF_delete_list(list_name()), PF_NORMAL);
+    if (chance(2)) return create(name_, *model_);
     expect(TEV8R1_PF_copy_list(source.c_str(), list_name()), PF_NORMAL);
     *model_ = lists_[source];
     model_->free = 0;
@@ -393,11 +432,16 @@ class ListModel : public TempFileTest {
     }
   }
 
+  static TEVPF_LIST& unsettled(const std::string& name) {
+    TEVPF_LIST* found = nullptr;
+    EXPECT_EQ(tevpf::find_list(name.c_str(), found), PF_NORMAL);
+    return *found;
+  }
+
   const char* list_name() const { return name_.c_str(); }
   const char* wanted() const { return wanted_.c_str(); }
 
   std::mt19937 random_{1};
-  std::map<std::string, ModelList> lists_{{"alpha", {}}, {"beta", {}}};
   std::string name_;
   ModelList* model_ = nullptr;
   std::string wanted_;       // a name, perhaps a pattern, of a parameter that is there or not
@@ -408,13 +452,12 @@ class ListModel : public TempFileTest {
 
 TEST_F(ListModel, RandomSequences) {
   ASSERT_EQ(TEV8R1_PF_set_memory_allocation(kInitial, kIncrement), PF_NORMAL);
-  for (const char* name : {"alpha", "beta"}) {
-    ASSERT_EQ(TEV8R1_PF_create_elem(name, "", PF_ELEM_LIST), PF_NORMAL);
-    std::strcpy(list(name).RESERVED, "carried");
-  }
+  for (auto& [name, model] : lists_) create(name, model);
   set_error_texts();
   run(8000);
   EXPECT_GT(tables_seen_, 1000) << "names were to be looked up through the table, too";
+  EXPECT_GT(blocks_seen_, 1000) << "parameters were to be in order through blocks, too";
+  EXPECT_GT(keys_seen_, 500) << "and names to be found through keys behind a long beginning";
 }
 
 }  // namespace

@@ -4,7 +4,9 @@
 #include <climits>
 
 #include "core/base/heap.h"
+#include "lists/directory.h"
 #include "lists/param_record.h"
+#include "support/list_check.h"
 #include "support/param_def.h"
 #include "support/temp_file.h"
 
@@ -111,6 +113,23 @@ TEST_F(ListRules, DisorderedIndexIsTakenAsItStands) {
   }
 }
 
+// All names begin alike but one, which belongs in front of them or behind them.
+TEST_F(ListRules, ANameThatBeginsDifferentlyFindsItsPlace) {
+  const std::string beginning(12, 'l');
+  for (const char* other : {"a", "z", "lllm", "llla", "llllll", "\xFF"}) {
+    SCOPED_TRACE(other);
+    for (int i = 0; i < 80; ++i) {
+      ASSERT_EQ(add({PF_TYPE_INT, beginning + std::to_string(10 + 37 * i % 80)}), PF_NORMAL);
+    }
+    ASSERT_EQ(add({PF_TYPE_INT, other}), PF_NORMAL);
+    TEVPF_LIST* many = nullptr;
+    ASSERT_EQ(tevpf::find_list("list", many), PF_NORMAL);
+    EXPECT_EQ(broken_rule(*many), nullptr);
+    ASSERT_EQ(TEV8R1_PF_delete_list("list"), PF_NORMAL);
+    ASSERT_EQ(TEV8R1_PF_create_elem("list", "", PF_ELEM_LIST), PF_NORMAL);
+  }
+}
+
 TEST_F(ListRules, TableOfNamesIsNotNeeded) {
   add_numbered(32);
   TEVPF_LIST& many = list("list");
@@ -121,16 +140,16 @@ TEST_F(ListRules, TableOfNamesIsNotNeeded) {
   tevpf::heap_fail_at(0);
   look_up_twice();
   EXPECT_TRUE(tevpf::heap_fail_off());
-  EXPECT_EQ(many.names.slots, nullptr);
+  EXPECT_EQ(many.names.entries, nullptr);
   look_up_twice();
-  EXPECT_NE(many.names.slots, nullptr);
+  EXPECT_NE(many.names.entries, nullptr);
   EXPECT_EQ(TEV8R1_inq_param_exists("list", std::string(4000, 'p').c_str()), PF_NOPARAM);
   // A full table that cannot grow is given up; the parameter is added all the same.
   ASSERT_GT(many.free_params, 0);
   tevpf::heap_fail_at(0);
   EXPECT_EQ(add({PF_TYPE_INT, "p42"}), PF_NORMAL);
   EXPECT_TRUE(tevpf::heap_fail_off());
-  EXPECT_EQ(many.names.slots, nullptr);
+  EXPECT_EQ(many.names.entries, nullptr);
   EXPECT_EQ(TEV8R1_inq_param_exists("list", "p42"), PF_NORMAL);
   EXPECT_EQ(broken_rule(many), nullptr);
 }

@@ -76,3 +76,10 @@ for compiler in "${compilers[@]}"; do
     by_pkg_config tevpf-cpp "$here/consumer/interface.cpp" "$compiler" "-std=$standard"
   done
 done
+
+# The extension of SQLite, under the name that users load it by.
+if [[ -e $LD_LIBRARY_PATH/tevpf_sqlite.so && $cflags != *-fsanitize* ]] && command -v sqlite3 >/dev/null; then
+  printf '%s\n' '.load tevpf_sqlite' "select name from pragma_module_list where name = 'tevpf';" |
+    sqlite3 -batch -init /dev/null | grep -qx tevpf
+  echo "extension of SQLite: loaded"
+fi

@@ -50,7 +50,7 @@ TEVPF_PARAM* found_param;
 TEVPF_COLUMN* found_column;
 
 TEVPF_LIST& list() {
-  EXPECT_EQ(TEV8R1_get_list_ptr("list", &found_list), PF_NORMAL);
+  EXPECT_EQ(tevpf::find_list("list", found_list), PF_NORMAL);
   return *found_list;
 }
 TEVPF_TABLE& table(const char* name = "t") {
@@ -297,10 +297,17 @@ void add_list_calls(std::vector<Call>& calls) {
     CALL(set_cur_param, ("list", n[0]), 1), CALL(inq_param_pos, ("list", "int", out)),
     CALL(inq_param_exists, ("list", "int")), CALL(get_param_type, ("list", "int", out)),
     CALL(set_interactive_list, ("list")),
-    CALL(list_binary_search, (list().param_ptr, list().num_params, list().index_ptr, "int", out)),
+    {"list_binary_search", {}, [](Numbers) {
+       const TEVPF_STATUS status = TEV8R1_get_list_ptr("list", &found_list);
+       if (status != PF_NORMAL) return status;
+       const TEVPF_LIST& flat = *found_list;
+       return TEV8R1_list_binary_search(flat.param_ptr, flat.num_params, flat.index_ptr, "int", out);
+     }},
     CALL(get_param_ptr, (&list(), "int", &found_param, out)),
     {"remove_param_from_index", {}, [](Numbers) {
-       TEVPF_LIST alike = list();
+       const TEVPF_STATUS status = TEV8R1_get_list_ptr("list", &found_list);
+       if (status != PF_NORMAL) return status;
+       TEVPF_LIST alike = *found_list;
        std::vector<std::int32_t> index(alike.index_ptr, alike.index_ptr + alike.num_params);
        alike.index_ptr = index.data();
        alike.names = {};

@@ -69,7 +69,15 @@ TEST_F(OperationsTest, TheFileIsTheSameFromEveryBuild) {
   EXPECT_TRUE(read_file(dir_ / "other") == read_file(TEVPF_ELEMENTS_FILE));
 }
 
-// Leaves the settled state, as changes in the middle do, of every sequence of a table.
+// Leaves the settled state, as changes in the middle of a long list do.
+void unsettle(TEVPF_LIST& list) {
+  if (list.num_params == 0) return;
+  for (tevpf::Sequence* sequence : {&list.slots.order, &list.index.order}) {
+    *sequence = {nullptr, tevpf::SequenceBlocks::make(sequence->items, list.num_params), 0};
+  }
+  list.index_ptr = nullptr;
+}
+// The same of every sequence of a table.
 void unsettle(TEVPF_TABLE& table) {
   const auto leave = [&](tevpf::Sequence& sequence) {
     EXPECT_TRUE(sequence.make_ready_to_move(table.num_rows, 0, table.num_rows - 1));
@@ -80,8 +88,10 @@ void unsettle(TEVPF_TABLE& table) {
     if (column.def.idx_flag != 0) leave(column.index);
   }
 }
-void unsettle_tables() {
+void unsettle_elements() {
   const TEVPF_FILE& file = *tevpf::library.current_file;
+  for (int i = 0; i < tevpf::directory_of(file, PF_ELEM_LIST).count; ++i)
+    unsettle(tevpf::list_at(file, i));
   for (int i = 0; i < tevpf::directory_of(file, PF_ELEM_TABLE).count; ++i)
     unsettle(tevpf::table_at(file, i));
 }
@@ -95,17 +105,17 @@ TEST_F(OperationsTest, EveryRequestForMemoryFailsOnce) {
     start();
     const TEVPF_STATUS usual = call.run(call.numbers.data());
     const std::string usual_state = snapshot(true), usual_text = read_text(dir_ / "text");
-    bool settled = true;  // then once more for tables that are not
+    bool settled = true;  // then once more for elements that are not
     for (std::int64_t n = 0;; ++n) {
       SCOPED_TRACE(testing::Message() << call.operation << ", request " << n << ", " << settled);
       start();
       const std::string before = snapshot(false);
-      if (!settled) unsettle_tables();
+      if (!settled) unsettle_elements();
       set_error_texts();
       tevpf::heap_fail_at(n);
       TEVPF_STATUS status = call.run(call.numbers.data());
       if (!tevpf::heap_fail_off()) {
-        // These calls write a table first, which settles it.
+        // These calls write an element first, which settles it.
         if (!settled || std::string_view(call.operation).starts_with("format_")) break;
         settled = false;
         n = -1;

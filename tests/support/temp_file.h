@@ -12,6 +12,7 @@
 #include <vector>
 
 #include "lists/directory.h"
+#include "lists/settle.h"
 #include "support/error_texts.h"
 #include "support/param_def.h"
 #include "support/state.h"

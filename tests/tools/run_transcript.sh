@@ -2,7 +2,7 @@
 # run_transcript.sh TRANSCRIPT PROGRAM...: runs the lines of a transcript that start with "$ " in an
 # empty folder, and compares what they print, errors included, and their exit status with what stands
 # behind them. Lines that start with "# " are comments. The programs are called by their file names.
-# Of a Markdown text the console blocks are run; they find the examples beside the
+# Of a manual page the section EXAMPLES is run. Of a Markdown text the console blocks are run; they find the examples beside the
 # text, and the programs behind the first one as if they had been built in the folder. Where nothing can
 # be tested, a line exits with 77; where something cannot, it says so on descriptor 3, the test's log.
 set -uo pipefail
@@ -17,6 +17,8 @@ cd "$folder" || exit 1
 if [[ $transcript == *.md ]]; then
   ln -s "$(dirname "$transcript")/examples" "${@:3}" .
   awk '/^```/ { inside = $0 == "```console"; next } inside' "$transcript"
+elif [[ $transcript == *.1 ]]; then
+  sed -n '/^\.SH EXAMPLES/,$ { /^\./d; s/^\\&//; s/\\-/-/g; s/\\e/\\/g; p }' "$transcript"
 else
   cat "$transcript"
 fi >"$folder.expected"

@@ -1,0 +1,43 @@
+# tevpf_embed_texts(OUTPUT source.cpp HEADER header.h name=file ...): writes a C++ source that holds each
+# text as tool::name and its SHA-256 in base64 as tool::nameHash, both declared in the header. It is
+# written again when a text changes.
+
+# The digits of a hexadecimal number, 8 bits a pair, as base64.
+function(tevpf_base64 hex result)
+  set(alphabet "ABCDEFGHIJKLMNOPQRSTUVWXYZabcdefghijklmnopqrstuvwxyz0123456789+/")
+  set(text "")
+  while(NOT hex STREQUAL "")
+    string(LENGTH "${hex}" digits)
+    string(SUBSTRING "${hex}00" 0 6 group)
+    math(EXPR bits "0x${group}")
+    foreach(shift 18 12 6 0)
+      math(EXPR place "(${bits} >> ${shift}) & 63")
+      string(SUBSTRING "${alphabet}" ${place} 1 character)
+      string(APPEND text "${character}")
+    endforeach()
+    if(digits LESS 6)
+      string(REGEX REPLACE ".$" "=" text "${text}")
+      break()
+    endif()
+    string(SUBSTRING "${hex}" 6 -1 hex)
+  endwhile()
+  set(${result} "${text}" PARENT_SCOPE)
+endfunction()
+
+function(tevpf_embed_texts)
+  cmake_parse_arguments(PARSE_ARGV 0 arg "" "OUTPUT;HEADER" "")
+  set(source "#include \"${arg_HEADER}\"\n\nnamespace tool {\n\n")
+  foreach(pair IN LISTS arg_UNPARSED_ARGUMENTS)
+    string(REPLACE "=" ";" pair "${pair}")
+    list(GET pair 0 name)
+    list(GET pair 1 file)
+    set_property(DIRECTORY APPEND PROPERTY CMAKE_CONFIGURE_DEPENDS "${file}")
+    file(READ "${file}" text)
+    string(SHA256 hash "${text}")
+    tevpf_base64(${hash} hash)
+    string(APPEND source "const std::string_view ${name} = R\"text(${text})text\";\n"
+      "const std::string_view ${name}Hash = \"${hash}\";\n\n")
+  endforeach()
+  string(APPEND source "}  // namespace tool\n")
+  file(CONFIGURE OUTPUT "${arg_OUTPUT}" CONTENT "${source}" @ONLY)
+endfunction()
