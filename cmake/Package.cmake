@@ -66,5 +66,14 @@ if(TARGET tevpf_tool)
   tevpf_package(tool tevpf utils "parameter files: command-line tool"
     "${what} The tool shows, checks and changes them.")
 endif()
+if(TARGET tevpf_sqlite)
+  tevpf_package(sql libsqlite3-mod-tevpf database "parameter files: extension of SQLite"
+    "${what} This extension of SQLite reads and changes them by SQL.")
+endif()
+if(TARGET tevpf_python)
+  tevpf_package(python python3-tevpf python "parameter files: Python 3 package"
+    "${what} This package gives their lists as mappings and their tables as arrays of numpy.")
+  set(CPACK_DEBIAN_PYTHON_PACKAGE_DEPENDS "python3, python3-numpy")
+endif()
 
 include(CPack)

@@ -19,8 +19,9 @@ make() {  # BUILD-FOLDER GENERATOR CMAKE-OPTION...
   (cd "$build" && cpack -G "$generator")
 }
 
-scripts/install-packages.sh build tool
-make package-deb DEB -DCMAKE_INSTALL_PREFIX=/usr
+scripts/install-packages.sh build tool python
+make package-deb DEB -DCMAKE_INSTALL_PREFIX=/usr -DTEVPF_BUILD_PYTHON=ON \
+  -DTEVPF_PYTHON_INSTALL_DIR=lib/python3/dist-packages
 make package-archive TGZ -DCMAKE_INSTALL_LIBDIR=lib
 mv build/package-deb/*.deb build/package-archive/*.tar.gz "$out"
 if [[ ${1:-} == --windows ]]; then
