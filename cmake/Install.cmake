@@ -1,9 +1,13 @@
-# What `cmake --install` lays out: headers, libraries, CMake package, pkg-config files, documents.
+# What `cmake --install` lays out: headers, libraries, CMake package, pkg-config files, documents. The
+# components are those of cmake/Package.cmake.
 include(CMakePackageConfigHelpers)
+set(CMAKE_INSTALL_DEFAULT_COMPONENT_NAME development)
 
 set(package_dir "${CMAKE_INSTALL_LIBDIR}/cmake/tevpf")
 
-install(TARGETS tevpf tevpf_static tevpf_cpp tevpf_cpp_static EXPORT tevpfTargets)
+install(TARGETS tevpf tevpf_static tevpf_cpp tevpf_cpp_static EXPORT tevpfTargets
+  RUNTIME COMPONENT library
+  LIBRARY COMPONENT library NAMELINK_COMPONENT development)
 install(DIRECTORY include/ DESTINATION "${CMAKE_INSTALL_INCLUDEDIR}"
   FILES_MATCHING PATTERN "*.h" PATTERN "*.hpp")
 install(EXPORT tevpfTargets NAMESPACE tevpf:: DESTINATION "${package_dir}")
@@ -30,9 +34,9 @@ install(DIRECTORY docs/ DESTINATION "${CMAKE_INSTALL_DOCDIR}" OPTIONAL
   FILES_MATCHING PATTERN "*.md" PATTERN "*.svg")
 
 if(TARGET tevpf_tool)
-  install(TARGETS tevpf_tool)
-  install(FILES tools/tevpf.1 DESTINATION "${CMAKE_INSTALL_MANDIR}/man1" OPTIONAL)
+  install(TARGETS tevpf_tool COMPONENT tool)
+  install(FILES tools/tevpf.1 DESTINATION "${CMAKE_INSTALL_MANDIR}/man1" COMPONENT tool)
   install(FILES tools/tevpf.bash DESTINATION "${CMAKE_INSTALL_DATADIR}/bash-completion/completions"
-    RENAME tevpf OPTIONAL)
-  install(FILES tools/_tevpf DESTINATION "${CMAKE_INSTALL_DATADIR}/zsh/site-functions" OPTIONAL)
+    RENAME tevpf COMPONENT tool)
+  install(FILES tools/_tevpf DESTINATION "${CMAKE_INSTALL_DATADIR}/zsh/site-functions" COMPONENT tool)
 endif()

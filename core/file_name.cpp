@@ -1,10 +1,10 @@
 #include "core/file_name.h"
 
-#include <cstdlib>
 #include <cstring>
 
 #include "core/base/heap.h"
 #include "core/base/status.h"
+#include "core/io/environment.h"
 
 namespace tevpf {
 
@@ -28,7 +28,8 @@ TEVPF_STATUS translate_file_name(const char* name, FileName& out) noexcept {
   Owned<char> variable(heap_copy(name));
   if (!variable) return fail_empty(PF_NOMEM);
   variable[length] = '\0';
-  const char* value = std::getenv(variable.get());
+  EnvironmentText buffer;
+  const char* value = environment_variable(variable.get(), buffer);
   if (value == nullptr) return fail_item(PF_OPENFAIL, name);
   return join(value, name + length, out);
 }

@@ -24,7 +24,7 @@ void adopt_stream(TEVPF_FILE& file, std::FILE* stream) noexcept {
 // write left in its buffer must not reach the new file.
 TEVPF_STATUS overwrite(TEVPF_FILE& file) noexcept {
   adopt_stream(file, nullptr);
-  adopt_stream(file, std::fopen(file.file_name, "wb"));
+  adopt_stream(file, open_stream(file.file_name, "wb"));
   if (file.fp == nullptr) return fail(PF_OPENFAIL, file.file_name);
   return write_elements(file, file.fp, file.file_name);
 }
@@ -36,13 +36,15 @@ struct Replaced {
   std::FILE* stream;    // refers to the new file; null if the old one is still in place
 };
 
-Replaced replace_existing(const TEVPF_FILE& file, const char* name) noexcept {
+// `stream` is a stream of the existing file, or null. Windows replaces no open file: there it is
+// closed and set to null.
+Replaced replace_existing(const TEVPF_FILE& file, const char* name, std::FILE*& stream) noexcept {
   Replacement replacement(name);
   if (replacement.has_failed()) return {true, fail(PF_OPENFAIL, name), nullptr};
   if (!replacement.is_possible()) return {false, PF_NORMAL, nullptr};
   const TEVPF_STATUS status = write_elements(file, replacement.stream(), name);
   if (status != PF_NORMAL) return {true, status, nullptr};
-  switch (replacement.put_in_place()) {
+  switch (replacement.put_in_place(stream)) {
     case Replacement::Outcome::kDone:
       return {true, PF_NORMAL, replacement.release_stream()};
     case Replacement::Outcome::kNotFlushed:
@@ -57,7 +59,7 @@ Replaced replace_existing(const TEVPF_FILE& file, const char* name) noexcept {
 
 // Rewrites the file: by an image that replaces it once complete, or else plainly.
 TEVPF_STATUS rewrite(TEVPF_FILE& file) noexcept {
-  const Replaced replaced = replace_existing(file, file.file_name);
+  const Replaced replaced = replace_existing(file, file.file_name, file.fp);
   if (!replaced.possible) return overwrite(file);
   if (replaced.stream != nullptr) adopt_stream(file, replaced.stream);
   return replaced.status;
@@ -74,7 +76,7 @@ TEVPF_STATUS save_in_place(TEVPF_FILE& file) noexcept {
 TEVPF_STATUS write_copy(const TEVPF_FILE& file, const char* path) noexcept {
   std::FILE* stream = create_file(path);
   const bool created = stream != nullptr;
-  if (!created && errno == EEXIST) stream = std::fopen(path, "wb");
+  if (!created && errno == EEXIST) stream = open_stream(path, "wb");
   if (stream == nullptr) return fail(access_denied(errno) ? PF_NOPRIV : PF_OPENFAIL, path);
   TEVPF_STATUS status = write_elements(file, stream, path);
   if (created && status != PF_NORMAL) {
@@ -83,12 +85,13 @@ TEVPF_STATUS write_copy(const TEVPF_FILE& file, const char* path) noexcept {
   }
   const bool closed = std::fclose(stream) == 0;
   if (closed || status != PF_NORMAL) return status;
-  if (created) std::remove(path);
+  if (created) remove_file(path);
   return fail(PF_OPENFAIL, path);
 }
 
 TEVPF_STATUS save_copy(const TEVPF_FILE& file, const char* path) noexcept {
-  const Replaced replaced = replace_existing(file, path);
+  std::FILE* none = nullptr;
+  const Replaced replaced = replace_existing(file, path, none);
   if (!replaced.possible) return write_copy(file, path);
   const bool closed = replaced.stream == nullptr || std::fclose(replaced.stream) == 0;
   return replaced.status == PF_NORMAL && !closed ? fail(PF_OPENFAIL, path) : replaced.status;

@@ -4,6 +4,7 @@
 #include <cstdio>
 
 #include "core/base/status.h"
+#include "core/io/disk_file.h"
 #include "reports/text_out.h"
 
 namespace tevpf {
@@ -13,7 +14,7 @@ namespace tevpf {
 //   PF_OPENFAIL  the path cannot be opened for writing; texts: the path, empty
 template <class Body>
 [[nodiscard]] TEVPF_STATUS write_report(const char* path, Body body) noexcept {
-  std::FILE* const stream = std::fopen(path, "w");
+  std::FILE* const stream = open_stream(path, "w");
   if (stream == nullptr) return fail(PF_OPENFAIL, path);
   TEVPF_STATUS status = PF_NORMAL;
   {

@@ -14,7 +14,7 @@ seconds=${1:-1800}
 [[ $seconds =~ ^[0-9]+$ ]] || { echo "full.sh: '$seconds' is no number of seconds" >&2; exit 2; }
 
 scripts/check.sh
-scripts/test.sh
+scripts/test.sh dev asan x86 mingw wine
 
 scripts/install-packages.sh build test fuzz browser
 echo "== kill sweep"

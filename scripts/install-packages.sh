@@ -1,6 +1,6 @@
 #!/usr/bin/env bash
 # install-packages.sh GROUP...: installs the missing Debian packages of these groups.
-# Groups: build tool test python bench x86 windows fuzz lint browser
+# Groups: build tool test python bench x86 windows wine fuzz lint browser
 set -euo pipefail
 
 declare -A groups=(
@@ -12,6 +12,7 @@ declare -A groups=(
   [bench]="libbenchmark-dev libsqlite3-dev nlohmann-json3-dev python3"
   [x86]="g++-multilib googletest"
   [windows]="g++-mingw-w64-i686-win32"
+  [wine]="g++-mingw-w64-x86-64-posix googletest wine64"
   [fuzz]="clang libclang-rt-14-dev llvm"
   [lint]="clang-format clang-tidy cppcheck shellcheck python3"
   [browser]="chromium chromium-driver python3-selenium"

@@ -2,6 +2,8 @@
 # test.sh [LEG...]: installs missing packages, builds, and runs all tests. The legs, all by default:
 #   dev     64-bit debug build            asan    the same under address and UB sanitizers
 #   x86     32-bit x86 build              mingw   32-bit Windows cross-build, its DLL checked
+# On request:
+#   wine    64-bit Windows build, its tests run by Wine
 # The last lines are ctest's summary over all legs.
 set -euo pipefail
 cd "$(dirname "${BASH_SOURCE[0]}")/.."
@@ -12,7 +14,7 @@ esac
 legs=("$@")
 ((${#legs[@]})) || legs=(dev asan x86 mingw)
 
-declare -A packages=([dev]="test python" [asan]="test python" [x86]="test x86" [mingw]=windows)
+declare -A packages=([dev]="test python" [asan]="test python" [x86]="test x86" [mingw]=windows [wine]=wine)
 declare -A options=([dev]=-DTEVPF_BUILD_PYTHON=ON [asan]=-DTEVPF_BUILD_PYTHON=ON)
 groups=(build tool)
 for leg in "${legs[@]}"; do

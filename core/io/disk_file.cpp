@@ -7,6 +7,10 @@
 
 #ifdef _WIN32
 #include <io.h>
+
+#include <cwchar>
+
+#include "core/io/wide_name.h"
 #else
 #include <unistd.h>
 #endif
@@ -18,7 +22,9 @@ namespace {
 constexpr int kNoWait = _O_BINARY;
 
 int open_descriptor(const char* name, int flags) noexcept {
-  return _open(name, flags | _O_BINARY, _S_IREAD | _S_IWRITE);
+  const WideName wide(name);
+  if (wide.get() == nullptr) return -1;
+  return _wopen(wide.get(), flags | _O_BINARY, _S_IREAD | _S_IWRITE);
 }
 bool is_regular(int file) noexcept {
   struct _stat64 facts;
@@ -69,15 +75,31 @@ std::FILE* create_file(const char* name) noexcept {
 
 #ifdef _WIN32
 
+std::FILE* open_stream(const char* name, const char* mode) noexcept {
+  const WideName wide(name), wide_mode(mode);
+  return wide.get() != nullptr ? _wfopen(wide.get(), wide_mode.get()) : nullptr;
+}
+
+void remove_file(const char* name) noexcept {
+  const WideName wide(name);
+  if (wide.get() != nullptr) _wremove(wide.get());
+}
+
 bool empty_file(std::FILE* stream) noexcept { return _chsize_s(_fileno(stream), 0) == 0; }
 
 // On Windows, nobody else can remove or replace an open file.
 void remove_own_file(const char* name, std::FILE* stream) noexcept {
   std::fclose(stream);
-  std::remove(name);
+  remove_file(name);
 }
 
 #else
+
+std::FILE* open_stream(const char* name, const char* mode) noexcept {
+  return std::fopen(name, mode);
+}
+
+void remove_file(const char* name) noexcept { unlink(name); }
 
 bool empty_file(std::FILE* stream) noexcept { return ftruncate(fileno(stream), 0) == 0; }
 

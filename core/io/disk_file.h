@@ -1,5 +1,5 @@
 // Opens, creates and removes files on disk: regular files only. A file that somebody else has just
-// put in place is neither emptied nor removed.
+// put in place is neither emptied nor removed. Names are UTF-8 on Windows, and bytes elsewhere.
 #pragma once
 
 #include <cstdio>
@@ -15,6 +15,11 @@ enum class Access { kRead, kUpdate, kWrite };
 // Creates an empty file for writing. Null with errno set on failure; EEXIST if the file already
 // exists.
 [[nodiscard]] std::FILE* create_file(const char* name) noexcept;
+
+// What std::fopen does.
+[[nodiscard]] std::FILE* open_stream(const char* name, const char* mode) noexcept;
+
+void remove_file(const char* name) noexcept;
 
 // Empties a file that is open for writing; false with errno set on failure.
 [[nodiscard]] bool empty_file(std::FILE* stream) noexcept;

@@ -2,9 +2,8 @@
 // is written next to the file, flushed to disk, and then renamed over it in one step.
 //
 // Not every file can be replaced: the folder must be writable, and the file must be writable and
-// regular, have a single hard link, and have an owner and mode that the image can take over.
-// Otherwise the caller writes the file plainly. On Windows, where an open file cannot be replaced,
-// that is always the case.
+// regular, have a single hard link, and have an owner and mode that the image can take over; on
+// Windows, no other program may have it open. Otherwise the caller writes the file plainly.
 #pragma once
 
 #include <cstdio>
@@ -30,20 +29,25 @@ class Replacement {
     kNotPossible,  // the system does not allow it: write plainly
     kFailed,       // the image did not reach the disk; the file is as it was
   };
-  // Completes the image; the caller has flushed its stream.
-  [[nodiscard]] Outcome put_in_place() noexcept;
+  // Completes the image; the caller has flushed its stream. `old` is the caller's stream of the file
+  // that is replaced, or null. Windows replaces no open file: there, it is closed and set to null.
+  [[nodiscard]] Outcome put_in_place(std::FILE*& old) noexcept;
 
-  // Transfers ownership of the stream, which refers to the new file once it is in place.
+  // Transfers ownership of the stream, which refers to the new file once it is in place. Null if it
+  // could not be opened again, which Windows requires.
   [[nodiscard]] std::FILE* release_stream() noexcept;
 
  private:
-#ifndef _WIN32
   void discard() noexcept;
 
-  static constexpr int kPathSize = 4096;
-  char target_[kPathSize];  // the file, symbolic links resolved
-  char image_[kPathSize];   // the new image; empty if there is none to delete
+#ifdef _WIN32
+  using Letter = wchar_t;
+#else
+  using Letter = char;
 #endif
+  static constexpr int kPathSize = 4096;
+  Letter target_[kPathSize];  // the file, symbolic links resolved
+  Letter image_[kPathSize];   // the new image; empty if there is none to delete
   std::FILE* stream_ = nullptr;
   bool failed_ = false;
 };

@@ -29,7 +29,7 @@ class InterfaceTest : public LibraryTest {
   // The whole content as text.
   std::string dump(const File& file) const {
     file.dump(dir_ / "dump.txt");
-    return read_file(dir_ / "dump.txt");
+    return read_text(dir_ / "dump.txt");
   }
 
   static void add_elements(Table table) {

@@ -9,7 +9,7 @@ listed=$(sort -u "$@")
 
 exported() {
   case $library in
-    *.dll) i686-w64-mingw32-objdump -p "$library" | awk '
+    *.dll) objdump -p "$library" | awk '
              /\[Ordinal\/Name Pointer\] Table/ { names = 1; next }
              names && NF == 0 { names = 0 }
              names { print $NF }' ;;

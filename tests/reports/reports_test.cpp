@@ -13,17 +13,26 @@ namespace {
 
 // A report as it is stored; what differs from run to run stands in it as a mark.
 inline std::string golden(const std::string& name, const std::string& for_mark = "") {
-  std::string text = read_file(std::string(TEVPF_GOLDEN_DIR) + name + ".golden");
+  std::string text = read_text(std::string(TEVPF_GOLDEN_DIR) + name + ".golden");
   const std::string mark = "<MARK>";
   if (const auto at = text.find(mark); at != text.npos) text.replace(at, mark.size(), for_mark);
   return text;
+}
+
+// An empty value removes the variable.
+void set_variable(const char* name, const std::string& value) {
+#ifdef _WIN32
+  _putenv_s(name, value.c_str());
+#else
+  value.empty() ? unsetenv(name) : setenv(name, value.c_str(), 1);
+#endif
 }
 
 class Reports : public TableTest {
  protected:
   Reports() { std::filesystem::current_path(dir_.path()); }
   ~Reports() override {
-    unsetenv("TEV8R1_debug");
+    set_variable("TEV8R1_debug", "");
     TEV8R1_PF_init();
     std::filesystem::current_path(std::filesystem::temp_directory_path());
   }
@@ -51,7 +60,7 @@ class Reports : public TableTest {
 
   static std::string dump_table() {
     EXPECT_EQ(TEV8R1_PF_dump_table("t", "out.txt"), PF_NORMAL);
-    return read_file("out.txt");
+    return read_text("out.txt");
   }
   static std::string listing(const std::vector<std::string>& names, std::int32_t first = 0,
                              std::int32_t last = PF_END_POS, std::int32_t definitions = 0) {
@@ -60,7 +69,7 @@ class Reports : public TableTest {
     EXPECT_EQ(TEV8R1_PF_print_table("t", "out.txt", definitions,
                                     static_cast<std::int32_t>(names.size()), fields, first, last),
               PF_NORMAL);
-    return read_file("out.txt");
+    return read_text("out.txt");
   }
   // What stands behind the heading of the rows' block.
   static std::string data_of(const std::string& report) {
@@ -99,13 +108,13 @@ TEST_F(Reports, AFileWithAllKindsOfLists) {
   ASSERT_OK(TEV8R1_PF_create_elem("TEVPF_FILE_HEADER", "only a name", PF_ELEM_TABLE));
   ASSERT_OK(TEV8R1_PF_delete_table("t"));
   ASSERT_OK(TEV8R1_PF_dump_file("out.txt"));
-  EXPECT_EQ(read_file("out.txt"), golden("file", path_));
+  EXPECT_EQ(read_text("out.txt"), golden("file", path_));
 }
 
 TEST_F(Reports, AFileWithoutAHeaderListHasAShortBlock) {
   ASSERT_OK(TEV8R1_PF_delete_table("t"));
   expect_answer(TEV8R1_PF_dump_file("out.txt"), PF_NORMAL, {"list", "TEVPF_FILE_HEADER"});
-  EXPECT_EQ(read_file("out.txt"), "\t\tFile name           : " + path_ +
+  EXPECT_EQ(read_text("out.txt"), "\t\tFile name           : " + path_ +
                                       "\n\n.\t\tNumber of lists     : 0\n\n"
                                       ".\t\tNumber of tables    : 0\n\n\f\n");
   expect_answer(TEV8R1_PF_dump_file("no/folder"), PF_OPENFAIL, {"no/folder", ""});
@@ -139,7 +148,7 @@ TEST_F(Reports, RefusalsAndWhatTheyLeave) {
     expect_answer(report("no/folder"), PF_OPENFAIL, {"no/folder", ""});
     write_file("out.txt", "old");
     expect_answer(report("out.txt"), status, texts);
-    EXPECT_EQ(read_file("out.txt"), "");
+    EXPECT_EQ(read_text("out.txt"), "");
   }
 }
 
@@ -150,7 +159,7 @@ TEST_F(Reports, ATableOfMixedColumnsInStorageOrder) {
   std::FILE* const own = std::fopen("out.txt", "a");
   EXPECT_EQ(TEV8R1_table_dump(&table(), own), PF_NORMAL);
   std::fclose(own);
-  EXPECT_EQ(read_file("out.txt"), golden("table") + golden("table"));
+  EXPECT_EQ(read_text("out.txt"), golden("table") + golden("table"));
 }
 
 // A column defined after the formats were made has none: a dump makes all of them, and the width.
@@ -168,7 +177,7 @@ TEST_F(Reports, AColumnAddedBetweenDumpsIsFormatted) {
 }
 
 TEST_F(Reports, DebugOutputShowsInnerFields) {
-  setenv("TEV8R1_debug", "", 1);
+  set_variable("TEV8R1_debug", "1");
   EXPECT_EQ(TEV8R1_PF_init(), PF_INITDONE);
   make_list("Tiny", "three",
             {{PF_TYPE_INT, "c", "", "text", 5, 9, 1},
@@ -180,7 +189,7 @@ TEST_F(Reports, DebugOutputShowsInnerFields) {
     return std::to_string(reinterpret_cast<std::uintptr_t>(of));
   };
   ASSERT_OK(TEV8R1_PF_dump_list("Tiny", "out.txt"));
-  EXPECT_EQ(read_file("out.txt"), golden("debug_list", address(list("Tiny").index_ptr)));
+  EXPECT_EQ(read_text("out.txt"), golden("debug_list", address(list("Tiny").index_ptr)));
   EXPECT_EQ(dump_table(), golden("debug_table", address(column(1).idx_ptr)));
   ASSERT_OK(TEV8R1_PF_define_table_search("t", "b"));
   EXPECT_NE(dump_table().find("\ncur_col = b\n\n\n."), std::string::npos);
@@ -219,7 +228,7 @@ TEST_F(Reports, LinesBeyond31BitsAreRefused) {
   EXPECT_EQ(TEV8R1_PF_dump_table("t", "out.txt"), PF_NORMAL);
   add_rows({{"1", "2"}});
   EXPECT_EQ(TEV8R1_PF_dump_table("t", "out.txt"), PF_NOMEM);
-  EXPECT_TRUE(read_file("out.txt").ends_with("TABLE DATA\n\n"));
+  EXPECT_TRUE(read_text("out.txt").ends_with("TABLE DATA\n\n"));
   EXPECT_EQ(TEV8R1_PF_print_table("t", "out.txt", 0, 9, nullptr, 0, 9), PF_NOMEM);
 }
 
@@ -295,7 +304,7 @@ TEST_F(Reports, ListingsOfColumnsOfChoiceInSearchOrder) {
             golden("listing_chosen"));
   EXPECT_EQ(table().cur_row, -1);
   ASSERT_OK(TEV8R1_PF_print_table("t", "out.txt", 0, INT32_MAX, nullptr, 1, 3));
-  EXPECT_EQ(read_file("out.txt"), golden("listing_all")) << "more columns than there are mean all";
+  EXPECT_EQ(read_text("out.txt"), golden("listing_all")) << "more columns than there are mean all";
   ASSERT_OK(TEV8R1_PF_define_table_search("t", nullptr));
   EXPECT_EQ(data_of(listing({"s", "s"}, 0, 1)),
             ". s    s\n.---------\n\n   7    7\n -32768  -32768\n");

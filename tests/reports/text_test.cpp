@@ -6,6 +6,7 @@
 #include <string>
 
 #include "reports/display.h"
+#include "support/memory_stream.h"
 
 namespace {
 
@@ -31,15 +32,13 @@ TEST(Display, LinesBreakBehindWhiteSpaceOrWithinWords) {
       {"empty", 0, 3, "", ">>"},
   };
   for (const auto& c : cases) {
-    char shown[64] = "";
-    std::FILE* const stream = fmemopen(shown, sizeof shown, "w");
-    std::fputs("before|", stream);
-    EXPECT_EQ(TEV8R1_display_string_value(c.first, c.width, c.text, stream, ">>"),
+    MemoryStream shown;
+    std::fputs("before|", shown.get());
+    EXPECT_EQ(TEV8R1_display_string_value(c.first, c.width, c.text, shown.get(), ">>"),
               std::strchr(c.shown, '\n') != nullptr ? PF_NOMORE : PF_NORMAL)
         << c.label;
-    std::fputs("|after", stream);
-    std::fclose(stream);
-    EXPECT_EQ(shown, "before|" + std::string(c.shown) + "|after") << c.label;
+    std::fputs("|after", shown.get());
+    EXPECT_EQ(shown.bytes(), "before|" + std::string(c.shown) + "|after") << c.label;
   }
 }
 

@@ -104,7 +104,7 @@ TEST_F(OperationsTest, EveryRequestForMemoryFailsOnce) {
     if (call.leeway == kNumbersOnly) continue;
     start();
     const TEVPF_STATUS usual = call.run(call.numbers.data());
-    const std::string usual_state = snapshot(true), usual_text = read_file(dir_ / "text");
+    const std::string usual_state = snapshot(true), usual_text = read_text(dir_ / "text");
     bool settled = true;  // then once more for elements that are not
     for (std::int64_t n = 0;; ++n) {
       SCOPED_TRACE(testing::Message() << call.operation << ", request " << n << ", " << settled);
@@ -126,7 +126,7 @@ TEST_F(OperationsTest, EveryRequestForMemoryFailsOnce) {
       if (status == PF_NOMEM) {
         EXPECT_EQ(error_texts(), kEmpty);
         EXPECT_FALSE(std::filesystem::exists(dir_ / "new"));
-        std::string text = read_file(dir_ / "text");  // a report ends where it could not go on
+        std::string text = read_text(dir_ / "text");  // a report ends where it could not go on
         const std::string end = "!\n\f\n";            // of each element in a file's dump
         if (text.ends_with(end)) text.resize(text.size() - end.size());
         EXPECT_EQ(text, usual_text.substr(0, text.size()));

@@ -13,6 +13,7 @@
 #include "core/writer.h"
 #include "lists/directory.h"
 #include "support/list_check.h"
+#include "support/memory_stream.h"
 #include "support/param_def.h"
 #include "support/table_check.h"
 #include "tables/directory.h"
@@ -23,13 +24,9 @@ void put(std::string& all, const T&... values) {
 }
 
 inline void put_stored(std::string& all, const TEVPF_FILE& file) {
-  char* bytes = nullptr;
-  std::size_t size = 0;
-  std::FILE* const stream = open_memstream(&bytes, &size);
-  EXPECT_EQ(tevpf::write_elements(file, stream, ""), PF_NORMAL);
-  std::fclose(stream);
-  all.append(bytes, size);
-  std::free(bytes);
+  MemoryStream stream;
+  EXPECT_EQ(tevpf::write_elements(file, stream.get(), ""), PF_NORMAL);
+  all += stream.bytes();
 }
 
 inline void put_table(std::string& all, const TEVPF_TABLE& table) {

@@ -2,11 +2,11 @@
 #pragma once
 
 #include <gtest/gtest.h>
-#include <stdlib.h>
 
 #include <filesystem>
 #include <fstream>
 #include <iterator>
+#include <random>
 #include <set>
 #include <string>
 #include <vector>
@@ -21,8 +21,9 @@
 // A folder that goes away with the test.
 class TempDir {
  public:
-  TempDir() : path_(testing::TempDir() + "tevpf_XXXXXX") {
-    if (mkdtemp(path_.data()) == nullptr) ADD_FAILURE() << "no folder " << path_;
+  TempDir() : path_(testing::TempDir() + "tevpf_" + std::to_string(std::random_device{}())) {
+    std::error_code error;
+    if (!std::filesystem::create_directory(path_, error)) ADD_FAILURE() << "no folder " << path_;
   }
   ~TempDir() {
     std::error_code ignored;
@@ -47,6 +48,12 @@ class TempDir {
 
 inline std::string read_file(const std::string& path) {
   std::ifstream in(path, std::ios::binary);
+  return {std::istreambuf_iterator<char>(in), {}};
+}
+
+// The lines of a report, however the system ends them.
+inline std::string read_text(const std::string& path) {
+  std::ifstream in(path);
   return {std::istreambuf_iterator<char>(in), {}};
 }
 
