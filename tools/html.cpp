@@ -73,7 +73,7 @@ std::string grouped(std::size_t count) {
   return result;
 }
 
-std::string counted_in_groups(std::size_t count, std::string_view noun) {
+std::string counted_in_groups(std::uintmax_t count, std::string_view noun) {
   std::string result = grouped(count) + " ";
   result += noun;
   if (count != 1) result += 's';
