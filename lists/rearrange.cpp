@@ -51,7 +51,7 @@ TEVPF_STATUS TEV8R1_PF_delete_param(const char* list_name, const char* param_nam
 TEVPF_STATUS TEV8R1_PF_modify_param_name(const char* list_name, const char* old_name,
                                          const char* new_name) noexcept {
   TEVPF_LIST* list;
-  SequencePlace place;
+  SequencePlace place{-1};
   PF_TRY(find(list_name, old_name, list, place));
 
   NameField kept;

@@ -63,7 +63,7 @@ std::string html_cell(const Value& value, std::int32_t precision) {
   return begin + shown + "</td>";
 }
 
-std::string grouped(std::size_t count) {
+std::string grouped(std::uintmax_t count) {
   const std::string digits = std::to_string(count);
   std::string result;
   for (std::size_t i = 0; i < digits.size(); ++i) {

@@ -27,8 +27,9 @@ std::string html_cell(const Value& value, std::int32_t precision);
 std::string html_cell(std::string_view text);
 
 // Digits in groups of three, for people: "1 000 000".
-std::string grouped(std::size_t count);
-std::string counted_in_groups(std::uintmax_t count, std::string_view noun);  // "1 row", "1 000 rows"
+std::string grouped(std::uintmax_t count);
+std::string counted_in_groups(std::uintmax_t count,
+                              std::string_view noun);  // "1 row", "1 000 rows"
 
 // The heading of a column, with the unit of its values in brackets.
 std::string html_heading(std::string_view name, std::string_view units, bool is_number);
