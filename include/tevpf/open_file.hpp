@@ -94,7 +94,7 @@ class Name {
   explicit Name(std::string_view name) noexcept
       : is_valid_(name.size() < sizeof text_ && name.find('\0') == std::string_view::npos) {
     const std::size_t size = is_valid_ ? name.size() : 0;
-    std::memcpy(text_, name.data(), size);
+    if (size > 0) std::memcpy(text_, name.data(), size);  // an empty view may have no address
     text_[size] = '\0';
   }
 
