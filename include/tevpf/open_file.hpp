@@ -25,7 +25,7 @@ class NameArg {
   NameArg(std::string_view name) noexcept : text_(copy_), size_(name.size()) {
     is_whole_ = size_ < sizeof copy_ && name.find('\0') == std::string_view::npos;
     const std::size_t copied = is_whole_ ? size_ : 0;
-    std::memcpy(copy_, name.data(), copied);
+    if (copied > 0) std::memcpy(copy_, name.data(), copied);
     copy_[copied] = '\0';
     if (!is_whole_) text_ = name.data();
   }
