@@ -189,7 +189,7 @@ inline void store_value(const Place& place, const Cell& value, unsigned char* ro
       const std::string_view text = to_text(value, subject);
       const auto size = static_cast<std::size_t>(place.size);
       if (text.size() >= size) raise_width(place, text);
-      std::memcpy(row + place.offset, text.data(), text.size());
+      if (!text.empty()) std::memcpy(row + place.offset, text.data(), text.size());
       std::memset(row + place.offset + text.size(), 0, size - text.size());
     }
   });
