@@ -19,18 +19,6 @@ bool is_missing(const Value& value) {
   return text != nullptr ? text->empty() : is_nan(value);
 }
 
-double number_of(const Value& value) {
-  return std::visit(
-      [](const auto& v) -> double {
-        if constexpr (std::is_same_v<std::decay_t<decltype(v)>, std::string>) {
-          return 0;
-        } else {
-          return static_cast<double>(v);
-        }
-      },
-      value);
-}
-
 // The mean moves by each value's share, so that no sum can grow beyond all bounds.
 void take(Summary& summary, const Value& value) {
   if (is_missing(value)) {
@@ -41,7 +29,7 @@ void take(Summary& summary, const Value& value) {
   if (!summary.smallest || value < *summary.smallest) summary.smallest = value;
   if (!summary.largest || *summary.largest < value) summary.largest = value;
   if (std::holds_alternative<std::string>(value)) return;
-  const double number = number_of(value);
+  const double number = as_number(value);
   const auto count = static_cast<double>(summary.count);
   const double mean = summary.mean.value_or(0);
   summary.mean = mean == number ? mean : mean + number / count - mean / count;
