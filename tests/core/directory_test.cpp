@@ -195,6 +195,14 @@ TEST_F(DirectoryTest, RecordsNamedAfterwardsAreFound) {
     }
     for (int k = 0; k <= i; ++k) EXPECT_EQ(kKinds[0].find("N" + std::to_string(k)), k);
   }
+  // Their texts may fill the fields.
+  TEVPF_ELEM_HEADER full{};
+  std::memset(full.elem_name, 'n', sizeof full.elem_name);
+  std::memset(full.elem_desc, 'd', sizeof full.elem_desc);
+  TEVPF_TABLE* table;
+  ASSERT_EQ(TEV8R1_create_table(full, &table), PF_NORMAL);
+  EXPECT_EQ(table->header.elem_name, std::string(19, 'n'));
+  EXPECT_EQ(table->header.elem_desc, std::string(79, 'd'));
 }
 
 TEST_F(DirectoryTest, RefusalsSayWhyAndChangeNothing) {
