@@ -338,7 +338,7 @@ class Session:
         for key in ("min", "max"):
             if dice.random() < 0.25:
                 low = dice.randrange(-60, 40)
-                options[key] = dice.choice(("none", str(low if key == "min" else low + 130)))
+                options[key] = dice.choice(("none", str(low if key == "min" else low + dice.choice((130, 130, -20)))))
         if is_column:
             if kind == "string" or dice.random() < 0.1:
                 options["width"] = dice.randrange(1, 12)
