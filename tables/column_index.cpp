@@ -67,11 +67,6 @@ struct WithoutOne {
   }
 };
 
-struct Found {
-  std::int32_t position;
-  bool equal;
-};
-
 // ---- Searching ----------------------------------------------------------------------------------
 
 // Integers and texts are totally ordered: finds the first entry that is not less than the key.
@@ -159,14 +154,21 @@ constexpr std::int64_t kRowsPerSearch = 256;
 template <class T>
 Found search_along_fences(const ValuesInLine<T>& values, std::int32_t first, std::int32_t count,
                           const std::int32_t* entries, const NumberKey<T>& key) noexcept {
-  const std::int32_t fences = fence_count(count);
-  const std::int32_t fence =
-      fences == 0 ? 0 : search_entries(values.from(count), fences, key).position;
-  const std::int32_t start = fence * kFenceStep;
+  const auto count_below = [&](const ValuesInLine<T>& some, std::int32_t length) {
+    return count_less(length, [&](std::int32_t at) { return key.is_above(some.at(at)); });
+  };
+  const auto count_below_in_step = [&](const ValuesInLine<T>& some) {  // compilers vectorise it
+    std::int32_t below = 0;
+    for (std::int32_t at = 0; at < kFenceStep; ++at) below += key.is_above(some.at(at)) ? 1 : 0;
+    return below;
+  };
+  const std::int32_t start = kFenceStep * count_below(values.from(count), fence_count(count));
   std::int32_t found = start;
   if (start < count) {
     __builtin_prefetch(entries + start);
-    found += search_entries(values.from(start), std::min(kFenceStep, count - start), key).position;
+    const ValuesInLine<T> rest = values.from(start);
+    found +=
+        count - start >= kFenceStep ? count_below_in_step(rest) : count_below(rest, count - start);
   }
   found = std::max(first, found);
   return {found, found < count && key.equals(values.at(found))};
@@ -185,14 +187,11 @@ Found search_along_keys(const unsigned char* keys, std::int32_t first, std::int3
 }
 
 // The same for a column of any number type whose index is flat.
-IndexPlace search_with_keys(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
-                            const unsigned char* keys, std::int32_t first,
-                            const void* key) noexcept {
-  return with_number(column.def.type, [&](auto tag) -> IndexPlace {
+Found search_with_keys(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
+                       const unsigned char* keys, std::int32_t first, const void* key) noexcept {
+  return with_number(column.def.type, [&](auto tag) {
     const NumberKey<decltype(tag)> prepared(key, column.tolerance);
-    const Found found =
-        search_along_keys(keys, first, table.num_rows, column.index.items, prepared);
-    return {{found.position}, found.equal};
+    return search_along_keys(keys, first, table.num_rows, column.index.items, prepared);
   });
 }
 
@@ -348,7 +347,8 @@ IndexPlace search_index(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
                         const void* key) noexcept {
   if (table.num_rows < 1) return {{0}, false};
   if (column.index.items != nullptr && column.keys.values != nullptr) {
-    return search_with_keys(table, column, column.keys.values, 0, key);
+    const Found found = search_with_keys(table, column, column.keys.values, 0, key);
+    return {{found.position}, found.equal};
   }
   return with_key(column.def.type, column.tolerance, key, readable_bytes(table, column),
                   [&](const auto& prepared) { return search_all(table, column, prepared); });
@@ -374,8 +374,8 @@ IndexPlace search_others(const TEVPF_TABLE& table, const TEVPF_COLUMN& column, s
                   });
 }
 
-IndexPlace find_in_index(const TEVPF_TABLE& table, TEVPF_COLUMN& column, std::int32_t first,
-                         const void* key) noexcept {
+Found find_in_index(const TEVPF_TABLE& table, TEVPF_COLUMN& column, std::int32_t first,
+                    const void* key) noexcept {
   const std::int32_t count = table.num_rows;
   const std::int32_t* const entries = column.index.items;
   if (entries != nullptr && column.def.type != PF_TYPE_STRING) {
@@ -385,18 +385,18 @@ IndexPlace find_in_index(const TEVPF_TABLE& table, TEVPF_COLUMN& column, std::in
     }
   }
   return with_key(column.def.type, column.tolerance, key, readable_bytes(table, column),
-                  [&]<class Key>(const Key& prepared) -> IndexPlace {
+                  [&]<class Key>(const Key& prepared) -> Found {
                     const ValuesOfIndex values = entries_of(table, column);
                     if constexpr (Key::kTotalOrder) {
                       const IndexPlace whole = search_all(table, column, prepared);
                       if (whole.found) (void)column.index.at(whole.place);  // its row is read next
-                      if (whole.place.position >= first) return whole;
-                      return {{first}, prepared.equals(values.at(first))};
+                      if (whole.place.position >= first) return {whole.place.position, whole.found};
+                      return {first, prepared.equals(values.at(first))};
                     } else {
                       const auto from = [&](std::int32_t at) { return values.at(first + at); };
                       const ValuesFrom<decltype(from)> rest{from};
                       const Found found = search_entries(rest, count - first, prepared);
-                      return {{first + found.position}, found.equal};
+                      return {first + found.position, found.equal};
                     }
                   });
 }

@@ -77,6 +77,12 @@ struct IndexPlace {
   bool found;
 };
 
+// The same for callers that only read: a position and no place.
+struct Found {
+  std::int32_t position;
+  bool equal;
+};
+
 // Searches all entries for a key.
 [[nodiscard]] IndexPlace search_index(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
                                       const void* key) noexcept;
@@ -88,8 +94,8 @@ struct IndexPlace {
 // Searches the entries from position `first` on, for searches that callers request. A column that
 // is searched often gets search keys, which make each step about four times cheaper in a table
 // larger than the cache.
-[[nodiscard]] IndexPlace find_in_index(const TEVPF_TABLE& table, TEVPF_COLUMN& column,
-                                       std::int32_t first, const void* key) noexcept;
+[[nodiscard]] Found find_in_index(const TEVPF_TABLE& table, TEVPF_COLUMN& column,
+                                  std::int32_t first, const void* key) noexcept;
 
 // Requests the cache lines that searches of all indexes for the values of a row will read.
 void fetch_places(const TEVPF_TABLE& table, const unsigned char* row) noexcept;
