@@ -8,6 +8,7 @@
 #include "tables/column_record.h"
 #include "tables/cursor.h"
 #include "tables/directory.h"
+#include "tables/index_search.h"
 #include "tables/layout.h"
 #include "tables/row_store.h"
 #include "tables/search_keys.h"
