@@ -22,12 +22,13 @@ def exported(build):
     return json.loads(done.stdout)
 
 
-def branches(data):
-    """By file and place of the condition: how often it was true, and false."""
+def branches(data, build):
+    """By file and place of the condition: how often it was true, and false. Caches of compilers make names of
+    files relative to the build folder."""
     counts = collections.defaultdict(lambda: [0, 0])
     for function in data["data"][0]["functions"]:
         for line, column, end_line, end_column, true, false, file, *_ in function["branches"]:
-            name = pathlib.Path(function["filenames"][file])
+            name = (build / function["filenames"][file]).resolve()
             if not name.is_relative_to(ROOT):
                 continue
             place = (str(name.relative_to(ROOT)), line, column, end_line, end_column)
@@ -38,7 +39,7 @@ def branches(data):
 
 def main():
     build = pathlib.Path(sys.argv[1]).resolve()
-    counts = branches(exported(build))
+    counts = branches(exported(build), build)
     table = collections.defaultdict(lambda: [0, 0])
     for (name, *_), (true, false) in counts.items():
         folder = name.split("/")[0]
