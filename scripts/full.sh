@@ -14,7 +14,13 @@ seconds=${1:-1800}
 [[ $seconds =~ ^[0-9]+$ ]] || { echo "full.sh: '$seconds' is no number of seconds" >&2; exit 2; }
 
 scripts/check.sh
-scripts/test.sh dev asan x86 mingw wine
+scripts/test.sh dev asan x86 mingw wine clang arm64
+
+echo "== packages"
+scripts/package.sh --windows
+tests/package/check_packages.sh build/packages
+echo "== binary interface"
+tests/package/check_abi.sh build/dev/libtevpf.so
 
 scripts/install-packages.sh build test fuzz browser
 echo "== kill sweep"

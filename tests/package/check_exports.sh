@@ -4,7 +4,7 @@
 # it, with the version that the map gives it (.so). No function is missing in any of these places.
 set -euo pipefail
 export LC_ALL=C
-library=$(realpath "$1")
+library=$(realpath -e "$1")
 cd "$(dirname "${BASH_SOURCE[0]}")/../.."
 status=0
 

@@ -13,13 +13,15 @@ lintian --fail-on error,warning,info --display-info --tag-display-limit 0 \
   --suppress-tags initial-upload-closes-no-bugs "$packages"/*.deb
 
 echo "== in a fresh Debian"
-files=$(mktemp -d)
-trap 'rm -rf "$files"' EXIT
+work=$(mktemp -d)
+trap 'rm -rf "$work"' EXIT
+files=$work/packages
+mkdir "$files"
 cp "$packages"/*.deb "$packages"/*.tar.gz "$root"/examples/engine.{c,cpp} \
   "$root"/tests/package/{installed.sh,consumer/CMakeLists.txt} "$files"
-chmod -R a+rX "$files"
+chmod -R a+rX "$work"
 mmdebstrap --quiet --variant=apt --format=null --include=g++,make,cmake,pkgconf,dpkg-dev \
-  --customize-hook="sync-in '$files' /packages" \
+  --customize-hook="copy-in '$files' /" \
   --customize-hook="chroot \"\$1\" bash /packages/installed.sh" bookworm /dev/null
 
 shopt -s nullglob
