@@ -37,7 +37,7 @@ mkdir debian && touch debian/control
 expect "what a program depends on" "libtevpf1 (>= 1.0.0)" \
   "$(dpkg-shlibdeps -O engine | grep -o 'libtevpf[^,]*')"
 for linkage in shared static; do
-  cmake -S .. -B "$linkage" -DLINKAGE="$linkage" -DPROGRAM=../engine.cpp >cmake.log
+  cmake -S .. -B "$linkage" -DLINKAGE="$linkage" -DPROGRAM="$PWD/../engine.cpp" >cmake.log
   cmake --build "$linkage" >>cmake.log
   expect "the README's program in C++, $linkage" "The second one took 168 s" \
     "$(cd "$linkage" && ./consumer | tail -1)"
