@@ -1,5 +1,5 @@
 # Run by CPack: makes Debian's packages with debhelper, from what cmake/Package.cmake wrote.
-set(folder "${CPACK_PACKAGE_DIRECTORY}/debian-packages")
+set(folder "${CPACK_TEVPF_DEBIAN_FOLDER}")
 file(GLOB old "${folder}/*.deb")
 file(REMOVE ${old})
 # debhelper gives the compiler another home folder.

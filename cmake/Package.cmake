@@ -21,6 +21,7 @@ if(TEVPF_DEBHELPER AND NOT CMAKE_CROSSCOMPILING)
   list(APPEND CPACK_GENERATOR External)
   set(CPACK_EXTERNAL_PACKAGE_SCRIPT "${PROJECT_SOURCE_DIR}/cmake/DebianPackages.cmake")
   set(folder "${PROJECT_BINARY_DIR}/debian-packages")
+  set(CPACK_TEVPF_DEBIAN_FOLDER "${folder}")
 
   file(STRINGS CHANGELOG.md line REGEX "^## ${PROJECT_VERSION} " LIMIT_COUNT 1)
   string(REGEX MATCH "[0-9]+-[0-9]+-[0-9]+" day "${line}")
