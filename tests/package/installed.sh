@@ -57,7 +57,7 @@ database.enable_load_extension(True)
 database.load_extension("tevpf_sqlite")
 with tevpf.open("engine.pf") as file:
     database.execute("create virtual table e using tevpf(\"engine.pf\", \"Engine\")")
-    print(file.lists["Engine"]["Thrust"], database.execute("select name, value from e").fetchall())')"
+    print(file.lists["Engine"]["Thrust"].value, database.execute("select name, value from e").fetchall())')"
 
 mapfile -t names <<<"$names"
 dpkg --remove "${names[@]}" >>../dpkg.log
