@@ -1,8 +1,8 @@
 #!/usr/bin/env bash
 # full.sh [SECONDS]: all checks before a release: the static checks, all builds with all tests, the
-# packages in a fresh Debian (downloaded), the binary interface of version 1.0, a save with a fault at each of its system calls, the page of `tevpf report` in a browser (pictures of it
-# are left in build/report), and each fuzz target for SECONDS (default 1800).
-# Takes about an hour plus twice SECONDS on two cores. Inputs found by fuzzing are kept in
+# packages in a fresh Debian (downloaded), the binary interface of version 1.0, a save with a fault at
+# each of its system calls, the page of `tevpf report` in a browser (pictures of it are left in
+# build/report), and each fuzz target for SECONDS (default 1800). Inputs found by fuzzing are kept in
 # build/fuzz/found; copy them to tests/fuzz/corpus to test them in every run.
 set -euo pipefail
 cd "$(dirname "${BASH_SOURCE[0]}")/.."
