@@ -29,6 +29,9 @@ for archive in "$packages"/*-win64.zip; do
   echo "== ${archive##*/}"
   (cd "$files" && cmake -E tar xf "$archive")
   program=("$files"/*-win64/bin/tevpf.exe)
-  (cd "$files" && "$root/scripts/wine.sh" "${program[0]}" new engine.pf Engine --list &&
-    "$root/scripts/wine.sh" "${program[0]}" info engine.pf)
+  run() { (cd "$files" && "$root/scripts/wine.sh" "${program[0]}" "$@"); }
+  run new engine.pf
+  run add engine.pf Engine Thrust 480
+  [[ $(run get engine.pf Engine Thrust | tr -d '\r') == 480 ]]
+  echo "the tool: as expected"
 done
