@@ -69,7 +69,8 @@ TEST_F(LongListTest, OpensAndChangesLikeAnyOther) {
     write_file(path_, image.substr(0, size));
     const bool in_index = size >= image.size() - 4 * 1500;  // of a list that is whole
     ASSERT_EQ(TEV8R1_PF_open(path_.c_str()), in_index ? PF_BADFORMAT : PF_BADFILE) << size;
-    ASSERT_EQ(error_texts(), in_index ? ErrorTexts("list index", "") : ErrorTexts(path_, ""));
+    const ErrorTexts texts{in_index ? "list index" : path_, ""};
+    ASSERT_EQ(error_texts(), texts);
   }
 }
 

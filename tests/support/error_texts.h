@@ -4,7 +4,6 @@
 #include <gtest/gtest.h>
 
 #include <cstdio>
-#include <source_location>
 #include <string>
 
 #include "core/base/error_context.h"
@@ -31,9 +30,9 @@ inline std::ostream& operator<<(std::ostream& out, const ErrorTexts& texts) {
 
 // What a call answered and what it left in the error context, which is then ready for the next one.
 inline void expect_answer(TEVPF_STATUS got, TEVPF_STATUS status,
-                          const ErrorTexts& texts = kUntouched,
-                          std::source_location at = std::source_location::current()) {
-  const testing::ScopedTrace trace(at.file_name(), static_cast<int>(at.line()), "the call");
+                          const ErrorTexts& texts = kUntouched, const char* file = __builtin_FILE(),
+                          int line = __builtin_LINE()) {
+  const testing::ScopedTrace trace(file, line, "the call");
   EXPECT_EQ(got, status);
   EXPECT_EQ(error_texts(), texts);
   set_error_texts();
