@@ -23,6 +23,10 @@ install(FILES "${PROJECT_BINARY_DIR}/tevpfConfig.cmake"
 file(RELATIVE_PATH TEVPF_PC_PREFIX
   "/${CMAKE_INSTALL_LIBDIR}/pkgconfig" "/")
 string(REGEX REPLACE "/$" "" TEVPF_PC_PREFIX "${TEVPF_PC_PREFIX}")
+set(TEVPF_CXX_RUNTIME stdc++)
+if(CMAKE_CXX_FLAGS MATCHES "-stdlib=libc[+][+]")
+  set(TEVPF_CXX_RUNTIME c++)
+endif()
 foreach(name tevpf tevpf-cpp)
   configure_file(cmake/${name}.pc.in "${PROJECT_BINARY_DIR}/${name}.pc" @ONLY)
   install(FILES "${PROJECT_BINARY_DIR}/${name}.pc"

@@ -1,5 +1,6 @@
 # Looks for SQLite, for sql/: TEVPF_SQLITE_WORKS says whether programs can be linked with it, and
-# tevpf_sqlite3 is what they link. The static library is preferred, so that they run without it.
+# tevpf_sqlite3 is what they link: the static library unless TEVPF_LINK_SHARED is on, so that they run
+# without it.
 find_package(SQLite3 3.38 QUIET)
 find_package(Threads QUIET)
 set(TEVPF_SQLITE_WORKS OFF)
@@ -7,7 +8,7 @@ if(PROJECT_IS_TOP_LEVEL AND SQLite3_FOUND AND Threads_FOUND AND UNIX)
   find_library(TEVPF_SQLITE_ARCHIVE libsqlite3.a)
   mark_as_advanced(TEVPF_SQLITE_ARCHIVE)
   set(libraries "${SQLite3_LIBRARIES}")
-  if(TEVPF_SQLITE_ARCHIVE)
+  if(TEVPF_SQLITE_ARCHIVE AND NOT TEVPF_LINK_SHARED)
     set(libraries "${TEVPF_SQLITE_ARCHIVE}" m ${CMAKE_DL_LIBS})
   endif()
   list(APPEND libraries Threads::Threads)

@@ -15,7 +15,8 @@
 
 namespace tevpf {
 
-static_assert(std::endian::native == std::endian::little);
+static_assert(std::endian::native == std::endian::little,
+              "libtevpf needs a little-endian machine: records are stored as they lie in memory");
 
 struct Field {
   std::size_t place;  // in the record

@@ -1,8 +1,9 @@
 #!/usr/bin/env bash
-# full.sh [SECONDS]: all checks before a release: the static checks, all builds with all tests, a
-# save with a fault at each of its system calls, the page of `tevpf report` in a browser (pictures of it
-# are left in build/report), and each fuzz target for SECONDS (default 1800).
-# Takes about 20 minutes plus three times SECONDS on two cores. Inputs found by fuzzing are kept in
+# full.sh [SECONDS]: all checks before a release: the static checks, all builds with all tests, the
+# packages in a fresh Debian (downloaded), the binary interface of version 1.0, a save with a fault at
+# each of its system calls, the page of `tevpf report` in a browser (pictures of it are left in
+# build/report), and each fuzz target for SECONDS (default 1800); last
+# the branch coverage and the planted faults, which take hours. Inputs found by fuzzing are kept in
 # build/fuzz/found; copy them to tests/fuzz/corpus to test them in every run.
 set -euo pipefail
 cd "$(dirname "${BASH_SOURCE[0]}")/.."
@@ -14,7 +15,13 @@ seconds=${1:-1800}
 [[ $seconds =~ ^[0-9]+$ ]] || { echo "full.sh: '$seconds' is no number of seconds" >&2; exit 2; }
 
 scripts/check.sh
-scripts/test.sh dev asan x86 mingw wine
+scripts/test.sh dev asan x86 mingw wine clang arm64
+
+echo "== packages"
+scripts/package.sh --windows
+tests/package/check_packages.sh build/packages
+echo "== binary interface"
+tests/package/check_abi.sh build/dev/libtevpf.so
 
 scripts/install-packages.sh build test fuzz browser
 echo "== kill sweep"

@@ -1,6 +1,6 @@
 #!/usr/bin/env bash
 # install-packages.sh GROUP...: installs the missing Debian packages of these groups.
-# Groups: build tool test python bench x86 windows wine fuzz lint browser
+# Groups: build tool test python bench x86 windows wine clang arm64 fuzz lint browser package
 set -euo pipefail
 
 declare -A groups=(
@@ -13,9 +13,12 @@ declare -A groups=(
   [x86]="g++-multilib googletest"
   [windows]="g++-mingw-w64-i686-win32"
   [wine]="g++-mingw-w64-x86-64-posix googletest wine64"
+  [clang]="clang libc++-dev libc++abi-dev googletest"
+  [arm64]="clang binutils-aarch64-linux-gnu libstdc++-12-dev-arm64-cross qemu-user googletest"
   [fuzz]="clang libclang-rt-14-dev llvm"
   [lint]="clang-format clang-tidy cppcheck shellcheck python3"
   [browser]="chromium chromium-driver python3-selenium"
+  [package]="abigail-tools debhelper dh-python lintian mmdebstrap"
 )
 
 missing=()

@@ -4,6 +4,8 @@
 #   x86     32-bit x86 build              mingw   32-bit Windows cross-build, its DLL checked
 # On request:
 #   wine    64-bit Windows build, its tests run by Wine
+#   clang   64-bit build by clang with libc++
+#   arm64   64-bit ARM build, its tests run by QEMU
 # The last lines are ctest's summary over all legs.
 set -euo pipefail
 cd "$(dirname "${BASH_SOURCE[0]}")/.."
@@ -14,7 +16,8 @@ esac
 legs=("$@")
 ((${#legs[@]})) || legs=(dev asan x86 mingw)
 
-declare -A packages=([dev]="test python" [asan]="test python" [x86]="test x86" [mingw]=windows [wine]=wine)
+declare -A packages=([dev]="test python" [asan]="test python" [x86]="test x86" [mingw]=windows [wine]=wine
+  [clang]="test clang" [arm64]="test arm64")
 declare -A options=([dev]=-DTEVPF_BUILD_PYTHON=ON [asan]=-DTEVPF_BUILD_PYTHON=ON)
 groups=(build tool)
 for leg in "${legs[@]}"; do

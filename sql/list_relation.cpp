@@ -4,6 +4,7 @@
 #include <cmath>
 #include <string_view>
 
+#include "from_chars.h"
 #include "refusal.h"
 #include "values.h"
 
@@ -56,7 +57,7 @@ void deliver_shortest(sqlite3_context* context, const tevpf::Value& value) {
   char text[32];
   const char* const end = std::to_chars(text, text + sizeof text, *real).ptr;
   double number = 0;
-  std::from_chars(text, end, number);
+  sql::from_chars(text, end, number);
   sql::deliver(context, number);
 }
 

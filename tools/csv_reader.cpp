@@ -37,7 +37,7 @@ std::size_t halve_quotes(char* text, std::size_t size) {
 CsvReader::CsvReader(CsvSource& source, const CsvDialect& dialect)
     : source_(source),
       comment_(dialect.comment),
-      buffer_(std::make_unique_for_overwrite<char[]>(kFirstRoom + 1)),
+      buffer_(new char[kFirstRoom + 1]),
       room_(kFirstRoom),
       pos_(buffer_.get()),
       end_(buffer_.get()) {
@@ -65,7 +65,7 @@ void CsvReader::fail(std::size_t line, const std::string& what) const {
 void CsvReader::read_more() {
   const auto kept = static_cast<std::size_t>(end_ - pos_);
   if (kept == room_) {
-    auto larger = std::make_unique_for_overwrite<char[]>(2 * room_ + 1);
+    std::unique_ptr<char[]> larger(new char[2 * room_ + 1]);
     std::memcpy(larger.get(), pos_, kept);
     buffer_ = std::move(larger);
     room_ *= 2;

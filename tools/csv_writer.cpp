@@ -13,7 +13,7 @@ CsvWriter::CsvWriter(Output& output, CsvStyle style)
     : output_(output),
       style_(std::move(style)),
       size_(std::size_t{1} << 16U),
-      buffer_(std::make_unique_for_overwrite<char[]>(size_)),
+      buffer_(new char[size_]),
       next_(buffer_.get()),
       end_(next_ + size_) {
   for (const char byte : {style_.delimiter, '"', '\n', '\r'}) {

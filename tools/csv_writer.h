@@ -58,7 +58,7 @@ inline char* CsvWriter::room_for(std::size_t bytes) {
     flush();
     if (size_ <= bytes) {
       size_ = 2 * bytes;
-      buffer_ = std::make_unique_for_overwrite<char[]>(size_);
+      buffer_.reset(new char[size_]);
       next_ = buffer_.get();
       end_ = next_ + size_;
     }

@@ -1,8 +1,8 @@
 #include "json.h"
 
-#include <charconv>
 #include <cmath>
 
+#include "sql/from_chars.h"
 #include "text.h"
 
 namespace tool {
@@ -52,7 +52,7 @@ std::string number_json(T number) {
   if constexpr (std::is_same_v<T, float>) {
     // Readers take numbers as doubles first: rounding twice must not lead elsewhere.
     double wide = 0;
-    std::from_chars(text.data(), text.data() + text.size(), wide);
+    sql::from_chars(text.data(), text.data() + text.size(), wide);
     if (static_cast<float>(wide) != number) text = exact_text(static_cast<double>(number));
   }
   return text;

@@ -1,13 +1,13 @@
 // Values as text: read, and written so that they read back exactly.
 #pragma once
 
-#include <charconv>
 #include <cstdint>
 #include <optional>
 #include <string>
 #include <string_view>
 #include <system_error>
 
+#include "sql/from_chars.h"
 #include "tevpf.hpp"
 #include "text.h"
 
@@ -81,7 +81,7 @@ Parsed parse_number(std::string_view text, T& number) {
   const bool may_have_blanks = !text.empty() && (text.front() <= ' ' || text.back() <= ' ');
   if (may_have_blanks) text = trimmed(text);
   if (text.size() > 1 && text[0] == '+' && text[1] != '-') text.remove_prefix(1);
-  const auto [end, error] = std::from_chars(text.data(), text.data() + text.size(), number);
+  const auto [end, error] = sql::from_chars(text.data(), text.data() + text.size(), number);
   if (error == std::errc::invalid_argument || end != text.data() + text.size()) {
     return Parsed::kNotANumber;
   }

@@ -1,8 +1,10 @@
 // Converts values to text and text to values. The locale affects only the white-space class and,
 // for formats supplied by the caller, printf itself.
 #include <cctype>
+#include <cerrno>
 #include <cfloat>
 #include <charconv>
+#include <clocale>
 #include <cmath>
 #include <cstdio>
 #include <cstdlib>
@@ -40,6 +42,27 @@ TEVPF_STATUS convert_integer(const char* text, std::int32_t type, std::size_t lo
   return PF_NORMAL;
 }
 
+#ifdef __cpp_lib_to_chars
+using std::from_chars;
+#else
+// libc++ has none for reals before its version 20. The text ends in a zero byte, and starts with a digit
+// or a point.
+std::from_chars_result from_chars(const char* text, const char*, double& number) noexcept {
+  if (text[0] == '0' && (text[1] == 'x' || text[1] == 'X')) {  // hexadecimal to strtod
+    number = 0;
+    return {text + 1, std::errc{}};
+  }
+  static const locale_t plain = newlocale(LC_ALL_MASK, "C", nullptr);
+  char* end;
+  errno = 0;
+  const double read = strtod_l(text, &end, plain);
+  if (end == text) return {text, std::errc::invalid_argument};
+  if (errno == ERANGE) return {end, std::errc::result_out_of_range};
+  number = read;
+  return {end, std::errc{}};
+}
+#endif
+
 enum class Number { kNone, kOutOfRange, kEmpty, kValue };
 
 // Trailing characters make a text invalid only if its number is in range; a number out of range is
@@ -55,7 +78,7 @@ Number parse_double(const char* text, double& value) noexcept {
 
   double magnitude = 0.0;
   const char* const text_end = start + std::strlen(start);
-  const auto [end, error] = std::from_chars(start, text_end, magnitude);
+  const auto [end, error] = from_chars(start, text_end, magnitude);
   if (error == std::errc::result_out_of_range) return Number::kOutOfRange;
   if (error != std::errc{}) return Number::kNone;
   if (magnitude != 0.0 && magnitude < DBL_MIN) return Number::kOutOfRange;

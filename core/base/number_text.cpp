@@ -4,6 +4,7 @@
 
 #include <algorithm>
 #include <charconv>
+#include <cmath>
 #include <cstring>
 
 #include "core/base/leading_digits.h"
@@ -64,6 +65,11 @@ char* write_decimal(char* out, std::int64_t number) noexcept {
 char* write_general(char* out, double number, std::int32_t precision) noexcept {
   const std::int32_t digits =
       precision < 0 ? kDefaultPrecision : std::min(precision, kMaxPrecision);
+  if (std::isnan(number)) {  // libc++ names its kind as well
+    if (std::signbit(number)) *out++ = '-';
+    std::memcpy(out, "nan", 3);
+    return out + 3;
+  }
   LeadingDigits leading;
   const double size = number < 0 ? -number : number;
   if (digits > 0 && digits <= kMostLeadingDigits && size > 0 &&

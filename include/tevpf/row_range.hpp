@@ -225,8 +225,9 @@ inline void RowReader::make_room() {
       std::max<std::size_t>(kLargestBlock / std::max<std::size_t>(layout_->row_size, 1), 1);
   const std::size_t wanted = room_ == 0 ? std::min(kFirstBlock, largest) : largest;
   if (wanted == room_) return;
-  rows_ = std::make_unique_for_overwrite<unsigned char[]>(wanted * layout_->row_size);
-  if (!order_.view().empty()) numbers_ = std::make_unique_for_overwrite<std::int32_t[]>(wanted);
+  // Not make_unique_for_overwrite, which libc++ has only since its version 16.
+  rows_.reset(new unsigned char[wanted * layout_->row_size]);
+  if (!order_.view().empty()) numbers_.reset(new std::int32_t[wanted]);
   room_ = wanted;
 }
 

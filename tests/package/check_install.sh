@@ -1,9 +1,9 @@
 #!/usr/bin/env bash
-# check_install.sh BUILD WORK CMAKE CC CXX TOOLCHAIN CFLAGS: installs the build into a fresh folder, then
+# check_install.sh BUILD WORK CMAKE CC CXX TOOLCHAIN CFLAGS CXXFLAGS: installs the build into a fresh folder, then
 # builds and runs programs against it in the ways a user would: with find_package, shared and static, and
 # with pkg-config, as C99, C++20 and C++23, with CC and CXX and, where there is one, clang.
 set -euo pipefail
-build=$1 work=$2 cmake=$3 cc=$4 cxx=$5 toolchain=$6 cflags=$7
+build=$1 work=$2 cmake=$3 cc=$4 cxx=$5 toolchain=$6 cflags=$7 cxxflags=$8
 here=$(cd "$(dirname "${BASH_SOURCE[0]}")" && pwd)
 examples=$here/../../examples
 
@@ -38,7 +38,7 @@ for linkage in shared static; do
   for source in "$examples/engine.c" "$examples/engine.cpp"; do
     folder=$work/$linkage.${source##*.}
     options=(-G Ninja -DCMAKE_PREFIX_PATH="$prefix" -DCMAKE_C_COMPILER="$cc"
-      -DCMAKE_CXX_COMPILER="$cxx" -DCMAKE_C_FLAGS="$cflags" -DCMAKE_CXX_FLAGS="$cflags"
+      -DCMAKE_CXX_COMPILER="$cxx" -DCMAKE_C_FLAGS="$cflags" -DCMAKE_CXX_FLAGS="$cxxflags"
       -DLINKAGE="$linkage" -DPROGRAM="$source")
     [[ -z $toolchain ]] || options+=(-DCMAKE_TOOLCHAIN_FILE="$toolchain")
     "$cmake" -S "$here/consumer" -B "$folder" "${options[@]}" >"$folder.log"
@@ -52,16 +52,18 @@ export PKG_CONFIG_PATH
 LD_LIBRARY_PATH=$(pkg-config --variable=libdir tevpf)
 export LD_LIBRARY_PATH
 strict=(-Wall -Wextra -Wconversion -Wshadow -Werror)
-read -ra base <<<"$cflags"
 
 by_pkg_config() { # by_pkg_config PACKAGE SOURCE COMPILER...: compiled once, linked shared and static
-  local package=$1 source=$2 linkage flags libs
+  local package=$1 source=$2 linkage flags libs static base
   shift 2
+  read -ra base <<<"$cflags"
+  [[ $1 != "$cxx" ]] || read -ra base <<<"$cxxflags"
   read -ra flags <<<"$(pkg-config --cflags "$package")"
   read -ra libs <<<"$(pkg-config --libs "$package")"
+  read -ra static <<<"$(pkg-config --static --libs-only-l "$package" | sed 's/-ltevpf//')"
   "$@" "${strict[@]}" "${base[@]}" "${flags[@]}" -c "$source" -o "$work/by_pkg_config.o"
   for linkage in shared static; do
-    [[ $linkage == shared ]] || libs=("$LD_LIBRARY_PATH/libtevpf.a" -lstdc++ -lm)
+    [[ $linkage == shared ]] || libs=("$LD_LIBRARY_PATH/libtevpf.a" "${static[@]}")
     "$1" "${base[@]}" "$work/by_pkg_config.o" -o "$work/by_pkg_config" "${libs[@]}"
     run "pkg-config, $* ${source##*/}, $linkage" "$work/by_pkg_config" "$source"
   done
