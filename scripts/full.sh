@@ -2,7 +2,8 @@
 # full.sh [SECONDS]: all checks before a release: the static checks, all builds with all tests, the
 # packages in a fresh Debian (downloaded), the binary interface of version 1.0, a save with a fault at
 # each of its system calls, the page of `tevpf report` in a browser (pictures of it are left in
-# build/report), and each fuzz target for SECONDS (default 1800). Inputs found by fuzzing are kept in
+# build/report), and each fuzz target for SECONDS (default 1800); last
+# the branch coverage and the planted faults, which take hours. Inputs found by fuzzing are kept in
 # build/fuzz/found; copy them to tests/fuzz/corpus to test them in every run.
 set -euo pipefail
 cd "$(dirname "${BASH_SOURCE[0]}")/.."
@@ -24,8 +25,8 @@ tests/package/check_abi.sh build/dev/libtevpf.so
 
 scripts/install-packages.sh build test fuzz browser
 echo "== kill sweep"
-cmake --build --preset dev --target save_once
-tests/robustness/kill_sweep.py build/dev/tests/robustness/save_once
+cmake --build --preset dev --target save_once short_call
+tests/robustness/kill_sweep.py build/dev
 
 echo "== report in a browser"
 # The packages of Debian are for its own Python.
@@ -34,10 +35,16 @@ echo "== report in a browser"
 cmake --preset fuzz
 cmake --build --preset fuzz
 mkdir -p build/fuzz/found
-for target in file text; do
+for target in file text operations; do
   echo "== fuzzing: $target, $seconds seconds"
   mkdir -p "build/fuzz/$target"
   build/fuzz/tests/fuzz/"${target}_fuzz" -max_total_time="$seconds" -timeout=10 -rss_limit_mb=1024 \
     -print_final_stats=1 -artifact_prefix=build/fuzz/found/ \
     "build/fuzz/$target" "tests/fuzz/corpus/$target"
 done
+
+echo "== branch coverage"
+scripts/coverage.sh
+
+echo "== planted faults"
+scripts/mutation.py

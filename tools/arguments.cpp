@@ -1,12 +1,14 @@
 #include "arguments.h"
 
 #include <CLI/CLI.hpp>
+#include <algorithm>
 #include <cstdint>
 #include <cstdio>
 #include <limits>
 #include <optional>
 #include <sstream>
 #include <type_traits>
+#include <utility>
 #include <variant>
 #include <vector>
 
@@ -184,6 +186,24 @@ void exclude_each_other(CLI::App& app, const std::vector<const char*>& names) {
   }
 }
 
+// The command line, last word first, as CLI11 wants it. Of "--units=" it would take the next word for the
+// value, so such an option and its empty value become two words.
+std::vector<std::string> reversed_words(int argc, const char* const* argv) {
+  std::vector<std::string> words;
+  bool may_be_option = true;
+  for (int i = 1; i < argc; ++i) {
+    std::string word = argv[i];
+    may_be_option = may_be_option && word != "--";
+    const bool is_empty = may_be_option && word.starts_with("--") && word.ends_with('=') &&
+                          std::count(word.begin(), word.end(), '=') == 1;
+    if (is_empty) word.pop_back();
+    words.push_back(std::move(word));
+    if (is_empty) words.emplace_back();
+  }
+  std::reverse(words.begin(), words.end());
+  return words;
+}
+
 }  // namespace
 
 bool read_arguments(const Command& command, int argc, const char* const* argv, Arguments& arguments,
@@ -195,7 +215,7 @@ bool read_arguments(const Command& command, int argc, const char* const* argv, A
   exclude_each_other(app, {"--csv", "--json"});
   exclude_each_other(app, {"--before", "--after", "--position"});
   try {
-    app.parse(argc, argv);
+    app.parse(reversed_words(argc, argv));
     return true;
   } catch (const CLI::CallForHelp&) {
     print(app.help());

@@ -34,7 +34,6 @@ std::vector<std::size_t> rows_where(tevpf::File& file, const tevpf::Element& tab
 
 void update_rows(tevpf::File& file, const tevpf::Element& table,
                  const std::vector<std::size_t>& rows, const std::string& changes) {
-  if (rows.empty()) return;
   try {
     sql::Database database;
     database.attach(file);

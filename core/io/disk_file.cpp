@@ -70,7 +70,13 @@ std::FILE* open_regular(const char* name, Access access) noexcept {
 
 std::FILE* create_file(const char* name) noexcept {
   const int file = open_descriptor(name, O_WRONLY | O_CREAT | O_EXCL);
-  return file < 0 ? nullptr : adopt(file, "wb");
+  if (file < 0) return nullptr;
+  std::FILE* const stream = adopt(file, "wb");
+  if (stream != nullptr) return stream;
+  const int why = errno;
+  remove_file(name);  // this call has made it
+  errno = why;
+  return nullptr;
 }
 
 #ifdef _WIN32

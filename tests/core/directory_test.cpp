@@ -176,6 +176,10 @@ TEST_F(DirectoryTest, NamesAreCutAndComparedAsTheyAreKept) {
     EXPECT_EQ(kind.find(""), 1);
   }
   EXPECT_EQ(file().directories[0].entries[0]->elem_desc, std::string(79, 'd'));
+  // Likewise among so many that names are hashed.
+  for (int i = 0; i < 20; ++i) EXPECT_EQ(kKinds[0].create("N" + std::to_string(i)), PF_NORMAL);
+  expect_answer(kKinds[0].create(alike), PF_DUPLICATE, {"list " + kept, "the file"});
+  EXPECT_EQ(kKinds[0].find(longer), -1);
   // What stands behind a terminator is zero.
   EXPECT_EQ(TEV8R1_modify_elem_name(PF_ELEM_LIST, kept.c_str(), "x"), PF_NORMAL);
   const char* name = file().directories[0].entries[0]->elem_name;
@@ -195,6 +199,14 @@ TEST_F(DirectoryTest, RecordsNamedAfterwardsAreFound) {
     }
     for (int k = 0; k <= i; ++k) EXPECT_EQ(kKinds[0].find("N" + std::to_string(k)), k);
   }
+  // Their texts may fill the fields.
+  TEVPF_ELEM_HEADER full{};
+  std::memset(full.elem_name, 'n', sizeof full.elem_name);
+  std::memset(full.elem_desc, 'd', sizeof full.elem_desc);
+  TEVPF_TABLE* table;
+  ASSERT_EQ(TEV8R1_create_table(full, &table), PF_NORMAL);
+  EXPECT_EQ(table->header.elem_name, std::string(19, 'n'));
+  EXPECT_EQ(table->header.elem_desc, std::string(79, 'd'));
 }
 
 TEST_F(DirectoryTest, RefusalsSayWhyAndChangeNothing) {

@@ -223,6 +223,17 @@ TEST_F(FormatTest, LiesAreRefusedOrMended) {
   EXPECT_EQ(tevpf::list_at(*current(), 0).texts.begin, nullptr) << "room for texts it has not got";
 }
 
+// Without room for its values, and so for the row, nothing but the width itself is wrong.
+TEST_F(FormatTest, AStringColumnOfNegativeWidthIsRefused) {
+  ASSERT_EQ(TEV8R1_PF_open(path_.c_str()), PF_NEWFILE);
+  ASSERT_EQ(TEV8R1_PF_create_elem("t", "", PF_ELEM_TABLE), PF_NORMAL);
+  ASSERT_EQ(TEV8R1_PF_def_column("t", tevpf::col("s", tevpf::kText, 7)), PF_NORMAL);
+  std::string bytes = saved_bytes();
+  bytes.replace(bytes.rfind(std::string("\7\0\0\0", 4)), 4, 4, '\xff');
+  bytes.replace(116, 4, 4, '\0');  // row_wid
+  expect_answer(open_bytes(bytes), PF_BADFILE, {path_, ""});
+}
+
 // The default row may be larger than any memory: every other failure of the table comes first.
 TEST_F(FormatTest, ADefaultRowThatCannotBeHadIsTheLastFailure) {
   ASSERT_EQ(TEV8R1_PF_open(path_.c_str()), PF_NEWFILE);

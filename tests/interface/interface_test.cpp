@@ -493,6 +493,10 @@ TEST_F(InterfaceTest, TheReadingThatCCallsDoIsBounded) {
   EXPECT_EQ(count, 2);
   EXPECT_EQ(numbers[0], 1);
   EXPECT_EQ(numbers[1], 2);
+  numbers[0] = numbers[1] = count = 2;
+  EXPECT_EQ(tevpf_get_rows("t", nullptr, 1, &count, row_size, row.data(), numbers), PF_NORMAL);
+  EXPECT_EQ(numbers[0], 1);
+  EXPECT_EQ(numbers[1], 2);
   count = 5;
   EXPECT_EQ(tevpf_get_rows("t", nullptr, PF_END_POS, &count, row_size, nullptr, nullptr),
             PF_NORMAL);
