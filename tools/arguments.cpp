@@ -1,12 +1,14 @@
 #include "arguments.h"
 
 #include <CLI/CLI.hpp>
+#include <algorithm>
 #include <cstdint>
 #include <cstdio>
 #include <limits>
 #include <optional>
 #include <sstream>
 #include <type_traits>
+#include <utility>
 #include <variant>
 #include <vector>
 
@@ -186,7 +188,7 @@ void exclude_each_other(CLI::App& app, const std::vector<const char*>& names) {
 
 }  // namespace
 
-bool read_arguments(const Command& command, int argc, const char* const* argv, Arguments& arguments,
+bool read_arguments(const Command& command, std::vector<std::string> words, Arguments& arguments,
                     ExitStatus& status) {
   CLI::App app(command.help, std::string("tevpf ") + command.name);
   app.allow_windows_style_options(false);
@@ -195,7 +197,8 @@ bool read_arguments(const Command& command, int argc, const char* const* argv, A
   exclude_each_other(app, {"--csv", "--json"});
   exclude_each_other(app, {"--before", "--after", "--position"});
   try {
-    app.parse(argc, argv);
+    std::reverse(words.begin(), words.end());  // as CLI11 takes them
+    app.parse(std::move(words));
     return true;
   } catch (const CLI::CallForHelp&) {
     print(app.help());
