@@ -3,7 +3,7 @@
 #   dev     64-bit debug build            asan    the same under address and UB sanitizers
 #   x86     32-bit x86 build              mingw   32-bit Windows cross-build, its DLL checked
 # On request:
-#   wine    64-bit Windows build, its tests run by Wine
+#   wine    64-bit Windows build, its tests and transcripts run by Wine
 # The last lines are ctest's summary over all legs.
 set -euo pipefail
 cd "$(dirname "${BASH_SOURCE[0]}")/.."
