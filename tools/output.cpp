@@ -71,7 +71,7 @@ void Output::fail(const std::error_code& error) {
 }
 
 void Output::put(std::string_view text) {
-  if (std::fwrite(text.data(), 1, text.size(), stream_) != text.size()) fail(last_error());
+  if (std::fwrite(text.data(), 1, text.size(), stream_) != text.size()) fail(write_error(stream_));
 }
 
 // The user's pager, where one is wanted.
@@ -104,7 +104,7 @@ void Output::write(std::string_view text) {
 void Output::finish() {
   put(std::exchange(held_, {}));
   put(visible_lines(line_));
-  if (std::fflush(stream_) != 0) fail(last_error());
+  if (std::fflush(stream_) != 0) fail(write_error(stream_));
   if (temp_) {
     if (const std::error_code error = temp_->replace_target()) fail(error);
     return;

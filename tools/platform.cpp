@@ -1,6 +1,7 @@
 // What is the same on all platforms.
 #include "platform.h"
 
+#include <cerrno>
 #include <random>
 
 namespace fs = std::filesystem;
@@ -13,6 +14,8 @@ std::string name_of(const fs::path& path) {
   const std::u8string name = path.u8string();
   return {name.begin(), name.end()};
 }
+
+std::error_code last_error() { return {errno, std::generic_category()}; }
 
 fs::path unused_path_beside(const fs::path& target) {
   static constexpr std::string_view kLetters = "abcdefghijklmnopqrstuvwxyz0123456789";

@@ -23,6 +23,9 @@ std::string name_of(const std::filesystem::path& path);
 // What errno says.
 std::error_code last_error();
 
+// Why writing to a stream failed. Of some systems, errno does not tell that a pipe's reader has gone.
+std::error_code write_error(std::FILE* stream);
+
 // The words of the command line in UTF-8, the program's name in front. `count` and `given` are what
 // main() was given.
 std::vector<std::string> command_line(int count, const char* const* given);

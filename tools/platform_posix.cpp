@@ -97,7 +97,7 @@ mode_t mode_of_new_files() {
 
 }  // namespace
 
-std::error_code last_error() { return {errno, std::generic_category()}; }
+std::error_code write_error(std::FILE*) { return last_error(); }
 
 std::vector<std::string> command_line(int count, const char* const* given) {
   return {given, given + count};

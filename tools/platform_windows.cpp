@@ -158,11 +158,11 @@ bool wait_for(HANDLE mutex, DWORD milliseconds) {
 
 }  // namespace
 
-// The C runtime knows no word for a pipe whose reader has gone.
-std::error_code last_error() {
-  const bool is_closed_pipe =
-      errno == EINVAL && (_doserrno == ERROR_NO_DATA || _doserrno == ERROR_PIPE_NOT_CONNECTED);
-  return {is_closed_pipe ? EPIPE : errno, std::generic_category()};
+// Pipes fail in no other way, but by several errors.
+std::error_code write_error(std::FILE* stream) {
+  const std::error_code error = last_error();
+  const bool is_pipe = GetFileType(handle_of(stream)) == FILE_TYPE_PIPE;
+  return is_pipe ? std::make_error_code(std::errc::broken_pipe) : error;
 }
 
 // The command line that the C runtime hands to main() is in the system's code page, with its wildcards
