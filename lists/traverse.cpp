@@ -38,7 +38,7 @@ inline TEVPF_STATUS step(TEVPF_LIST& list, char* name_out, void* value_out,
   if (list.cur_param >= list.num_params) return PF_NOMORE;
   const TEVPF_PARAM_DEF& definition = param_in(list, slot_at(list.cur_param)).def;
   fetch_along(&definition, sizeof definition);
-  copy_field_text(name_out, definition.name);
+  copy_name(name_out, definition.name);
   copy_value(definition, value_out);
   return PF_NORMAL;
 }

@@ -183,7 +183,7 @@ void TableCursor::deliver(sqlite3_context* context, int column) const {
     case tevpf::Type::int16:
       return sqlite3_result_int(context, load<std::int16_t>(row_ + field.offset));
     case tevpf::Type::string:
-      return sql::deliver(context, field.text(row_));
+      return sql::deliver(context, field.text(row_).data());  // terminated
     default:
       return sql::deliver(context, field.number(row_));
   }

@@ -22,6 +22,11 @@ std::string_view text_of(sqlite3_value* value);
 inline void deliver(sqlite3_context* context, double number) {
   sqlite3_result_double(context, number);  // NULL for what is not a number
 }
+// A text that ends with a terminator. SQLite reallocates one that does not when a function reads it,
+// in every row.
+inline void deliver(sqlite3_context* context, const char* text) {
+  sqlite3_result_text(context, text, -1, SQLITE_TRANSIENT);
+}
 inline void deliver(sqlite3_context* context, std::string_view text) {
   sqlite3_result_text64(context, text.data(), text.size(), SQLITE_TRANSIENT, SQLITE_UTF8);
 }

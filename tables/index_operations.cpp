@@ -2,6 +2,7 @@
 // them, so they settle the table first.
 #include "tables/column_index.h"
 #include "tables/columns.h"
+#include "tables/index_search.h"
 #include "tables/row_store.h"
 #include "tables/rows.h"
 #include "tables/search_keys.h"

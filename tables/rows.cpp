@@ -11,6 +11,7 @@
 #include "tables/cursor.h"
 #include "tables/default_row.h"
 #include "tables/directory.h"
+#include "tables/index_search.h"
 #include "tables/layout.h"
 #include "tables/row_store.h"
 #include "tables/search_keys.h"

@@ -8,6 +8,7 @@
 #include "tables/column_record.h"
 #include "tables/cursor.h"
 #include "tables/directory.h"
+#include "tables/index_search.h"
 #include "tables/layout.h"
 #include "tables/row_store.h"
 #include "tables/search_keys.h"
@@ -89,9 +90,9 @@ TEVPF_STATUS find_position(TEVPF_TABLE& table, TEVPF_COLUMN& column, std::int8_t
                            const void* key, std::int32_t first, std::int32_t& position) noexcept {
   bool found = false;
   if (first < table.num_rows && is_indexed(column) && &column == table.cur_col) {
-    const IndexPlace place = find_in_index(table, column, first, key);
-    position = place.place.position;
-    found = place.found || (mode == kNearest && position < table.num_rows);
+    const Found place = find_in_index(table, column, first, key);
+    position = place.position;
+    found = place.equal || (mode == kNearest && position < table.num_rows);
   } else if (first < table.num_rows) {
     position = walk_for_key(table, column, first, key);
     found = position < table.num_rows;

@@ -3,6 +3,7 @@
 #include "core/base/status.h"
 #include "core/library.h"
 #include "tables/column_index.h"
+#include "tables/index_search.h"
 #include "tables/row_store.h"
 #include "values/compare.h"
 #include "values/value_text.h"

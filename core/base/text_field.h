@@ -28,40 +28,35 @@ void terminate_field(char (&field)[N]) noexcept {
   if (field[N - 1] != '\0' && std::memchr(field, '\0', N) == nullptr) field[N - 1] = '\0';
 }
 
-// The size in bytes of the text in a terminated field, terminator included. Scans eight bytes per
-// step.
-template <std::size_t N>
-std::size_t text_bytes(const char (&field)[N]) noexcept {
-  constexpr std::size_t kWord = sizeof(std::uint64_t), kLast = N - kWord;
-  for (std::size_t at = 0; at < kLast; at += kWord) {
-    const std::uint64_t zeros = zero_bytes(load_word(field + at));
-    if (zeros != 0) return at + static_cast<std::size_t>(std::countr_zero(zeros)) / 8 + 1;
-  }
-  const std::uint64_t zeros = zero_bytes(load_word(field + kLast));
-  return kLast + static_cast<std::size_t>(std::countr_zero(zeros)) / 8 + 1;
-}
-
-// Copies the text of a terminated field of at most 24 bytes, with its terminator and nothing after
-// it. This is strcpy without the call. Two possibly overlapping copies of n bytes cover any size
-// from n to 2n.
-template <std::size_t N>
-void copy_field_text(char* to, const char (&field)[N]) noexcept {
-  static_assert(N <= 24);
-  const std::size_t bytes = text_bytes(field);
-  const auto copy_ends = [&](auto size) {
-    std::memcpy(to, field, size);
-    std::memcpy(to + bytes - size, field + bytes - size, size);
+// Copies the text of a terminated name field with its terminator, and nothing behind it. This is
+// strcpy without the call. Two possibly overlapping copies of n bytes cover any size from n to 2n.
+[[gnu::always_inline]] inline void copy_name(char* to,
+                                             const char (&field)[TEVPF_NAME_SIZE]) noexcept {
+  constexpr std::size_t kWord = sizeof(std::uint64_t), kHalf = kWord / 2;
+  const auto copy = [&](std::size_t at, auto size) { std::memcpy(to + at, field + at, size); };
+  const auto whole = std::integral_constant<std::size_t, kWord>{};
+  const auto half = std::integral_constant<std::size_t, kHalf>{};
+  const auto size_in = [](std::uint64_t zeros) {
+    return static_cast<std::size_t>(std::countr_zero(zeros)) / 8 + 1;
   };
-  if (bytes > 16) {
-    std::memcpy(to + 8, field + 8, 8);
-    copy_ends(std::integral_constant<std::size_t, 8>{});
-  } else if (bytes >= 8) {
-    copy_ends(std::integral_constant<std::size_t, 8>{});
-  } else if (bytes >= 4) {
-    copy_ends(std::integral_constant<std::size_t, 4>{});
-  } else {
-    for (std::size_t i = 0; i < bytes; ++i) to[i] = field[i];
+  if (const std::uint64_t zeros = zero_bytes(load_word(field)); zeros != 0) {
+    const std::size_t size = size_in(zeros);
+    if (size < kHalf) {
+      to[0] = field[0];
+      to[size / 2] = field[size / 2];
+      to[size - 1] = '\0';
+      return;
+    }
+    copy(0, half);
+    return copy(size - kHalf, half);
   }
+  copy(0, whole);
+  if (const std::uint64_t zeros = zero_bytes(load_word(field + kWord)); zeros != 0) {
+    return copy(size_in(zeros), whole);
+  }
+  copy(kWord, whole);
+  static_assert(TEVPF_NAME_SIZE == 2 * kWord + kHalf);
+  copy(kHalf + size_in(zero_bytes(load_word(field + kWord + kHalf))), whole);
 }
 
 // Whether a field holds exactly this text; always false for texts of 8 or more characters. Most

@@ -46,7 +46,8 @@ struct SequencePlace {
 // it does not, it must hold for none. Each step makes three probes whose cache misses overlap and
 // quarters what is left; no branch depends on an answer.
 template <class IsLess>
-std::int32_t count_less(std::int32_t length, IsLess is_less) noexcept {
+[[gnu::always_inline]] inline std::int32_t count_less(std::int32_t length,
+                                                      IsLess is_less) noexcept {
   std::int32_t first = 0;  // the answer is one of `length` places from there on, or behind them
   const auto less = [&](std::int32_t place) {
     return static_cast<std::int32_t>(is_less(first + place - 1));
