@@ -2,7 +2,10 @@
 #include <gtest/gtest.h>
 #include <windows.h>
 
+#include <array>
+#include <cstdio>
 #include <cstdlib>
+#include <cstring>
 #include <filesystem>
 #include <random>
 #include <thread>
@@ -42,22 +45,28 @@ class WindowsFilesTest : public LibraryTest {
   static constexpr const char* kSavesVariable = "TEVPF_TEST_SAVES";
   static constexpr const char* kSavesBegin = "tevpf_test_saves_begin";
 
-  static constexpr std::int32_t kRows = 250'000;
+  static constexpr std::int32_t kRows = 8192;
+  using LargeRow = std::array<char, 1024>;
 
-  // The current file: a megabyte of rows.
+  // The current file: eight megabytes, so that a save takes many writes.
   static void make_large(const std::string& path) {
     ASSERT_EQ(TEV8R1_PF_open(path.c_str()), PF_NEWFILE);
     ASSERT_EQ(TEV8R1_PF_create_elem("t", "", PF_ELEM_TABLE), PF_NORMAL);
-    const TEVPF_COL_DEF column = tevpf::col("i", PF_TYPE_INT, 6, {0, 1e6});
+    const TEVPF_COL_DEF column = tevpf::col("s", PF_TYPE_STRING, sizeof(LargeRow) - 1);
     ASSERT_EQ(TEV8R1_PF_def_column("t", column), PF_NORMAL);
-    for (std::int32_t i = 0; i < kRows; ++i) ASSERT_EQ(TEV8R1_PF_add_row("t", &i), PF_NORMAL);
+    for (std::int32_t i = 0; i < kRows; ++i) {
+      LargeRow row{};
+      std::snprintf(row.data(), row.size(), "%d", i);
+      ASSERT_EQ(TEV8R1_PF_add_row("t", row.data()), PF_NORMAL);
+    }
   }
   // Moves all rows but one, which is first or last.
   static TEVPF_STATUS save_the_other_content() {
-    std::int32_t first = -1;
-    TEV8R1_PF_get_row_by_pos("t", 0, &first);
+    LargeRow first{};
+    TEV8R1_PF_get_row_by_pos("t", 0, first.data());
+    const bool is_first = std::strcmp(first.data(), "0") == 0;
     const TEVPF_STATUS moved =
-        first == 0 ? TEV8R1_PF_move_row("t", 0, PF_END_POS) : TEV8R1_PF_move_row("t", kRows - 1, 0);
+        is_first ? TEV8R1_PF_move_row("t", 0, PF_END_POS) : TEV8R1_PF_move_row("t", kRows - 1, 0);
     return moved == PF_NORMAL ? TEV8R1_PF_save(nullptr) : moved;
   }
 
