@@ -22,7 +22,7 @@ namespace tevpf {
 inline constexpr std::int32_t kSearchesPerGathering = 2;
 #else
 // Gathering the keys of a block costs about as much as this many searches without them.
-inline constexpr std::int32_t kSearchesPerGathering = 2;
+inline constexpr std::int32_t kSearchesPerGathering = 4;
 #endif
 
 // Probes that reach values through the items.
