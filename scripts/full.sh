@@ -20,8 +20,6 @@ scripts/install-packages.sh build test fuzz browser
 echo "== kill sweep"
 cmake --build --preset dev --target save_once
 tests/robustness/kill_sweep.py build/dev/tests/robustness/save_once
-cmake --build --preset wine --target save_once
-tests/robustness/kill_sweep.py scripts/wine.sh build/wine/save_once.exe
 
 echo "== report in a browser"
 # The packages of Debian are for its own Python.
