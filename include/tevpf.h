@@ -213,9 +213,9 @@ TEVPF_API TEVPF_STATUS TEV8R1_PF_init(void) TEVPF_NOEXCEPT;
 /* Opens a parameter file and makes it current. A missing file is created, empty and exclusively: if
  * another process creates it at the same time, that file is opened. A file that may be written but
  * not read counts as missing and is emptied. O(file size).
- *   name  path. A leading "$NAME", up to the first "/", is replaced by the value of the environment
- *         variable "$NAME", whose name includes the "$". The result has at most 257 bytes and is
- *         the file's name from then on.
+ *   name  path, on Windows in UTF-8. A leading "$NAME", up to the first "/", is replaced by the value
+ *         of the environment variable "$NAME", whose name includes the "$". The result has at most
+ *         257 bytes and is the file's name from then on.
  *   PF_NEWFILE    open, new and empty. If the file is closed without having been saved, it is
  *                 removed, provided that the name still stands for the file that was created
  *   PF_FILEOPEN   already open under this name; the current file stays current

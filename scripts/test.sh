@@ -3,7 +3,7 @@
 #   dev     64-bit debug build            asan    the same under address and UB sanitizers
 #   x86     32-bit x86 build              mingw   32-bit Windows cross-build, its DLL checked
 # On request:
-#   wine    64-bit Windows build, its tests run by Wine
+#   wine    64-bit Windows build, its tests and transcripts run by Wine
 #   clang   64-bit build by clang with libc++
 #   arm64   64-bit ARM build, its tests run by QEMU
 # The last lines are ctest's summary over all legs.

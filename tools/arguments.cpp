@@ -186,13 +186,12 @@ void exclude_each_other(CLI::App& app, const std::vector<const char*>& names) {
   }
 }
 
-// The command line, last word first, as CLI11 wants it. Of "--units=" it would take the next word for the
-// value, so such an option and its empty value become two words.
-std::vector<std::string> reversed_words(int argc, const char* const* argv) {
+// The words of a command line, the last one first, as CLI11 wants them. Of "--units=" it would take
+// the next word for the value, so such an option and its empty value become two words.
+std::vector<std::string> reversed(std::vector<std::string> line) {
   std::vector<std::string> words;
   bool may_be_option = true;
-  for (int i = 1; i < argc; ++i) {
-    std::string word = argv[i];
+  for (std::string& word : line) {
     may_be_option = may_be_option && word != "--";
     const bool is_empty = may_be_option && word.starts_with("--") && word.ends_with('=') &&
                           std::count(word.begin(), word.end(), '=') == 1;
@@ -206,7 +205,7 @@ std::vector<std::string> reversed_words(int argc, const char* const* argv) {
 
 }  // namespace
 
-bool read_arguments(const Command& command, int argc, const char* const* argv, Arguments& arguments,
+bool read_arguments(const Command& command, std::vector<std::string> words, Arguments& arguments,
                     ExitStatus& status) {
   CLI::App app(command.help, std::string("tevpf ") + command.name);
   app.allow_windows_style_options(false);
@@ -215,7 +214,7 @@ bool read_arguments(const Command& command, int argc, const char* const* argv, A
   exclude_each_other(app, {"--csv", "--json"});
   exclude_each_other(app, {"--before", "--after", "--position"});
   try {
-    app.parse(reversed_words(argc, argv));
+    app.parse(reversed(std::move(words)));
     return true;
   } catch (const CLI::CallForHelp&) {
     print(app.help());

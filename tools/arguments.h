@@ -5,9 +5,9 @@
 
 namespace tool {
 
-// Reads what stands behind the command's name. Prints help, or what is wrong, and returns false
+// Reads the words that stand behind the command's name. Prints help, or what is wrong, and returns false
 // with the exit status when there is nothing to run.
-bool read_arguments(const Command& command, int argc, const char* const* argv, Arguments& arguments,
+bool read_arguments(const Command& command, std::vector<std::string> words, Arguments& arguments,
                     ExitStatus& status);
 
 }  // namespace tool

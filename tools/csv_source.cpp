@@ -16,13 +16,13 @@ namespace tool {
 CsvSource::CsvSource(const std::string& path)
     : path_(path),
       name_(path == "-" ? "standard input" : visible(path)),
-      stream_(path == "-" ? stdin : std::fopen(path.c_str(), "rb")) {
+      stream_(path == "-" ? stdin : open_file(path_of(path), "rb")) {
   if (stream_ == nullptr) fail();
   std::setvbuf(stream_.get(), nullptr, _IONBF, 0);  // blocks are large
-  can_seek_ = std::fgetpos(stream_.get(), &start_) == 0;
+  can_seek_ = can_seek(stream_.get()) && std::fgetpos(stream_.get(), &start_) == 0;
   std::error_code ignored;
-  if (path != "-" && fs::is_regular_file(path, ignored)) {
-    const std::uintmax_t bytes = fs::file_size(path, ignored);
+  if (path != "-" && fs::is_regular_file(path_of(path), ignored)) {
+    const std::uintmax_t bytes = fs::file_size(path_of(path), ignored);
     if (!ignored) size_ = bytes;
   }
 }

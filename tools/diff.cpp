@@ -6,6 +6,7 @@
 #include "comparison.h"
 #include "json.h"
 #include "output.h"
+#include "platform.h"
 #include "text.h"
 
 namespace tool {
@@ -35,12 +36,12 @@ std::string json_of(const Difference& d) {
 ExitStatus run_diff(const Arguments& arguments) {
   const tevpf::File before = open_to_read(arguments.file);
   std::error_code ignored;
-  if (std::filesystem::equivalent(arguments.file, arguments.other, ignored)) {
+  if (std::filesystem::equivalent(path_of(arguments.file), path_of(arguments.other), ignored)) {
     if (arguments.json) print("[]\n");
     return finish_reading(before);
   }
   const tevpf::File after = open_to_read(arguments.other);
-  Output output({}, before.name());
+  Output output({}, path_of(before.name()));
   bool is_same = true;
   const char* separator = "[\n";
   compare(before, after, [&](const Difference& difference) {

@@ -54,8 +54,8 @@ ExitStatus run_dump(const Arguments& arguments) {
   if (!arguments.force) {
     refuse_flood(file, element ? std::vector{*element} : file.elements());
   }
-  Output output(arguments.output, file.name());
-  const auto dump = [&](const std::string& path) {
+  Output output(arguments.output, path_of(file.name()));
+  const auto dump = [&](const std::filesystem::path& path) {
     if (!element) {
       file.dump(path);
     } else if (element->kind == tevpf::Kind::list) {

@@ -9,6 +9,7 @@
 #include "list_csv.h"
 #include "names.h"
 #include "output.h"
+#include "platform.h"
 #include "progress.h"
 #include "text.h"
 
@@ -72,13 +73,13 @@ void export_table(CsvWriter& writer, const tevpf::File& file, const tevpf::Table
 ExitStatus export_as_json(const Arguments& arguments) {
   const tevpf::File file = open_to_read(arguments.file);
   if (arguments.element.empty()) {
-    Output output(arguments.output, file.name());
+    Output output(arguments.output, path_of(file.name()));
     write_file_json(output, file);
     output.finish();
     return finish_reading(file);
   }
   const tevpf::Element element = find_element(file, arguments.element, arguments.kind());
-  Output output(arguments.output, file.name());
+  Output output(arguments.output, path_of(file.name()));
   write_element_json(output, file, element);
   output.write("\n");
   output.finish();
@@ -95,7 +96,7 @@ ExitStatus run_export(const Arguments& arguments) {
   const CsvStyle style = style_of(arguments);
   const tevpf::File file = open_to_read(arguments.file);
   const tevpf::Element element = find_element(file, arguments.element, arguments.kind());
-  Output output(arguments.output, file.name());
+  Output output(arguments.output, path_of(file.name()));
   CsvWriter writer(output, style);
   if (element.kind == tevpf::Kind::list) {
     if (!arguments.columns.empty()) {

@@ -25,13 +25,13 @@ void check_length(const std::string& path) {
 // Why the library could not open a file.
 std::string obstacle_to_opening(const std::string& path) {
   std::error_code error;
-  const fs::file_type type = fs::status(path, error).type();
+  const fs::file_type type = fs::status(path_of(path), error).type();
   if (type == fs::file_type::not_found) return "there is no such file; 'tevpf new' makes one";
   if (!error && type != fs::file_type::regular) {
     return "it is not a regular file; name a parameter file";
   }
   if (!error) {
-    if (std::FILE* const readable = std::fopen(path.c_str(), "rb")) {
+    if (std::FILE* const readable = open_file(path_of(path), "rb")) {
       std::fclose(readable);
       return "it cannot be opened or read to its end; check its disk";
     }
@@ -43,7 +43,7 @@ std::string obstacle_to_opening(const std::string& path) {
 tevpf::File open(const std::string& path) {
   check_length(path);
   try {
-    return tevpf::File::recover(path);
+    return tevpf::File::recover(path_of(path));
   } catch (const tevpf::Error& error) {
     throw Failure(kUnreadable,
                   visible(path) + ": " +
@@ -74,8 +74,8 @@ struct Stamp {
   fs::file_time_type written;
   explicit Stamp(const std::string& path) {
     std::error_code ignored;
-    size = fs::file_size(path, ignored);
-    written = fs::last_write_time(path, ignored);
+    size = fs::file_size(path_of(path), ignored);
+    written = fs::last_write_time(path_of(path), ignored);
   }
   bool operator==(const Stamp&) const = default;
 };
@@ -122,7 +122,7 @@ tevpf::File open_undamaged(const std::string& path) {
 
 void refuse_same_file(const std::string& read, const std::string& changed) {
   std::error_code ignored;
-  if (!fs::equivalent(read, changed, ignored)) return;
+  if (!fs::equivalent(path_of(read), path_of(changed), ignored)) return;
   throw Failure(kRefused,
                 visible(read) + " and " + visible(changed) + " are one file; name another one");
 }
@@ -152,7 +152,7 @@ void save(tevpf::File& file) {
 }
 
 void take_lock(const std::string& path, std::optional<FileLock>& lock) {
-  lock.emplace(path, [&] {
+  lock.emplace(path_of(path), [&] {
     if (!is_terminal(stderr)) return;
     std::fprintf(stderr, "tevpf: %s: another program changes it; waiting\n", visible(path).c_str());
   });
@@ -170,7 +170,7 @@ void take_lock(const std::string& path, std::optional<FileLock>& lock) {
 
 bool exists(const std::string& path) {
   std::error_code ignored;
-  return fs::symlink_status(path, ignored).type() != fs::file_type::not_found;
+  return fs::symlink_status(path_of(path), ignored).type() != fs::file_type::not_found;
 }
 
 bool change_file(const Target& target, Missing missing,
@@ -204,14 +204,14 @@ void report(const Target& target, const std::string& done) {
 NewFile NewFile::create(const std::string& path) {
   check_length(path);
   std::error_code error;
-  if (fs::symlink_status(path, error).type() != fs::file_type::not_found) {
+  if (fs::symlink_status(path_of(path), error).type() != fs::file_type::not_found) {
     throw Failure(kRefused, visible(path) + ": it " +
                                 (error ? "cannot be looked at: " + error.message()
                                        : "exists already; choose another name or remove it first"));
   }
   const HoldInterrupts hold;  // until the file is known as one to remove
   try {
-    return {path, tevpf::File::create(unused_path_beside(path))};
+    return {path, tevpf::File::create(unused_path_beside(path_of(path)))};
   } catch (const tevpf::Error&) {
     throw Failure(kCannotWrite,
                   visible(path) + ": it cannot be created; make room or choose another folder");
@@ -219,7 +219,7 @@ NewFile NewFile::create(const std::string& path) {
 }
 
 NewFile::NewFile(const std::string& path, tevpf::File file)
-    : path_(path), temp_(file.name()), file_(std::move(file)) {}
+    : path_(path), temp_(path_of(file.name())), file_(std::move(file)) {}
 
 std::error_code NewFile::save() {
   const HoldInterrupts hold;
@@ -229,7 +229,7 @@ std::error_code NewFile::save() {
     throw save_failure(path_, obstacle_to_saving(error), OnDisk::kAsBefore);
   }
   file_.close();
-  if (!rename_to_new(temp_.path(), path_)) {
+  if (!rename_to_new(temp_.path(), path_of(path_))) {
     const std::error_code error = last_error();
     if (error == std::errc::file_exists) return error;
     throw save_failure(path_, error.message(), OnDisk::kAsBefore);
@@ -252,7 +252,7 @@ std::string damage_of(const tevpf::File& file) {
 
 std::uintmax_t size_on_disk(const tevpf::File& file) {
   std::error_code error;
-  const std::uintmax_t bytes = fs::file_size(file.name(), error);
+  const std::uintmax_t bytes = fs::file_size(path_of(file.name()), error);
   return error ? 0 : bytes;
 }
 

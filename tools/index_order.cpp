@@ -112,7 +112,8 @@ std::int32_t display_width_of(const tevpf::Table& table) {
 void restore_display_width(const tevpf::Table& table) {
   tevpf::Listing listing;
   listing.last = 0;
-  collect([&](const std::string& path) { table.print(path, listing); }, [](std::string_view) {});
+  collect([&](const std::filesystem::path& path) { table.print(path, listing); },
+          [](std::string_view) {});
 }
 
 }  // namespace tool

@@ -4,6 +4,7 @@
 #include "files.h"
 #include "json.h"
 #include "output.h"
+#include "platform.h"
 #include "text.h"
 #include "text_table.h"
 #include "values.h"
@@ -145,7 +146,7 @@ void write_definitions_json(Output& output, const tevpf::File& file,
 ExitStatus info_of_element(const Arguments& arguments) {
   const tevpf::File file = open_to_read(arguments.file);
   const tevpf::Element element = find_element(file, arguments.element, arguments.kind());
-  Output output({}, file.name());
+  Output output({}, path_of(file.name()));
   if (arguments.json) {
     write_definitions_json(output, file, element);
   } else if (arguments.names) {
@@ -163,7 +164,7 @@ ExitStatus run_info(const Arguments& arguments) {
   if (!arguments.element.empty()) return info_of_element(arguments);
   const tevpf::File file = open_to_read(arguments.file);
   const std::vector<tevpf::Element> elements = file.elements();
-  Output output({}, file.name());
+  Output output({}, path_of(file.name()));
   if (arguments.json) {
     write_json(output, file, elements);
   } else if (arguments.names) {

@@ -21,7 +21,7 @@ struct CloseFile {
 
 std::string read_whole(const std::string& path, const std::string& advice) {
   const std::unique_ptr<std::FILE, CloseFile> stream{path == "-" ? stdin
-                                                                 : std::fopen(path.c_str(), "rb")};
+                                                                 : open_file(path_of(path), "rb")};
   std::string text;
   std::array<char, 65536> block;
   while (stream) {

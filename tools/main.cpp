@@ -55,8 +55,8 @@ std::vector<std::string> names_of(std::span<const Command> commands) {
   return names;
 }
 
-int run(int argc, char** argv) {
-  const std::string name = argc > 1 ? argv[1] : "";
+int run(const std::vector<std::string>& words) {
+  const std::string name = words.size() > 1 ? words[1] : "";
   if (name == "--help" || name == "-h" || name == "help") {
     tool::print(overview());
     return tool::kDone;
@@ -78,7 +78,8 @@ int run(int argc, char** argv) {
   }
   tool::Arguments arguments;
   auto status = tool::kDone;
-  if (!tool::read_arguments(*command, argc - 1, argv + 1, arguments, status)) return status;
+  if (!tool::read_arguments(*command, {words.begin() + 2, words.end()}, arguments, status))
+    return status;
   try {
     return command->run(arguments);
   } catch (const tevpf::Error& error) {
@@ -91,7 +92,7 @@ int run(int argc, char** argv) {
 int main(int argc, char** argv) {
   try {
     tool::prepare_process();
-    return run(argc, argv);
+    return run(tool::command_line(argc, argv));
   } catch (const tool::ClosedPipe&) {
     return tool::kDone;
   } catch (const tool::Failure& failure) {

@@ -26,7 +26,7 @@ fs::path followed(const fs::path& path) {
 Output::Output(const std::string& name, const fs::path& source) : name_(name) {
   if (name.empty() || name == "-") {
     if (!source.empty() && stdout_is(source)) {
-      throw Failure(kRefused, "standard output is " + in_quotes(source.string()) +
+      throw Failure(kRefused, "standard output is " + in_quotes(name_of(source)) +
                                   " itself; send the output to another file");
     }
     stream_ = stdout;
@@ -35,14 +35,14 @@ Output::Output(const std::string& name, const fs::path& source) : name_(name) {
     return;
   }
   std::error_code ignored;
-  if (fs::equivalent(name, source, ignored)) {
-    throw Failure(kRefused, "-o names " + in_quotes(source.string()) +
+  if (fs::equivalent(path_of(name), source, ignored)) {
+    throw Failure(kRefused, "-o names " + in_quotes(name_of(source)) +
                                 " itself; the output would destroy it, so choose another file");
   }
-  target_ = followed(name);
+  target_ = followed(path_of(name));
   if (!fs::exists(target_, ignored) || fs::is_regular_file(target_, ignored)) {
     if (fs::exists(target_, ignored)) {
-      std::FILE* writable = std::fopen(name.c_str(), "r+b");
+      std::FILE* writable = open_file(path_of(name), "r+b");
       if (writable == nullptr) fail(last_error());
       std::fclose(writable);
     }
@@ -50,7 +50,7 @@ Output::Output(const std::string& name, const fs::path& source) : name_(name) {
     stream_ = temp_->stream();
     return;
   }
-  stream_ = std::fopen(target_.string().c_str(), "wb");
+  stream_ = open_file(target_, "wb");
   if (stream_ == nullptr) fail(last_error());
   to_terminal_ = is_terminal(stream_);
 }
@@ -71,7 +71,7 @@ void Output::fail(const std::error_code& error) {
 }
 
 void Output::put(std::string_view text) {
-  if (std::fwrite(text.data(), 1, text.size(), stream_) != text.size()) fail(last_error());
+  if (std::fwrite(text.data(), 1, text.size(), stream_) != text.size()) fail(write_error(stream_));
 }
 
 // The user's pager, where one is wanted.
@@ -104,7 +104,7 @@ void Output::write(std::string_view text) {
 void Output::finish() {
   put(std::exchange(held_, {}));
   put(visible_lines(line_));
-  if (std::fflush(stream_) != 0) fail(last_error());
+  if (std::fflush(stream_) != 0) fail(write_error(stream_));
   if (temp_) {
     if (const std::error_code error = temp_->replace_target()) fail(error);
     return;

@@ -1,8 +1,9 @@
-// What the standard library does not say about terminals, pipes, signals and files. The only file
-// with a branch for Windows.
+// What the standard library does not say about terminals, pipes, signals and files. What differs between
+// Windows and other systems stands in platform_windows.cpp and platform_posix.cpp alone.
 #pragma once
 
 #include <cstddef>
+#include <cstdint>
 #include <cstdio>
 #include <filesystem>
 #include <functional>
@@ -10,13 +11,26 @@
 #include <string>
 #include <string_view>
 #include <system_error>
+#include <vector>
 
 namespace tool {
+
+// A name as it is given, in UTF-8 on Windows and in bytes elsewhere, as a path and back. A narrow text
+// handed to a path directly would be in the system's code page.
+std::filesystem::path path_of(const std::string& name);
+std::string name_of(const std::filesystem::path& path);
 
 // What errno says.
 std::error_code last_error();
 
-// To be called first. Standard output carries bytes unchanged; a closed pipe and a size limit are
+// Why writing to a stream failed. Of some systems, errno does not tell that a pipe's reader has gone.
+std::error_code write_error(std::FILE* stream);
+
+// The words of the command line in UTF-8, the program's name in front. `count` and `given` are what
+// main() was given.
+std::vector<std::string> command_line(int count, const char* const* given);
+
+// To be called first. The standard streams carry bytes unchanged; a closed pipe and a size limit are
 // errors of writing, not signals; an interrupt removes the file that remove_on_interrupt names,
 // unless interrupts were ignored when the program started.
 void prepare_process();
@@ -54,7 +68,13 @@ class HoldInterrupts {
 };
 
 // A path for a temporary file in the folder of `target`: random, so that it is free in practice.
-std::string unused_path_beside(const std::filesystem::path& target);
+std::filesystem::path unused_path_beside(const std::filesystem::path& target);
+
+// What std::fopen does.
+std::FILE* open_file(const std::filesystem::path& name, const char* mode);
+
+// The stream can be read a second time from its beginning.
+bool can_seek(std::FILE* stream);
 
 // Creates a file that was not there, readable by this user alone, and opens it for reading and
 // writing. Null: errno says why.
@@ -78,7 +98,7 @@ class FileLock {
   enum class State { kHeld, kNoFile, kRefused };
 
   // Waits until it is free; `wait_begins` is called when that is not at once.
-  FileLock(const std::filesystem::path& file, const std::function<void()>& wait_begins);
+  FileLock(const std::filesystem::path& path, const std::function<void()>& wait_begins);
   ~FileLock();
   FileLock(const FileLock&) = delete;
   FileLock& operator=(const FileLock&) = delete;
@@ -87,13 +107,14 @@ class FileLock {
   const std::error_code& error() const { return error_; }  // why it is not held
 
  private:
-  int file_ = -1;
+  static constexpr std::intptr_t kNone = -1;
+  std::intptr_t lock_ = kNone;  // what the system calls it
   State state_ = State::kHeld;
   std::error_code error_;
 };
 
 // Calls `make` with a path to write to, and `take` with all that is written there, as it comes.
-void collect(const std::function<void(const std::string& path)>& make,
+void collect(const std::function<void(const std::filesystem::path& path)>& make,
              const std::function<void(std::string_view)>& take);
 
 }  // namespace tool

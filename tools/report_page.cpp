@@ -44,7 +44,7 @@ void write_head(Output& output, const std::string& title) {
 std::string last_change(const std::string& path) {
   namespace chrono = std::chrono;
   std::error_code error;
-  const fs::file_time_type time = fs::last_write_time(path, error);
+  const fs::file_time_type time = fs::last_write_time(path_of(path), error);
   if (error) return {};
   const auto minute = chrono::floor<chrono::minutes>(chrono::file_clock::to_sys(time));
   const auto day = chrono::floor<chrono::days>(minute);
@@ -107,7 +107,7 @@ void write_page(Output& output, const tevpf::File& file, std::size_t most_rows) 
   for (const tevpf::Element& element : elements) {
     sections.push_back({file, element, "e" + std::to_string(sections.size() + 1), most_rows});
   }
-  const std::string title = html_text(fs::path(file.name()).filename().string());
+  const std::string title = html_text(name_of(path_of(file.name()).filename()));
   write_head(output, title);
   write_title(output, file, title, elements);
   output.write("<main>\n");

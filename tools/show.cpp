@@ -4,6 +4,7 @@
 #include "commands.h"
 #include "element_json.h"
 #include "output.h"
+#include "platform.h"
 #include "selection.h"
 #include "summary.h"
 #include "text.h"
@@ -91,7 +92,7 @@ void show_parameters(Output& output, const tevpf::List& list, const tevpf::Eleme
 ExitStatus run_show(const Arguments& arguments) {
   tevpf::File file = open_to_read(arguments.file);
   const tevpf::Element element = find_element(file, arguments.element, arguments.kind());
-  Output output({}, file.name());
+  Output output({}, path_of(file.name()));
   if (element.kind == tevpf::Kind::list) {
     show_parameters(output, file.list(element.name), element, arguments);
   } else {

@@ -150,7 +150,7 @@ class Sources {
     if (!arguments.no_lock) lock(arguments);
     add(arguments.file, "main");
     for (const std::string& path : arguments.with) {
-      add(path, std::filesystem::path(path).stem().string());
+      add(path, name_of(path_of(path).stem()));
     }
   }
 
@@ -180,9 +180,9 @@ class Sources {
     std::set<std::string> paths;
     std::error_code ignored;
     for (const std::string& path : arguments.with) {
-      paths.insert(std::filesystem::weakly_canonical(path, ignored).string());
+      paths.insert(name_of(std::filesystem::weakly_canonical(path_of(path), ignored)));
     }
-    paths.insert(std::filesystem::weakly_canonical(arguments.file, ignored).string());
+    paths.insert(name_of(std::filesystem::weakly_canonical(path_of(arguments.file), ignored)));
     for (const std::string& path : paths) take_lock(path, locks_.emplace_back());
   }
 

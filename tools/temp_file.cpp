@@ -10,7 +10,7 @@ namespace fs = std::filesystem;
 
 namespace tool {
 
-TempName::TempName(std::string path) : path_(std::move(path)) { remove_on_interrupt(path_); }
+TempName::TempName(fs::path path) : path_(std::move(path)) { remove_on_interrupt(path_); }
 
 TempName::~TempName() {
   if (path_.empty()) return;
@@ -26,13 +26,13 @@ void TempName::forget() {
 
 TempFile::TempFile(fs::path target) : target_(std::move(target)) {
   const HoldInterrupts hold;  // until the file is known as one to remove
-  std::string path = unused_path_beside(target_);
+  fs::path path = unused_path_beside(target_);
   stream_ = create_private_file(path);
   if (stream_ == nullptr) {
     const std::error_code error = last_error();
     const fs::path folder = target_.parent_path();
     throw Failure(kCannotWrite, "cannot create a file in " +
-                                    in_quotes(folder.empty() ? "." : folder.string()) + ": " +
+                                    in_quotes(folder.empty() ? "." : name_of(folder)) + ": " +
                                     error.message() + "; make room or choose another folder");
   }
   name_.emplace(std::move(path));

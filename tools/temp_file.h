@@ -13,16 +13,16 @@ namespace tool {
 // The name of a file that this program has made, and removes again.
 class TempName {
  public:
-  explicit TempName(std::string path);
+  explicit TempName(std::filesystem::path path);
   TempName(const TempName&) = delete;
   TempName& operator=(const TempName&) = delete;
   ~TempName();
 
-  const std::string& path() const { return path_; }
+  const std::filesystem::path& path() const { return path_; }
   void forget();  // it stands for the file no longer
 
  private:
-  std::string path_;  // empty: forgotten
+  std::filesystem::path path_;  // empty: forgotten
 };
 
 // A file that takes the place of another one. This user's alone until then, and opened once:

@@ -30,7 +30,8 @@ class Replacement {
     kFailed,       // the image did not reach the disk; the file is as it was
   };
   // Completes the image; the caller has flushed its stream. `old` is the caller's stream of the file
-  // that is replaced, or null. Windows replaces no open file: there, it is closed and set to null.
+  // that is replaced, or null. Windows replaces no open file: there, it is closed and set to null, or
+  // to a new stream of the file when that is as it was.
   [[nodiscard]] Outcome put_in_place(std::FILE*& old) noexcept;
 
   // Transfers ownership of the stream, which refers to the new file once it is in place. Null if it

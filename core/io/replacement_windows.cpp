@@ -84,6 +84,27 @@ bool take_over(wchar_t* image, wchar_t* target) noexcept {
   return error == ERROR_SUCCESS;
 }
 
+// The system does not allow replacing the file: it is in use, or may not be changed so. The disk is not
+// at fault.
+bool may_be_written_plainly(DWORD error) noexcept {
+  return error == ERROR_ACCESS_DENIED || error == ERROR_SHARING_VIOLATION ||
+         error == ERROR_LOCK_VIOLATION || error == ERROR_USER_MAPPED_FILE ||
+         error == ERROR_NOT_SAME_DEVICE;
+}
+
+// Programs that look at every new file, such as virus scanners, have it open for a moment.
+DWORD move_over(const wchar_t* image, const wchar_t* target) noexcept {
+  constexpr DWORD kLongestPause = 128;  // milliseconds; twice as long in all
+  for (DWORD pause = 1;; pause *= 2) {
+    if (MoveFileExW(image, target, MOVEFILE_REPLACE_EXISTING | MOVEFILE_WRITE_THROUGH)) {
+      return ERROR_SUCCESS;
+    }
+    const DWORD error = GetLastError();
+    if (!may_be_written_plainly(error) || pause > kLongestPause) return error;
+    Sleep(pause);
+  }
+}
+
 }  // namespace
 
 Replacement::Replacement(const char* name) noexcept {
@@ -115,11 +136,14 @@ Replacement::Outcome Replacement::put_in_place(std::FILE*& old) noexcept {
   const bool is_flushed = _commit(_fileno(stream_)) == 0;
   const bool is_closed = std::fclose(release_stream()) == 0;
   if (!is_flushed || !is_closed) return Outcome::kFailed;
-  if (old != nullptr) std::fclose(old);
+  const bool had_old = old != nullptr;
+  if (had_old) std::fclose(old);
   old = nullptr;
-  if (!MoveFileExW(image_, target_, MOVEFILE_REPLACE_EXISTING | MOVEFILE_WRITE_THROUGH)) {
+  if (const DWORD error = move_over(image_, target_); error != ERROR_SUCCESS) {
     discard();  // it may occupy the space that a plain write needs
-    return Outcome::kNotPossible;
+    if (may_be_written_plainly(error)) return Outcome::kNotPossible;
+    if (had_old) old = _wfopen(target_, L"r+b");
+    return Outcome::kFailed;
   }
   image_[0] = L'\0';
   stream_ = _wfopen(target_, L"r+b");

@@ -143,7 +143,7 @@ class File {
 
 // The library would read a leading "$" as that of an environment variable.
 inline std::string File::name_of(const std::filesystem::path& path) {
-  std::string name = path.string();
+  std::string name = detail::name_of(path);
   return name.starts_with('$') ? "./" + name : name;
 }
 
@@ -264,7 +264,7 @@ inline void File::save() {
 
 inline void File::save_copy(const std::filesystem::path& path) const {
   file_->select();
-  detail::check(TEV8R1_PF_save(path.string().c_str()));
+  detail::check(TEV8R1_PF_save(detail::name_of(path).c_str()));
 }
 
 // ---- Implementation: elements -------------------------------------------------------------------
@@ -351,7 +351,7 @@ inline void File::remove_table(std::string_view name) {
 
 inline void File::dump(const std::filesystem::path& path) const {
   file_->select();
-  detail::check(TEV8R1_PF_dump_file(path.string().c_str()));
+  detail::check(TEV8R1_PF_dump_file(detail::name_of(path).c_str()));
 }
 
 }  // namespace v1

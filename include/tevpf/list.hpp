@@ -321,7 +321,7 @@ inline void List::describe(std::string_view description) {
 }
 
 inline void List::dump(const std::filesystem::path& path) const {
-  detail::check(TEV8R1_PF_dump_list(select(), path.string().c_str()));
+  detail::check(TEV8R1_PF_dump_list(select(), detail::name_of(path).c_str()));
 }
 
 }  // namespace v1

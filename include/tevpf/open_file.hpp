@@ -48,6 +48,13 @@ class NameArg {
 
 namespace detail {
 
+// A path as the C interface takes it: in UTF-8 on Windows, where string() is in the system's code page,
+// and the very bytes elsewhere.
+inline std::string name_of(const std::filesystem::path& path) {
+  const std::u8string name = path.u8string();
+  return {name.begin(), name.end()};
+}
+
 // Counts changes that the C++ interface makes: of rows and their order, and of columns (or of which
 // table a name means). What was read ahead, or is known of columns, is good while they stand still.
 inline std::uint64_t row_changes = 0;

@@ -537,7 +537,7 @@ inline void Table::describe(std::string_view description) {
 }
 
 inline void Table::dump(const std::filesystem::path& path) const {
-  detail::check(TEV8R1_PF_dump_table(table_.select(), path.string().c_str()));
+  detail::check(TEV8R1_PF_dump_table(table_.select(), detail::name_of(path).c_str()));
 }
 
 inline void Table::print(const std::filesystem::path& path, const Listing& listing) const {
@@ -554,7 +554,7 @@ inline void Table::print(const std::filesystem::path& path, const Listing& listi
   const char* const order = listing.ordered_by.empty() ? nullptr : listing.ordered_by.c_str();
   detail::check(TEV8R1_PF_define_table_search(table_.name().c_str(), order));
   detail::check(TEV8R1_PF_print_table(
-      table_.name().c_str(), path.string().c_str(), listing.definitions ? 1 : 0,
+      table_.name().c_str(), detail::name_of(path).c_str(), listing.definitions ? 1 : 0,
       static_cast<std::int32_t>(count), names.get(),
       static_cast<std::int32_t>((std::min)(listing.first, last_position)),
       static_cast<std::int32_t>((std::min)(listing.last, last_position))));

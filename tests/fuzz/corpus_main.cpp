@@ -40,7 +40,7 @@ int main(int argc, char** argv) {
   for (const auto& entry : std::filesystem::directory_iterator(argc > 1 ? argv[1] : ".")) {
     std::ifstream file(entry.path(), std::ios::binary);
     const std::string bytes{std::istreambuf_iterator<char>(file), {}};
-    std::printf("%s\n", entry.path().c_str());
+    std::printf("%s\n", entry.path().string().c_str());
     std::fflush(stdout);
     run(bytes);
     for (std::size_t i = inputs % step; i < bytes.size(); i += step) {

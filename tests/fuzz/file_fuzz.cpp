@@ -1,9 +1,8 @@
 // Opens arbitrary bytes as a parameter file and drives whatever was loaded. Nothing may crash, hang,
 // leak or disagree. Input: one byte n, n bytes that choose the changes, then the file.
-#include <unistd.h>
-
 #include <filesystem>
 #include <fstream>
+#include <random>
 
 #include "core/base/heap.h"
 #include "include/tevpf.h"
@@ -12,9 +11,18 @@
 // Rows may be as wide as a file says; what one default row takes is bounded here.
 constexpr std::uint64_t kLargestBlock = 4 << 20;
 
+// In memory where the system has such a place: a fuzzer writes many files.
+static std::string scratch_folder() {
+  std::error_code none;
+  const std::filesystem::path memory = "/dev/shm";
+  const auto parent =
+      std::filesystem::is_directory(memory, none) ? memory : std::filesystem::temp_directory_path();
+  return (parent / ("tevpf_fuzz_" + std::to_string(std::random_device{}()))).string();
+}
+
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
   if (size == 0) return 0;
-  const std::string folder = "/dev/shm/tevpf_fuzz_" + std::to_string(getpid());
+  static const std::string folder = scratch_folder();
   const std::string path = folder + "/file";
   std::filesystem::create_directory(folder);
   const std::string_view input(reinterpret_cast<const char*>(data), size);

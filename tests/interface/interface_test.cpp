@@ -94,6 +94,40 @@ TEST_F(InterfaceTest, SeveralFilesNeedNoCurrentOne) {
   EXPECT_EQ(symbols(first.table("same").ordered_by("melting")), "He Hg Fe ");
 }
 
+// Letters of three scripts, in a folder and in files, by every call that takes a path.
+TEST_F(InterfaceTest, PathsMayHoldAnyLetters) {
+  namespace fs = std::filesystem;
+  const fs::path folder = fs::path(dir_.path()) / u8"M\u00FCller \u6E2C\u5B9A";
+  const std::u8string letter = u8"\u03BC";
+  const fs::path path = folder / (letter + u8".pf"), copy = folder / (letter + u8" copy");
+  fs::create_directory(folder);
+  {
+    File file = File::open_or_create(path);
+    file.create_list("L").add(Parameter("x", 1.5));
+    add_elements(file.create_table("T"));
+    file.save();
+    EXPECT_TRUE(std::u8string(file.name().begin(), file.name().end()) == path.u8string());
+  }
+  File file = File::open(path);
+  file.save_copy(copy);
+  file.dump(folder / (letter + u8" 1"));
+  file.list("L").dump(folder / (letter + u8" 2"));
+  file.table("T").dump(folder / (letter + u8" 3"));
+  file.table("T").print(folder / (letter + u8" 4"));
+  EXPECT_EQ(File::recover(copy).list("L").get<double>("x"), 1.5);
+  EXPECT_THROW(File::create(copy), Error);
+
+  std::vector<fs::path> names;
+  for (const auto& entry : fs::directory_iterator(folder)) {
+    names.push_back(entry.path().filename());
+    EXPECT_GT(fs::file_size(entry.path()), 0u);
+  }
+  std::sort(names.begin(), names.end());
+  const std::vector<fs::path> expected = {letter + u8" 1", letter + u8" 2",    letter + u8" 3",
+                                          letter + u8" 4", letter + u8" copy", letter + u8".pf"};
+  EXPECT_EQ(names, expected);
+}
+
 TEST_F(InterfaceTest, RefusalsSayWhatIsWrongAndChangeNothing) {
   File file = File::create(dir_ / "file");
   List engine = file.create_list("Engine", "First stage");
