@@ -18,7 +18,7 @@ legs=("$@")
 
 declare -A packages=([dev]="test python" [asan]="test python" [x86]="test x86" [mingw]=windows [wine]=wine
   [clang]="test clang" [arm64]="test arm64")
-declare -A options=([dev]=-DTEVPF_BUILD_PYTHON=ON [asan]=-DTEVPF_BUILD_PYTHON=ON)
+declare -A options=([dev]="-DTEVPF_BUILD_PYTHON=ON -DTEVPF_BUILD_ONCE=ON" [asan]=-DTEVPF_BUILD_PYTHON=ON)
 groups=(build tool)
 for leg in "${legs[@]}"; do
   [[ -n ${packages[$leg]:-} ]] || { echo "test.sh: no leg '$leg'; see --help" >&2; exit 2; }
@@ -31,7 +31,8 @@ jobs=$(nproc)
 mkdir -p build/all
 : >build/all/CTestTestfile.cmake
 for leg in "${legs[@]}"; do
-  cmake --preset "$leg" ${options[$leg]:+"${options[$leg]}"}
+  read -ra more <<<"${options[$leg]:-}"
+  cmake --preset "$leg" "${more[@]}"
   cmake --build --preset "$leg" --parallel "$jobs"
   echo "subdirs(../$leg)" >>build/all/CTestTestfile.cmake
 done
