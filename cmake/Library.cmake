@@ -8,6 +8,11 @@ function(tevpf_public_header target)
     "$<INSTALL_INTERFACE:${CMAKE_INSTALL_INCLUDEDIR}>")
 endfunction()
 
+# These have inner names of their neighbours, or the macros of <windows.h>.
+set(apart ${TEVPF_SOURCES})
+list(FILTER apart INCLUDE REGEX "reports/list_dump|tables/table_builder|core/io/(environment|wide_name|.*windows)")
+set_source_files_properties(${apart} PROPERTIES SKIP_UNITY_BUILD_INCLUSION ON)
+
 add_library(tevpf_objects OBJECT ${TEVPF_SOURCES})
 tevpf_library_options(tevpf_objects)
 tevpf_public_header(tevpf_objects)

@@ -24,9 +24,16 @@ endfunction()
 # tevpf_library_options(target): in addition, what the library's own code is compiled with.
 function(tevpf_library_options target)
   tevpf_target_options(${target})
+  # The sources of a folder together. Not where they are optimised: gcc 12 then takes variables for
+  # uninitialised that are not.
+  set(together OFF)
+  if(TEVPF_BUILD_ONCE AND CMAKE_BUILD_TYPE STREQUAL "Debug")
+    set(together ON)
+  endif()
   set_target_properties(${target} PROPERTIES
     POSITION_INDEPENDENT_CODE ON C_VISIBILITY_PRESET hidden
-    CXX_VISIBILITY_PRESET hidden VISIBILITY_INLINES_HIDDEN ON)
+    CXX_VISIBILITY_PRESET hidden VISIBILITY_INLINES_HIDDEN ON
+    UNITY_BUILD ${together} UNITY_BUILD_MODE GROUP)
   target_include_directories(${target} PRIVATE "${PROJECT_SOURCE_DIR}")
   target_compile_definitions(${target} PRIVATE TEVPF_BUILD)
   # The library is loaded into C programs: nothing may be thrown through it.

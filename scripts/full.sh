@@ -2,9 +2,9 @@
 # full.sh [SECONDS]: all checks before a release: the static checks, all builds with all tests, the
 # packages in a fresh Debian (downloaded), the binary interface of version 1.0, a save with a fault at
 # each of its system calls, the page of `tevpf report` in a browser (pictures of it are left in
-# build/report), and each fuzz target for SECONDS (default 1800); last
-# the branch coverage and the planted faults, which take hours. Inputs found by fuzzing are kept in
-# build/fuzz/found; copy them to tests/fuzz/corpus to test them in every run.
+# build/report), each fuzz target for SECONDS (default 1800), and the branch coverage. Inputs found by
+# fuzzing are kept in build/fuzz/found; copy them to tests/fuzz/corpus to test them in every run.
+# The planted faults (scripts/mutation.py) take hours more and are run apart.
 set -euo pipefail
 cd "$(dirname "${BASH_SOURCE[0]}")/.."
 
@@ -45,6 +45,3 @@ done
 
 echo "== branch coverage"
 scripts/coverage.sh
-
-echo "== planted faults"
-scripts/mutation.py
