@@ -1,8 +1,8 @@
 #!/usr/bin/env bash
 # test.sh [LEG...]: installs missing packages, builds, and runs all tests. The legs, all by default:
-#   dev     64-bit debug build            asan    the same under address and UB sanitizers, but for
-#                                                 the tool and Python unless it is named
+#   dev     64-bit debug build            asan    the same under address and UB sanitizers
 #   x86     32-bit x86 build              mingw   32-bit Windows cross-build, its DLL checked
+# The last three build the tool and the Python package only when they are named.
 # On request:
 #   wine    64-bit Windows build, its tests and transcripts run by Wine
 #   clang   64-bit build by clang with libc++
@@ -15,13 +15,14 @@ case ${1:-} in
   -h | --help) sed -n '2,/^set /{/^set /d;s/^# \{0,1\}//;p}' "${BASH_SOURCE[0]}"; exit ;;
 esac
 legs=("$@")
-under_sanitizers=ON  # the tool and the Python package; they take as long as all other legs together
-((${#legs[@]})) || { legs=(dev asan x86 mingw); under_sanitizers=OFF; }
+all=ON
+((${#legs[@]})) || { legs=(dev asan x86 mingw); all=OFF; }
 
 declare -A packages=([dev]="test python" [asan]="test python" [x86]="test x86" [mingw]=windows [wine]=wine
   [clang]="test clang" [arm64]="test arm64")
 declare -A options=([dev]="-DTEVPF_BUILD_PYTHON=ON -DTEVPF_BUILD_ONCE=ON"
-  [asan]="-DTEVPF_BUILD_TOOL=$under_sanitizers -DTEVPF_BUILD_PYTHON=$under_sanitizers")
+  [asan]="-DTEVPF_BUILD_TOOL=$all -DTEVPF_BUILD_PYTHON=$all" [x86]=-DTEVPF_BUILD_TOOL=$all
+  [mingw]=-DTEVPF_BUILD_TOOL=$all)
 groups=(build tool)
 for leg in "${legs[@]}"; do
   [[ -n ${packages[$leg]:-} ]] || { echo "test.sh: no leg '$leg'; see --help" >&2; exit 2; }
