@@ -163,7 +163,14 @@ HoldInterrupts::~HoldInterrupts() {
 
 std::FILE* create_private_file(const fs::path& name) {
   const int file = open(name.c_str(), O_RDWR | O_CREAT | O_EXCL | O_CLOEXEC, 0600);
-  return file < 0 ? nullptr : fdopen(file, "w+b");
+  if (file < 0) return nullptr;
+  std::FILE* const stream = fdopen(file, "w+b");
+  if (stream != nullptr) return stream;
+  const int why = errno;
+  (void)close(file);
+  (void)unlink(name.c_str());  // this call has made it
+  errno = why;
+  return nullptr;
 }
 
 bool copy_rights(std::FILE* stream, const fs::path& like) {

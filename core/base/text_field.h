@@ -41,7 +41,7 @@ void terminate_field(char (&field)[N]) noexcept {
   };
   if (const std::uint64_t zeros = zero_bytes(load_word(field)); zeros != 0) {
     const std::size_t size = size_in(zeros);
-    if (size < kHalf) {
+    if (size < kHalf) {  // one to three bytes, of which some may be the same
       to[0] = field[0];
       to[size / 2] = field[size / 2];
       to[size - 1] = '\0';

@@ -34,6 +34,14 @@ class WindowsFilesTest : public LibraryTest {
     ASSERT_EQ(TEV8R1_PF_create_elem(name, "", PF_ELEM_LIST), PF_NORMAL);
   }
 
+  // As another program has the file open, which keeps it from being replaced.
+  static HANDLE look_at(const std::string& path) {
+    const HANDLE file = CreateFileA(path.c_str(), GENERIC_READ, FILE_SHARE_READ | FILE_SHARE_WRITE,
+                                    nullptr, OPEN_EXISTING, 0, nullptr);
+    EXPECT_NE(file, INVALID_HANDLE_VALUE);
+    return file;
+  }
+
   static std::pair<DWORD, DWORD> identity(HANDLE file) {
     BY_HANDLE_FILE_INFORMATION facts{};
     EXPECT_TRUE(GetFileInformationByHandle(file, &facts));
@@ -135,10 +143,7 @@ TEST_F(WindowsFilesTest, AFileThatIsInUseIsWrittenPlainly) {
   make(at("a"));
   ASSERT_EQ(TEV8R1_PF_open(at("a").c_str()), PF_NORMAL);
   add_list("L2");
-  const HANDLE other =
-      CreateFileA(at("a").c_str(), GENERIC_READ, FILE_SHARE_READ | FILE_SHARE_WRITE, nullptr,
-                  OPEN_EXISTING, 0, nullptr);
-  ASSERT_NE(other, INVALID_HANDLE_VALUE);
+  const HANDLE other = look_at(at("a"));
   EXPECT_EQ(TEV8R1_PF_save(nullptr), PF_NORMAL);
   CloseHandle(other);
   EXPECT_EQ(read_file(at("a")).size(), 240u);
@@ -150,10 +155,7 @@ TEST_F(WindowsFilesTest, AFileThatIsInUseForAMomentIsReplaced) {
   make(at("a"));
   ASSERT_EQ(TEV8R1_PF_open(at("a").c_str()), PF_NORMAL);
   add_list("L2");
-  const HANDLE other =
-      CreateFileA(at("a").c_str(), GENERIC_READ, FILE_SHARE_READ | FILE_SHARE_WRITE, nullptr,
-                  OPEN_EXISTING, 0, nullptr);
-  ASSERT_NE(other, INVALID_HANDLE_VALUE);
+  const HANDLE other = look_at(at("a"));
   const auto old_file = identity(other);
   std::thread scanner([&] {
     Sleep(50);
