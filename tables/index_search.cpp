@@ -4,6 +4,7 @@
 #include <cstddef>
 
 #include "core/sequence/sequence_search.h"
+#include "tables/layout.h"
 #include "tables/row_store.h"
 #include "tables/search_keys.h"
 #include "values/compare.h"
@@ -140,6 +141,29 @@ IndexPlace search_all(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
   return {{found.position}, found.equal};
 }
 
+// Searches all entries except the one at position `without`, probe by probe.
+template <class Key>
+Found search_all_others(const TEVPF_TABLE& table, const TEVPF_COLUMN& column, std::int32_t without,
+                        const Key& key) noexcept {
+  const ValuesOfIndex all = entries_of(table, column);
+  return search_entries(WithoutOne<ValuesOfIndex>{all, without}, table.num_rows - 1, key);
+}
+
+// Whether the value at a position, or at the end, equals the key.
+template <class Key>
+bool equals_at(const TEVPF_TABLE& table, const TEVPF_COLUMN& column, std::int32_t position,
+               const Key& key) noexcept {
+  if (position >= table.num_rows) return false;
+  const Values values = values_of(table, column);
+  if constexpr (Key::kIsNumber) {
+    using T = typename Key::Number;
+    return key.equals(key_at(column.index, position,
+                             [&](std::int32_t slot) { return load<T>(values.of(slot)); }));
+  } else {
+    return key.equals(values.of(column.index.at(position)));
+  }
+}
+
 // ---- Searching along search keys ----------------------------------------------------------------
 
 // The cost of a search, in rows of a sequential scan.
@@ -206,22 +230,31 @@ IndexPlace search_index(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
                   [&](const auto& prepared) { return search_all(table, column, prepared); });
 }
 
-IndexPlace search_others(const TEVPF_TABLE& table, const TEVPF_COLUMN& column, std::int32_t without,
-                         const void* key) noexcept {
-  const std::int32_t others = table.num_rows - 1;
-  if (others < 1) return {{0}, false};
+Found search_others(const TEVPF_TABLE& table, const TEVPF_COLUMN& column, std::int32_t without,
+                    const void* key) noexcept {
+  if (table.num_rows < 2) return {0, false};
   return with_key(column.def.type, column.tolerance, key, readable_bytes(table, column),
-                  [&]<class Key>(const Key& prepared) -> IndexPlace {
-                    const ValuesOfIndex all = entries_of(table, column);
-                    const WithoutOne<ValuesOfIndex> values{all, without};
+                  [&]<class Key>(const Key& prepared) -> Found {
                     if constexpr (Key::kTotalOrder) {
                       const IndexPlace whole = search_all(table, column, prepared);
-                      const std::int32_t at =
-                          whole.place.position - (without < whole.place.position ? 1 : 0);
-                      return {{at}, at < others && prepared.equals(values.at(at))};
+                      const std::int32_t at = whole.place.position;
+                      if (at != without) return {at - (without < at ? 1 : 0), whole.found};
+                      return {at, equals_at(table, column, at + 1, prepared)};
                     } else {
-                      const Found found = search_entries(values, others, prepared);
-                      return {{found.position}, found.equal};
+                      return search_all_others(table, column, without, prepared);
+                    }
+                  });
+}
+
+std::int32_t position_among_others(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
+                                   std::int32_t without, const void* key) noexcept {
+  return with_key(column.def.type, column.tolerance, key, readable_bytes(table, column),
+                  [&]<class Key>(const Key& prepared) -> std::int32_t {
+                    if constexpr (Key::kTotalOrder) {
+                      const std::int32_t at = search_all(table, column, prepared).place.position;
+                      return at - (without < at ? 1 : 0);
+                    } else {
+                      return search_all_others(table, column, without, prepared).position;
                     }
                   });
 }
@@ -260,38 +293,79 @@ constexpr std::int32_t kRowsWorthFetching = 0;
 constexpr std::int32_t kRowsWorthFetching = 50'000;
 #endif
 
-void fetch_places(const TEVPF_TABLE& table, const unsigned char* row) noexcept {
-  constexpr std::int32_t kMost = 4;
-  if (table.num_rows < kRowsWorthFetching) return;
-  const TEVPF_COLUMN* columns[kMost];
-  SearchAhead searches[kMost];
-  std::int32_t count = 0;
-  for (std::int32_t i = 0; i < table.num_cols && count < kMost; ++i) {
-    const TEVPF_COLUMN& column = table.col_array[i];
+namespace {
+
+// Searches that are about to be made, a few of them.
+class SearchesAhead {
+ public:
+  explicit SearchesAhead(const TEVPF_TABLE& table) noexcept
+      : is_worthwhile_(table.num_rows >= kRowsWorthFetching) {}
+
+  // Only blocks with keys are known where to read.
+  void add(const TEVPF_COLUMN& column, const unsigned char* row) noexcept {
     const bool has_keys = is_indexed(column) && column.index.blocks != nullptr &&
                           is_number_type(column.def.type) && !is_floating_type(column.def.type);
-    if (has_keys) columns[count++] = &column;
+    if (has_keys && is_worthwhile_ && count_ < kMost) all_[count_++] = {&column, row, {}};
   }
-  if (count < 2) return;
-  const auto for_each = [&](auto step) {
-    for (std::int32_t i = 0; i < count; ++i) {
-      const TEVPF_COLUMN& column = *columns[i];
+
+  void fetch() noexcept {
+    if (count_ < 2) return;
+    for_each([](SearchAhead& search, const SequenceBlocks& blocks, auto tag, auto is_less) {
+      search.fetch_group<decltype(tag)>(blocks, is_less);
+    });
+    for_each([](SearchAhead& search, const SequenceBlocks&, auto tag, auto is_less) {
+      search.fetch_block<decltype(tag)>(is_less);
+    });
+    for_each([](SearchAhead& search, const SequenceBlocks&, auto tag, auto) {
+      search.fetch_keys<decltype(tag)>();
+    });
+  }
+
+ private:
+  struct Search {
+    const TEVPF_COLUMN* column;
+    const unsigned char* row;
+    SearchAhead ahead;
+  };
+
+  template <class Step>
+  void for_each(Step step) noexcept {
+    for (std::int32_t i = 0; i < count_; ++i) {
+      const TEVPF_COLUMN& column = *all_[i].column;
       with_number(column.def.type, [&](auto tag) {
         using T = decltype(tag);
-        const NumberKey<T> key(row + column.offset, column.tolerance);
-        step(searches[i], *column.index.blocks, tag, [&](T value) { return key.is_above(value); });
+        const NumberKey<T> key(all_[i].row + column.offset, column.tolerance);
+        step(all_[i].ahead, *column.index.blocks, tag,
+             [&](T value) { return key.is_above(value); });
       });
     }
-  };
-  for_each([](SearchAhead& search, const SequenceBlocks& blocks, auto tag, auto is_less) {
-    search.fetch_group<decltype(tag)>(blocks, is_less);
-  });
-  for_each([](SearchAhead& search, const SequenceBlocks&, auto tag, auto is_less) {
-    search.fetch_block<decltype(tag)>(is_less);
-  });
-  for_each([](SearchAhead& search, const SequenceBlocks&, auto tag, auto) {
-    search.fetch_keys<decltype(tag)>();
-  });
+  }
+
+  static constexpr std::int32_t kMost = 4;
+  bool is_worthwhile_;
+  std::int32_t count_ = 0;
+  Search all_[kMost];
+};
+
+}  // namespace
+
+void fetch_places(const TEVPF_TABLE& table, const unsigned char* row) noexcept {
+  SearchesAhead searches(table);
+  for (std::int32_t i = 0; i < table.num_cols; ++i) searches.add(table.col_array[i], row);
+  searches.fetch();
+}
+
+void fetch_places_of_changes(const TEVPF_TABLE& table, const unsigned char* row,
+                             const unsigned char* other_row) noexcept {
+  SearchesAhead searches(table);
+  for (std::int32_t i = 0; i < table.num_cols; ++i) {
+    const TEVPF_COLUMN& column = table.col_array[i];
+    if (!has_same_bytes(column, row, other_row)) {
+      searches.add(column, row);
+      searches.add(column, other_row);
+    }
+  }
+  searches.fetch();
 }
 
 // An entry is among those of equal value, usually near the first. Where many are equal, or values

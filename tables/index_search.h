@@ -25,9 +25,13 @@ struct Found {
 [[nodiscard]] IndexPlace search_index(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
                                       const void* key) noexcept;
 
-// Searches all entries except the one at position `without`; places count as if it were absent.
-[[nodiscard]] IndexPlace search_others(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
-                                       std::int32_t without, const void* key) noexcept;
+// Searches all entries except the one at position `without`; positions count as if it were absent.
+[[nodiscard]] Found search_others(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
+                                  std::int32_t without, const void* key) noexcept;
+// The position alone, which spares reading a value to compare it.
+[[nodiscard]] std::int32_t position_among_others(const TEVPF_TABLE& table,
+                                                 const TEVPF_COLUMN& column, std::int32_t without,
+                                                 const void* key) noexcept;
 
 // Searches the entries from position `first` on, for searches that callers request. A column that
 // is searched often gets search keys, which make each step about four times cheaper in a table
@@ -37,6 +41,9 @@ struct Found {
 
 // Requests the cache lines that searches of all indexes for the values of a row will read.
 void fetch_places(const TEVPF_TABLE& table, const unsigned char* row) noexcept;
+// The same for the indexes of columns in which two rows differ, and the values of both.
+void fetch_places_of_changes(const TEVPF_TABLE& table, const unsigned char* row,
+                             const unsigned char* other_row) noexcept;
 
 // The place of a stored row's entry.
 [[nodiscard]] SequencePlace entry_of(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,

@@ -5,7 +5,9 @@
 // changes.
 #pragma once
 
+#include <cstddef>
 #include <cstdint>
+#include <cstring>
 
 #include "tables/table.h"
 #include "values/value_type.h"
@@ -41,6 +43,13 @@ inline std::int64_t place_column(Layout& layout, const TEVPF_COL_DEF& def) noexc
 // The size in bytes of a column's value in a table's row, known to fit 32 bits.
 inline std::int32_t column_size(const TEVPF_COLUMN& column) noexcept {
   return static_cast<std::int32_t>(value_size(column.def.type, column.def.width));
+}
+
+// Whether two rows hold the same bytes in a column.
+inline bool has_same_bytes(const TEVPF_COLUMN& column, const unsigned char* row,
+                           const unsigned char* other_row) noexcept {
+  return std::memcmp(row + column.offset, other_row + column.offset,
+                     static_cast<std::size_t>(column_size(column))) == 0;
 }
 
 // Converts between the table's fields and the layout that they describe.

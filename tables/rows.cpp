@@ -192,7 +192,7 @@ using Moves = PerColumn<EntryMove>;
 bool prepare_move(const TEVPF_TABLE& table, TEVPF_COLUMN& column, std::int32_t slot,
                   const unsigned char* row, EntryMove& move) noexcept {
   move.from = entry_of(table, column, slot).position;
-  move.to = search_others(table, column, move.from, row + column.offset).place.position;
+  move.to = position_among_others(table, column, move.from, row + column.offset);
   return ready_to_move_entry(table, column, move);
 }
 
@@ -203,13 +203,14 @@ TEVPF_STATUS move_row(TEVPF_TABLE& table, std::int32_t from, std::int32_t to) no
   if (!moves.exists()) return fail_empty(PF_NOMEM);
   const std::int32_t slot = slot_of(table, from);
   const unsigned char* const row = row_at(table, slot);
+  fetch_places(table, row);
   for (std::int32_t i = 0; i < table.num_cols; ++i) {
     TEVPF_COLUMN& column = table.col_array[i];
     if (is_indexed(column) && !prepare_move(table, column, slot, row, moves[i])) {
       return fail_empty(PF_NOMEM);
     }
   }
-  if (library.interactive == 0) PF_TRY(check_moved_row(table, slot, moves.get()));
+  if (library.interactive == 0) PF_TRY(check_moved_row(table, slot, from, moves.get()));
   Sequence& order = table.slots.order;
   const std::int32_t target = std::clamp(to, 0, table.num_rows - 1);
   if (!order.make_ready_to_move(table.num_rows, from, target)) return fail_empty(PF_NOMEM);
@@ -229,16 +230,11 @@ bool values_differ(const TEVPF_COLUMN& column, const unsigned char* stored_row,
                         column.tolerance) != PF_NORMAL;
 }
 
-bool has_same_bytes(const TEVPF_COLUMN& column, const unsigned char* stored_row,
-                    const unsigned char* new_row) noexcept {
-  return std::memcmp(stored_row + column.offset, new_row + column.offset,
-                     static_cast<std::size_t>(column_size(column))) == 0;
-}
-
 TEVPF_STATUS replace_row(TEVPF_TABLE& table, std::int32_t slot, const unsigned char* row) noexcept {
   Moves moves(table);
   if (!moves.exists()) return fail_empty(PF_NOMEM);
   unsigned char* const stored = row_at(table, slot);
+  fetch_places_of_changes(table, stored, row);
   for (std::int32_t i = 0; i < table.num_cols; ++i) {
     TEVPF_COLUMN& column = table.col_array[i];
     if (!is_indexed(column)) continue;

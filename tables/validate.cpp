@@ -67,18 +67,17 @@ TEVPF_STATUS check_row(const TEVPF_TABLE& table, const unsigned char* row, std::
   return PF_NORMAL;
 }
 
-TEVPF_STATUS check_moved_row(const TEVPF_TABLE& table, std::int32_t slot,
+TEVPF_STATUS check_moved_row(const TEVPF_TABLE& table, std::int32_t slot, std::int32_t own_number,
                              const EntryMove* moves) noexcept {
-  const std::int32_t own_number = row_number_of(table, slot);
   for (std::int32_t i = 0; i < table.num_cols; ++i) {
     const TEVPF_COLUMN& column = table.col_array[i];
     const unsigned char* const value = row_at(table, slot) + column.offset;
     PF_TRY(check_range(column, value));
     if (!is_unique(column)) continue;
     const std::int32_t own = moves[i].from;
-    const IndexPlace found = search_others(table, column, own, value);
-    if (!found.found) continue;
-    const std::int32_t at = found.place.position;
+    const Found found = search_others(table, column, own, value);
+    if (!found.equal) continue;
+    const std::int32_t at = found.position;
     const std::int32_t number = row_number_of(table, column.index.at(at < own ? at : at + 1));
     // Row numbers count as if the row had been taken out.
     return duplicate(column, value, number > own_number ? number - 1 : number);

@@ -33,9 +33,10 @@ inline constexpr std::int32_t kAnybody = -2;
 [[nodiscard]] TEVPF_STATUS check_row(const TEVPF_TABLE& table, const unsigned char* row,
                                      std::int32_t holder, InsertionPoints& points) noexcept;
 
-// The same for a stored row that moves, ignoring the row itself. `moves` has the position of its
-// entry in each column's index.
+// The same for a stored row that moves, ignoring the row itself; own_number is its row number.
+// `moves` has the position of its entry in each column's index.
 [[nodiscard]] TEVPF_STATUS check_moved_row(const TEVPF_TABLE& table, std::int32_t slot,
+                                           std::int32_t own_number,
                                            const EntryMove* moves) noexcept;
 
 }  // namespace tevpf

@@ -58,6 +58,20 @@ void prefetch(const T* array, std::int32_t count) noexcept {
   for (std::int32_t i = 0; i < count; i += kPerLine) __builtin_prefetch(array + i);
 }
 
+// count_less for what lies far apart in memory: one wide step, whose cache misses overlap, takes the
+// place of two.
+template <class IsLess>
+std::int32_t count_less_far(std::int32_t length, IsLess is_less) noexcept {
+  constexpr std::int32_t kParts = 16;
+  const std::int32_t part = length / kParts;
+  std::int32_t first = 0;
+  for (std::int32_t probe = 1; part > 0 && probe < kParts; ++probe) {
+    first += part * static_cast<std::int32_t>(is_less(probe * part - 1));
+  }
+  const std::int32_t rest = length - (kParts - 1) * part;
+  return first + count_less(rest, [&](std::int32_t i) { return is_less(first + i); });
+}
+
 // The keys of a block; null if they are not gathered.
 template <class KeyOf>
 auto keys_of_block(SequenceBlocks& blocks, SequenceGroup& group, std::int32_t b,
@@ -122,9 +136,11 @@ struct KeyProbes {
                              std::int32_t b) const noexcept {
     const SequenceChunk chunk = group.chunk(b);
     const Key* const keys = keys_of_block(blocks, group, b, key_of);
-    if (keys == nullptr) return count_less_in(chunk);
-    prefetch(keys, chunk.count);
     prefetch(chunk.items, chunk.count);  // whoever searches will read or insert an item
+    if (keys == nullptr) {
+      return count_less_far(chunk.count, [&](std::int32_t i) { return is_item_less(chunk[i]); });
+    }
+    prefetch(keys, chunk.count);
     return count_less(chunk.count, [&](std::int32_t i) { return less(keys[i], chunk[i]); });
   }
   std::int32_t count_less_in(const SequenceChunk& chunk) const noexcept {
