@@ -39,12 +39,6 @@ struct Found {
 [[nodiscard]] Found find_in_index(const TEVPF_TABLE& table, TEVPF_COLUMN& column,
                                   std::int32_t first, const void* key) noexcept;
 
-// Requests the cache lines that searches of all indexes for the values of a row will read.
-void fetch_places(const TEVPF_TABLE& table, const unsigned char* row) noexcept;
-// The same for the indexes of columns in which two rows differ, and the values of both.
-void fetch_places_of_changes(const TEVPF_TABLE& table, const unsigned char* row,
-                             const unsigned char* other_row) noexcept;
-
 // The place of a stored row's entry.
 [[nodiscard]] SequencePlace entry_of(const TEVPF_TABLE& table, const TEVPF_COLUMN& column,
                                      std::int32_t slot) noexcept;

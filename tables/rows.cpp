@@ -11,6 +11,7 @@
 #include "tables/cursor.h"
 #include "tables/default_row.h"
 #include "tables/directory.h"
+#include "tables/fetch_ahead.h"
 #include "tables/index_search.h"
 #include "tables/layout.h"
 #include "tables/row_store.h"
@@ -162,7 +163,6 @@ void find_entries(const TEVPF_TABLE& table, std::int32_t slot, Places& places) n
 TEVPF_STATUS delete_row(TEVPF_TABLE& table, std::int32_t slot, std::int32_t row_number) noexcept {
   Places places(table);
   if (!places.exists()) return fail_empty(PF_NOMEM);
-  fetch_places(table, row_at(table, slot));
   find_entries(table, slot, places);
   for (std::int32_t i = 0; i < table.num_cols; ++i) {
     TEVPF_COLUMN& column = table.col_array[i];
@@ -321,6 +321,7 @@ TEVPF_STATUS TEV8R1_PF_delete_row(const char* table_name) noexcept {
   TEVPF_TABLE* table;
   std::int32_t slot = 0;
   PF_TRY(find_current_row(table_name, table, slot));
+  fetch_places(*table, row_at(*table, slot));
   PF_TRY(delete_row(*table, slot, row_number_at(*table, table->cur_row)));
   table->cur_row = -1;
   --table->next_row;

@@ -62,7 +62,7 @@ void prefetch(const T* array, std::int32_t count) noexcept {
 // place of two.
 template <class IsLess>
 std::int32_t count_less_far(std::int32_t length, IsLess is_less) noexcept {
-  constexpr std::int32_t kParts = 16;
+  constexpr std::int32_t kParts = 8;
   const std::int32_t part = length / kParts;
   std::int32_t first = 0;
   for (std::int32_t probe = 1; part > 0 && probe < kParts; ++probe) {
