@@ -3,6 +3,8 @@
 #include <cmath>
 #include <limits>
 
+#include "utf8.h"
+
 namespace sql {
 namespace {
 
@@ -19,26 +21,6 @@ tevpf::Cell number_cell(double number, tevpf::Type type) {
     return static_cast<std::int64_t>(number);
   }
   return number;
-}
-
-// Bytes of the UTF-8 sequence at the front of a text, 0 when there is none.
-std::size_t sequence_size(std::string_view text) {
-  const auto byte = [&](std::size_t i) { return static_cast<unsigned char>(text[i]); };
-  const unsigned lead = byte(0);
-  if (lead < 0x80) return 1;
-  const std::size_t size = lead < 0xC2   ? 0
-                           : lead < 0xE0 ? 2
-                           : lead < 0xF0 ? 3
-                           : lead < 0xF5 ? 4
-                                         : 0;
-  if (size == 0 || text.size() < size) return 0;
-  for (std::size_t i = 1; i < size; ++i) {
-    if ((byte(i) & 0xC0U) != 0x80) return 0;
-  }
-  const unsigned second = byte(1);
-  const bool is_refused = (lead == 0xE0 && second < 0xA0) || (lead == 0xED && second >= 0xA0) ||
-                          (lead == 0xF0 && second < 0x90) || (lead == 0xF4 && second >= 0x90);
-  return is_refused ? 0 : size;
 }
 
 }  // namespace
@@ -104,7 +86,7 @@ std::string utf8(std::string_view name) {
   static constexpr std::string_view kDigits = "0123456789abcdef";
   std::string result;
   while (!name.empty()) {
-    const std::size_t size = sequence_size(name);
+    const std::size_t size = character_size(name);
     if (size > 0) {
       result += name.substr(0, size);
     } else {

@@ -3,6 +3,7 @@
 #include <cmath>
 
 #include "sql/from_chars.h"
+#include "sql/utf8.h"
 #include "text.h"
 
 namespace tool {
@@ -63,7 +64,7 @@ std::string number_json(T number) {
 std::string text_json(std::string_view text) {
   std::string result = "\"";
   for (std::string_view rest = text; !rest.empty();) {
-    const std::size_t size = character_size(rest);
+    const std::size_t size = sql::character_size(rest);
     if (size == 0) return bytes_json(text);
     const char first = rest[0];
     const bool is_control = static_cast<unsigned char>(first) < 0x20 || first == '\x7F';

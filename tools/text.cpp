@@ -5,8 +5,13 @@
 #include <numeric>
 #include <utility>
 
+#include "sql/utf8.h"
+
 namespace tool {
 namespace {
+
+using sql::character_size;
+using sql::is_continuation;
 
 char lower(char c) { return c >= 'A' && c <= 'Z' ? static_cast<char>(c - 'A' + 'a') : c; }
 
@@ -29,8 +34,6 @@ std::size_t distance(std::string_view a, std::string_view b) {
   }
   return last[b.size()];
 }
-
-bool is_continuation(char byte) { return (static_cast<unsigned char>(byte) & 0xC0) == 0x80; }
 
 // Bytes of the UTF-8 character at the front of a text, 0 when there is none that may be shown: control
 // characters are those of ASCII and U+0080 to U+009F.
@@ -81,26 +84,6 @@ std::string escaped(std::string_view text, std::size_t (*kept)(std::string_view)
 }
 
 }  // namespace
-
-// Overlong forms and surrogates fail by their second byte.
-std::size_t character_size(std::string_view text) {
-  const auto lead = static_cast<unsigned char>(text[0]);
-  if (lead < 0x80) return 1;
-  const std::size_t size = lead < 0xC2   ? 0
-                           : lead < 0xE0 ? 2
-                           : lead < 0xF0 ? 3
-                           : lead < 0xF5 ? 4
-                                         : 0;
-  if (size == 0 || text.size() < size) return 0;
-  if (!std::all_of(text.begin() + 1, text.begin() + static_cast<std::ptrdiff_t>(size),
-                   is_continuation)) {
-    return 0;
-  }
-  const auto second = static_cast<unsigned char>(text[1]);
-  const bool refused = (lead == 0xE0 && second < 0xA0) || (lead == 0xED && second >= 0xA0) ||
-                       (lead == 0xF0 && second < 0x90) || (lead == 0xF4 && second >= 0x90);
-  return refused ? 0 : size;
-}
 
 std::string visible(std::string_view text) { return escaped(text, nothing); }
 

@@ -18,9 +18,6 @@ std::string visible_lines(std::string_view text);
 // 'text', made visible.
 std::string in_quotes(std::string_view text);
 
-// Bytes of the UTF-8 character, of any kind, at the front of a text; 0: there is none.
-std::size_t character_size(std::string_view text);
-
 // Characters of a visible text: its bytes without UTF-8 continuations.
 std::size_t display_width(std::string_view text);
 

@@ -58,11 +58,17 @@ void prefetch(const T* array, std::int32_t count) noexcept {
   for (std::int32_t i = 0; i < count; i += kPerLine) __builtin_prefetch(array + i);
 }
 
-// count_less for what lies far apart in memory: one wide step, whose cache misses overlap, takes the
-// place of two.
+// The parts of a block that a search without keys tells apart in its first step.
+#ifdef TEVPF_TEST_HOOKS
+inline constexpr std::int32_t kParts = 2;
+#else
+inline constexpr std::int32_t kParts = 8;
+#endif
+
+// count_less for what lies far apart in memory: the first step is wider, since its cache misses
+// overlap.
 template <class IsLess>
 std::int32_t count_less_far(std::int32_t length, IsLess is_less) noexcept {
-  constexpr std::int32_t kParts = 8;
   const std::int32_t part = length / kParts;
   std::int32_t first = 0;
   for (std::int32_t probe = 1; part > 0 && probe < kParts; ++probe) {
