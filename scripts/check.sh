@@ -1,10 +1,10 @@
 #!/usr/bin/env bash
-# check.sh [format|layers|tidy|cppcheck|shell...]: the static checks; all of them by default.
+# check.sh [format|layers|faults|tidy|cppcheck|shell...]: the static checks; all of them by default.
 set -euo pipefail
 cd "$(dirname "${BASH_SOURCE[0]}")/.."
 
 checks=("$@")
-((${#checks[@]})) || checks=(format layers tidy cppcheck shell)
+((${#checks[@]})) || checks=(format layers faults tidy cppcheck shell)
 scripts/install-packages.sh build tool test lint
 
 mapfile -t sources < <(git ls-files '*.cpp' '*.c' '*.h' '*.hpp')
@@ -13,6 +13,9 @@ mapfile -t library < <(git ls-files 'core/*.cpp' 'values/*.cpp' 'lists/*.cpp' 't
 check_format() { clang-format --dry-run -Werror "${sources[@]}"; }
 
 check_layers() { scripts/check_layers.py; }
+
+# Every planted fault has its place in the source.
+check_faults() { scripts/mutation.py --report; }
 
 check_tidy() {
   cmake --preset dev >/dev/null
@@ -35,7 +38,7 @@ failed=()
 for check in "${checks[@]}"; do
   echo "== $check"
   case $check in
-    format | layers | tidy | cppcheck | shell) "check_$check" || failed+=("$check") ;;
+    format | layers | faults | tidy | cppcheck | shell) "check_$check" || failed+=("$check") ;;
     *) echo "check.sh: no check '$check'" >&2; exit 2 ;;
   esac
 done
