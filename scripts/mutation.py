@@ -7,7 +7,8 @@ matter there, and says which faults they notice.
 --only TEXT        only faults whose file or text contains TEXT
 --again OUTCOME    tries faults again that had this outcome: survived, noticed, unbuilt
 --limit SECONDS    processor time of one test (default 60); a test that takes longer has noticed the fault
---report           prints the table of what is known, and plants nothing
+--report           prints the table of what is known, and plants nothing: survivors count as explained when
+                   the list says why, the score is the share of those tried that were noticed
 
 Outcomes are kept in build/mutation/outcomes.json, so that a run that was stopped goes on where it was. The
 copy and its build lie beside it. A fault whose text is not found exactly once is an error.
@@ -185,14 +186,16 @@ def report(faults, outcomes):
         outcome = outcomes.get(fault.key, {}).get("outcome", "untried")
         for row in (fault.file.split("/")[0], "all"):
             table[row][outcome] += 1
+            table[row]["explained"] += outcome == "survived" and bool(fault.reason)
         if outcome == "survived":
             survivors.append(fault)
-    columns = ["noticed", "survived", "unbuilt", "untried"]
-    print(f"{'':8} {'planted':>8}" + "".join(f"{c:>9}" for c in columns) + "   score")
+    columns = ["noticed", "survived", "explained", "unbuilt", "untried"]
+    print(f"{'':8} {'planted':>8}" + "".join(f"{c:>10}" for c in columns) + "   score")
     for row, counts in sorted(table.items(), key=lambda item: item[0] == "all"):
         tried = counts["noticed"] + counts["survived"]
         score = f"{100 * counts['noticed'] / tried:6.1f} %" if tried else ""
-        print(f"{row:8} {counts.total():8}" + "".join(f"{counts[c]:9}" for c in columns) + f"  {score}")
+        planted = counts.total() - counts["explained"]
+        print(f"{row:8} {planted:8}" + "".join(f"{counts[c]:10}" for c in columns) + f"  {score}")
     for fault in survivors:
         print(f"\nsurvived: {fault}\n    {fault.reason or 'NO REASON GIVEN'}")
 
