@@ -15,14 +15,20 @@ case ${1:-} in
   -h | --help) sed -n '2,/^set /{/^set /d;s/^# \{0,1\}//;p}' "${BASH_SOURCE[0]}"; exit ;;
 esac
 legs=("$@")
-all=ON
-((${#legs[@]})) || { legs=(dev asan x86 mingw); all=OFF; }
+quick=OFF
+((${#legs[@]})) || { legs=(dev asan x86 mingw); quick=ON; }
 
 declare -A packages=([dev]="test python" [asan]="test python" [x86]="test x86" [mingw]=windows [wine]=wine
   [clang]="test clang" [arm64]="test arm64")
-declare -A options=([dev]="-DTEVPF_BUILD_PYTHON=ON -DTEVPF_BUILD_ONCE=ON"
-  [asan]="-DTEVPF_BUILD_TOOL=$all -DTEVPF_BUILD_PYTHON=$all" [x86]=-DTEVPF_BUILD_TOOL=$all
-  [mingw]=-DTEVPF_BUILD_TOOL=$all)
+if [[ $quick == ON ]]; then
+  declare -A options=([dev]="-DTEVPF_BUILD_PYTHON=ON"
+    [asan]="-DTEVPF_BUILD_TOOL=OFF -DTEVPF_BUILD_EXAMPLES=OFF" [x86]=-DTEVPF_BUILD_TOOL=OFF
+    [mingw]=-DTEVPF_BUILD_TOOL=OFF)
+else
+  declare -A options=([dev]="-DTEVPF_BUILD_PYTHON=ON -DTEVPF_BUILD_ONCE=ON" [asan]=-DTEVPF_BUILD_PYTHON=ON)
+fi
+# For a compiler cache to keep what is compiled with precompiled headers.
+export CCACHE_SLOPPINESS=${CCACHE_SLOPPINESS:-pch_defines,time_macros}
 groups=(build tool)
 for leg in "${legs[@]}"; do
   [[ -n ${packages[$leg]:-} ]] || { echo "test.sh: no leg '$leg'; see --help" >&2; exit 2; }
@@ -36,7 +42,7 @@ mkdir -p build/all
 : >build/all/CTestTestfile.cmake
 for leg in "${legs[@]}"; do
   read -ra more <<<"${options[$leg]:-}"
-  cmake --preset "$leg" "${more[@]}"
+  cmake --preset "$leg" -DTEVPF_BUILD_QUICKLY=$quick "${more[@]}"
   cmake --build --preset "$leg" --parallel "$jobs"
   echo "subdirs(../$leg)" >>build/all/CTestTestfile.cmake
 done
