@@ -121,7 +121,7 @@ def targets_of(test):
     if test.startswith("tools"):
         return ["tevpf_tool", "engine"]
     if test.startswith("sql."):
-        return ["tevpf_tool", "tevpf_sqlite"]
+        return ["tevpf_tool", "tevpf_sqlite", "sql_fuzz"]
     return [{"corpus": "file_fuzz", "operations_corpus": "operations_fuzz"}.get(test, test)]
 
 

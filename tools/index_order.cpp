@@ -54,6 +54,14 @@ std::optional<Value> another_value(const Value& value, const tevpf::Column& colu
   return std::nullopt;
 }
 
+// A report computes it.
+void compute_display_width(const tevpf::Table& table) {
+  tevpf::Listing listing;
+  listing.last = 0;
+  collect([&](const std::filesystem::path& path) { table.print(path, listing); },
+          [](std::string_view) {});
+}
+
 }  // namespace
 
 // An added row comes in front of those of the same value.
@@ -109,11 +117,19 @@ std::int32_t display_width_of(const tevpf::Table& table) {
   return width;
 }
 
-void restore_display_width(const tevpf::Table& table) {
-  tevpf::Listing listing;
-  listing.last = 0;
-  collect([&](const std::filesystem::path& path) { table.print(path, listing); },
-          [](std::string_view) {});
+void add_columns(tevpf::Table& table, const std::vector<tevpf::Column>& columns,
+                 std::int32_t display_width) {
+  std::int64_t width = -1;  // of the columns so far, with two blanks between them
+  bool is_restored = display_width == 0;
+  for (const tevpf::Column& column : columns) {
+    table.add_column(column);
+    const auto name_size = static_cast<std::int32_t>(column.name().size());
+    width += std::max(column.width(), name_size) + 2;
+    const bool is_last = &column == &columns.back();
+    if (is_restored || (width != display_width && !is_last)) continue;
+    compute_display_width(table);
+    is_restored = true;
+  }
 }
 
 }  // namespace tool

@@ -20,8 +20,12 @@ std::vector<std::size_t> order_to_keep(const tevpf::Table& table, const tevpf::C
 void restore_order(tevpf::Table& table, const tevpf::Column& column,
                    const std::vector<std::size_t>& order);
 
-// Characters of a row as reports show it; 0: no report has been made yet.
+// Characters of a row as the last report showed it, or as it was when a column was last removed; 0: never.
 std::int32_t display_width_of(const tevpf::Table& table);
-void restore_display_width(const tevpf::Table& table);  // makes a report, and throws it away
+
+// Adds these columns to a table that has none, and gives it that display width, as far as there was ever
+// one: of all columns, or of those in front of the ones defined since.
+void add_columns(tevpf::Table& table, const std::vector<tevpf::Column>& columns,
+                 std::int32_t display_width);
 
 }  // namespace tool

@@ -290,9 +290,10 @@ void read_table(tevpf::Table table, const Part& part) {
   if (part.has("columns")) {
     for (const Json& column : part["columns"].require_array("columns").json()) {
       columns.push_back(read_column(part.of(column, "")));
-      table.add_column(columns.back());
     }
   }
+  add_columns(table, columns,
+              part.has("display_width") ? part["display_width"].integer("display_width") : 0);
   if (part.has("rows")) {
     RowReader reader(table, columns);
     std::size_t number = 0;
@@ -305,7 +306,6 @@ void read_table(tevpf::Table table, const Part& part) {
       read_order(table, columns, part.of(order, ", index_order"));
     }
   }
-  if (part.has("display_width")) restore_display_width(table);
 }
 
 // False: left out.

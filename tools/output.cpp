@@ -17,6 +17,7 @@ namespace {
 // The file that a path names in the end: an existing link stays a link.
 fs::path followed(const fs::path& path) {
   std::error_code error;
+  if (!fs::exists(path, error)) return path;  // as it was given, for messages
   fs::path result = fs::weakly_canonical(path, error);
   return error ? path : result;
 }

@@ -1,8 +1,8 @@
 // tevpf sql: statements over FILE and other files, their results as aligned text, CSV or JSON.
 #include <deque>
 #include <filesystem>
+#include <map>
 #include <optional>
-#include <set>
 
 #include "commands.h"
 #include "csv_writer.h"
@@ -177,13 +177,14 @@ class Sources {
 
   // In one order for all programs, so that no two of them wait for each other.
   void lock(const Arguments& arguments) {
-    std::set<std::string> paths;
-    std::error_code ignored;
-    for (const std::string& path : arguments.with) {
-      paths.insert(name_of(std::filesystem::weakly_canonical(path_of(path), ignored)));
-    }
-    paths.insert(name_of(std::filesystem::weakly_canonical(path_of(arguments.file), ignored)));
-    for (const std::string& path : paths) take_lock(path, locks_.emplace_back());
+    std::map<std::filesystem::path, std::string> names;  // by what they stand for
+    const auto add = [&](const std::string& name) {
+      std::error_code ignored;
+      names.emplace(std::filesystem::weakly_canonical(path_of(name), ignored), name);
+    };
+    add(arguments.file);
+    for (const std::string& name : arguments.with) add(name);
+    for (const auto& [whole, name] : names) take_lock(name, locks_.emplace_back());
   }
 
   void add(const std::string& path, const std::string& schema) {

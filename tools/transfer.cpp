@@ -11,12 +11,11 @@ void transfer_list(const tevpf::List& source, tevpf::List target) {
 
 void transfer_table(const tevpf::Table& source, tevpf::Table target) {
   const std::vector<tevpf::Column> columns = source.columns();
-  for (const tevpf::Column& column : columns) target.add_column(column);
+  add_columns(target, columns, display_width_of(source));
   for (const tevpf::RowView row : source) target.append(tevpf::Row(row));
   for (const tevpf::Column& column : columns) {
     restore_order(target, column, order_to_keep(source, column));
   }
-  if (display_width_of(source) != 0) restore_display_width(target);
 }
 
 }  // namespace

@@ -2,20 +2,17 @@
 
 from __future__ import annotations
 
-import os
 from collections.abc import Iterable, Iterator, Mapping, MutableMapping
-from typing import TYPE_CHECKING, Any, Optional, Union
+from typing import Any, Optional, Union
 
 from . import _core, errors, notebook
 from .definitions import Parameter, Value
-
-if TYPE_CHECKING:
-    from .file import File
+from .element import Element
 
 __all__ = ["List"]
 
 
-class List(MutableMapping[str, Parameter]):
+class List(Element[_core.List], MutableMapping[str, Parameter]):
     """The parameters of a list by name, in the list's order.
 
     ``engine["Thrust"]`` is a Parameter; a value that is assigned changes its value, within its bounds;
@@ -23,23 +20,6 @@ class List(MutableMapping[str, Parameter]):
     deleted or renamed through another object, operations raise MissingError, and ClosedError once
     the file is closed.
     """
-
-    def __init__(self, file: "File", core: _core.List) -> None:
-        self._file, self._core = file, core
-
-    @property
-    def name(self) -> str:
-        return self._core.name
-
-    @property
-    def description(self) -> str:
-        """At most 79 bytes; it can be assigned."""
-        return self._core.description
-
-    @description.setter
-    def description(self, text: str) -> None:
-        self._file._require_writing()
-        self._core.describe(text)
 
     def __getitem__(self, name: str) -> Parameter:
         return Parameter._from(self._core.parameter(_checked(name)))
@@ -118,10 +98,6 @@ class List(MutableMapping[str, Parameter]):
         """This object follows; others find no list of the old name."""
         self._file._require_writing()
         self._core.rename_list(new_name)
-
-    def dump(self, path: "str | os.PathLike[str]") -> None:
-        """Writes a text file for people to read."""
-        self._core.dump(path)
 
     def to_pandas(self) -> Any:
         """A DataFrame with a row for each parameter, its name the index."""

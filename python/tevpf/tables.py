@@ -5,24 +5,22 @@ from __future__ import annotations
 import dataclasses
 import os
 from collections.abc import Iterable, Iterator, Mapping, MutableMapping
-from typing import TYPE_CHECKING, Any, Optional, Union, overload
+from typing import Any, Optional, Union, overload
 
 import numpy as np
 
 from . import _core, errors, notebook
 from .definitions import Column, Value
+from .element import Element
 from .records import Array, Layout, columns_of, refuse_row
 from .rows import Row
-
-if TYPE_CHECKING:
-    from .file import File
 
 __all__ = ["Columns", "Table"]
 
 _BLOCK = 256  # rows read at once while iterating
 
 
-class Table:
+class Table(Element[_core.Table]):
     """A table: a sequence of rows, and a mapping of column names to arrays.
 
     ``t[3]`` is a Row, ``t["melting"]`` an array of the column's values, ``len(t)`` the number of rows;
@@ -30,23 +28,6 @@ class Table:
     or renamed through another object, operations raise MissingError, and ClosedError once the file
     is closed. Arrays and rows are copies and stay good.
     """
-
-    def __init__(self, file: "File", core: _core.Table) -> None:
-        self._file, self._core = file, core
-
-    @property
-    def name(self) -> str:
-        return self._core.name
-
-    @property
-    def description(self) -> str:
-        """At most 79 bytes; it can be assigned."""
-        return self._core.description
-
-    @description.setter
-    def description(self, text: str) -> None:
-        self._file._require_writing()
-        self._core.describe(text)
 
     @property
     def columns(self) -> "Columns":
@@ -230,10 +211,6 @@ class Table:
         """This object follows; others find no table of the old name."""
         self._file._require_writing()
         self._core.rename_table(new_name)
-
-    def dump(self, path: "str | os.PathLike[str]") -> None:
-        """Writes everything to a text file for people to read."""
-        self._core.dump(path)
 
     def print(self, path: "str | os.PathLike[str]", columns: Iterable[str] = (),
               sorted_by: str = "", definitions: bool = False) -> None:

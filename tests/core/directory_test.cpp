@@ -179,6 +179,7 @@ TEST_F(DirectoryTest, NamesAreCutAndComparedAsTheyAreKept) {
   // Likewise among so many that names are hashed.
   for (int i = 0; i < 20; ++i) EXPECT_EQ(kKinds[0].create("N" + std::to_string(i)), PF_NORMAL);
   expect_answer(kKinds[0].create(alike), PF_DUPLICATE, {"list " + kept, "the file"});
+  expect_answer(kKinds[0].check_unique(alike.c_str()), PF_DUPLICATE, {"list " + alike, "the file"});
   EXPECT_EQ(kKinds[0].find(longer), -1);
   // What stands behind a terminator is zero.
   EXPECT_EQ(TEV8R1_modify_elem_name(PF_ELEM_LIST, kept.c_str(), "x"), PF_NORMAL);

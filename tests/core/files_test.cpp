@@ -174,29 +174,29 @@ TEST_F(FilesTest, NamesAreLookedUpAndHaveUpTo257Characters) {
   const std::string folder = at(std::string(100, 'd'));
   const std::string longest = folder + "/" + std::string(256 - folder.size(), 'f');
   fs::create_directory(folder);
-  setenv("PFDIR", "/nowhere", 1);  // the "$" is part of the name
-  expect_answer(open("$PFDIR/a"), PF_OPENFAIL, {"$PFDIR/a", kUntouched.value});
+  setenv("PF.DIR", "/nowhere", 1);  // the "$" is part of the name
+  expect_answer(open("$PF.DIR/a"), PF_OPENFAIL, {"$PF.DIR/a", kUntouched.value});
   const struct {
     std::string value, name, found;
     TEVPF_STATUS status;
-  } cases[] = {{dir_.path(), "$PFDIR/a", "a", PF_NEWFILE},
-               {dir_.path(), "$PFDIR/a", "a", PF_FILEOPEN},
-               {at("whole"), "$PFDIR", "whole", PF_NEWFILE},
-               {std::string(300, 'v'), "$PFDIR/a", std::string(256, 'v'), PF_OPENFAIL},
+  } cases[] = {{dir_.path(), "$PF.DIR/a", "a", PF_NEWFILE},
+               {dir_.path(), "$PF.DIR/a", "a", PF_FILEOPEN},
+               {at("whole"), "$PF.DIR", "whole", PF_NEWFILE},
+               {std::string(300, 'v'), "$PF.DIR/a", std::string(256, 'v'), PF_OPENFAIL},
                {"", longest, fs::path(longest).filename(), PF_NEWFILE},
                {"", longest + "f", longest.substr(0, 256), PF_OPENFAIL}};
   for (const auto& c : cases) {
     SCOPED_TRACE(c.name);
-    setenv("$PFDIR", c.value.c_str(), 1);
+    setenv("$PF.DIR", c.value.c_str(), 1);
     set_error_texts();
     EXPECT_EQ(open(c.name), c.status);
     EXPECT_EQ(c.status == PF_OPENFAIL ? error_texts().item : current(), c.found);
-    EXPECT_EQ(TEV8R1_PF_change_file("$PFDIR/a"), PF_NOFILE);
+    EXPECT_EQ(TEV8R1_PF_change_file("$PF.DIR/a"), PF_NOFILE);
   }
   expect_answer(TEV8R1_add_file(stdin, (longest + "f").c_str(), 0), PF_OPENFAIL,
                 {longest.substr(0, 256), ""});
-  unsetenv("$PFDIR");
-  unsetenv("PFDIR");
+  unsetenv("$PF.DIR");
+  unsetenv("PF.DIR");
   EXPECT_EQ(TEV8R1_PF_save(nullptr), PF_NORMAL);
 }
 

@@ -1,4 +1,5 @@
-// Sequences against a plain vector, in random operations; and the rules of their blocks.
+// Sequences against a plain vector, in random operations; and the rules of their blocks. Arrays that
+// are permutations, as those that become sequences are.
 #include "core/sequence/sequence.h"
 
 #include <gtest/gtest.h>
@@ -6,8 +7,10 @@
 #include <algorithm>
 #include <numeric>
 #include <random>
+#include <utility>
 #include <vector>
 
+#include "core/base/permutation.h"
 #include "core/sequence/sequence_search.h"
 
 namespace {
@@ -312,6 +315,25 @@ TYPED_TEST(SequenceTest, StaysTheSameWhereMemoryRunsOut) {
       heap_fail_at(n);
       for (int i = 0; i < 250 && !this->HasFailure(); ++i) model.step();
       failed = heap_fail_off();
+    }
+  }
+}
+
+// Whichever number is replaced, and by whichever.
+TEST(PermutationTest, HasEveryNumberOnce) {
+  std::mt19937 random(3);
+  for (const std::int32_t count : {0, 1, 2, 63, 64, 65, 200}) {
+    SCOPED_TRACE(count);
+    Items items(static_cast<std::size_t>(count));
+    std::iota(items.begin(), items.end(), 0);
+    std::shuffle(items.begin(), items.end(), random);
+    EXPECT_EQ(is_permutation(items.data(), count), true);
+    for (std::int32_t& item : items) {
+      for (const std::int32_t other : {0, count / 2, count - 1, count, -1, INT32_MIN, INT32_MAX}) {
+        const std::int32_t before = std::exchange(item, other);
+        EXPECT_EQ(is_permutation(items.data(), count), before == other) << before << ' ' << other;
+        item = before;
+      }
     }
   }
 }

@@ -66,7 +66,7 @@ TEST(MessageTest, SentencesUseTheTextsOfTheirFailureOnly) {
   } cases[] = {
       {PF_RANGE, {"900", ""}, "900 is out of range"},
       {PF_RANGE, {"900", "Thrust"}, "'Thrust': 900 is out of range"},
-      {PF_BADARG, {"1\t2", "integer"}, "'1\\t2' is not a number of type integer"},
+      {PF_BADARG, {"1\t2\x7F", "integer"}, "'1\\t2\\x7f' is not a number of type integer"},
       {PF_BADARG, {"Thrust", ""}, "an argument is invalid"},
       {PF_BADPOS, {"-1", "3"}, "position -1 is out of range; the number of entries is 3"},
       {PF_BADPOS, {"Thrust", ""}, "the position is out of range"},
