@@ -55,6 +55,14 @@ tevpf_public_header(tevpf_static)
 target_compile_definitions(tevpf_static PUBLIC TEVPF_STATIC)
 set_target_properties(tevpf_static PROPERTIES LINKER_LANGUAGE CXX OUTPUT_NAME tevpf)
 
+# A quick build for Windows checks the DLL; one under sanitizers runs the test programs, which have the
+# library with test hooks.
+if(TEVPF_BUILD_QUICKLY AND WIN32)
+  set_target_properties(tevpf_static PROPERTIES EXCLUDE_FROM_ALL ON)
+elseif(TEVPF_BUILD_QUICKLY AND CMAKE_CXX_FLAGS MATCHES "-fsanitize")
+  set_target_properties(tevpf_objects tevpf tevpf_static PROPERTIES EXCLUDE_FROM_ALL ON)
+endif()
+
 # The C++ interface: headers over the one or the other.
 foreach(form "" _static)
   add_library(tevpf_cpp${form} INTERFACE)

@@ -10,6 +10,9 @@ function(tevpf_target_options target)
     target_compile_options(${target} PRIVATE -msse2 -mfpmath=sse)
   endif()
   target_compile_options(${target} PRIVATE -ffp-contract=off)
+  if(TEVPF_BUILD_QUICKLY AND CMAKE_BUILD_TYPE STREQUAL "Debug")
+    target_compile_options(${target} PRIVATE -g1)  # the lines of a backtrace
+  endif()
   if(TEVPF_STRICT)
     # Counts are signed and sizes are not; compilers disagree whether -Wconversion includes that.
     target_compile_options(${target} PRIVATE
@@ -24,10 +27,10 @@ endfunction()
 # tevpf_library_options(target): in addition, what the library's own code is compiled with.
 function(tevpf_library_options target)
   tevpf_target_options(${target})
-  # The sources of a folder together. Not where they are optimised: gcc 12 then takes variables for
-  # uninitialised that are not.
+  # The sources of a folder together. Not what users get: gcc 12 takes variables for uninitialised that
+  # are not when it optimises a whole folder.
   set(together OFF)
-  if(TEVPF_BUILD_ONCE AND CMAKE_BUILD_TYPE STREQUAL "Debug")
+  if(TEVPF_BUILD_QUICKLY OR (TEVPF_BUILD_ONCE AND CMAKE_BUILD_TYPE STREQUAL "Debug"))
     set(together ON)
   endif()
   set_target_properties(${target} PROPERTIES
@@ -43,11 +46,30 @@ function(tevpf_library_options target)
     # Calls of the library's own functions and of the C runtime take no detour.
     target_compile_options(${target} PRIVATE -fno-semantic-interposition -fno-plt)
   endif()
-  if(CMAKE_CXX_COMPILER_ID STREQUAL "GNU" AND CMAKE_BUILD_TYPE STREQUAL "Release" AND NOT WIN32)
+  if(TEVPF_BUILD_QUICKLY)
+    if(CMAKE_CXX_COMPILER_ID STREQUAL "GNU")
+      target_compile_options(${target} PRIVATE -Wno-maybe-uninitialized)
+    endif()
+  elseif(CMAKE_CXX_COMPILER_ID STREQUAL "GNU" AND CMAKE_BUILD_TYPE STREQUAL "Release" AND NOT WIN32)
     # Small operations spend a sixth of their time on calls between files. The objects hold plain
     # code too, for the static library. Neighbouring fields stored as one vector cost the next
     # operation, which reads one of them, more than the store saves.
     target_compile_options(${target} PRIVATE
       -flto=auto -ffat-lto-objects -fno-tree-slp-vectorize)
+  endif()
+endfunction()
+
+# tevpf_precompile(target header... | REUSE_FROM other): headers that most files of the target include, in a quick build.
+# In another one, each of them would compile the whole target again when it changes.
+function(tevpf_precompile target)
+  if(TEVPF_BUILD_QUICKLY)
+    if(ARGV1 STREQUAL "REUSE_FROM")
+      target_precompile_headers(${target} ${ARGN})
+    else()
+      target_precompile_headers(${target} PRIVATE ${ARGN})
+    endif()
+    if(CMAKE_CXX_COMPILER_ID STREQUAL "GNU")
+      target_compile_options(${target} PRIVATE -fpch-preprocess)  # ccache asks for it
+    endif()
   endif()
 endfunction()
