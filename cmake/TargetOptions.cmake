@@ -59,8 +59,8 @@ function(tevpf_library_options target)
   endif()
 endfunction()
 
-# tevpf_precompile(target header... | REUSE_FROM other): headers that most files of the target include, in a quick build.
-# In another one, each of them would compile the whole target again when it changes.
+# tevpf_precompile(target header... | REUSE_FROM other): headers that most files of the target include, in
+# a quick build. In another one, each of them would compile the whole target again when it changes.
 function(tevpf_precompile target)
   if(TEVPF_BUILD_QUICKLY)
     if(ARGV1 STREQUAL "REUSE_FROM")

@@ -42,6 +42,15 @@ TEST_F(TableRules, PlaceBehindARowThatIsPadded) {
   EXPECT_EQ(extra, 0);
 }
 
+TEST_F(TableRules, NothingOfAColumnThatIsDeletedStays) {
+  define({col("a", kInt), col("b", kDouble), col("c", PF_TYPE_SHORT)});
+  EXPECT_EQ(add({"1", "2", "3"}), PF_NORMAL);
+  EXPECT_EQ(TEV8R1_PF_delete_col("t", "a"), PF_NORMAL);
+  const TEVPF_TABLE& t = settled();
+  ASSERT_EQ(t.row_wid, 16);
+  EXPECT_EQ(std::string(t.row_data + 10, t.row_data + 16), std::string(6, '\0'));
+}
+
 TEST_F(TableRules, RefusedDefinitionsChangeNothing) {
   fill();
   define({col("same", kText, 3)});
