@@ -185,17 +185,17 @@ def report(faults, outcomes):
     for fault in faults:
         outcome = outcomes.get(fault.key, {}).get("outcome", "untried")
         for row in (fault.file.split("/")[0], "all"):
+            table[row]["planted"] += 1
             table[row][outcome] += 1
             table[row]["explained"] += outcome == "survived" and bool(fault.reason)
         if outcome == "survived":
             survivors.append(fault)
-    columns = ["noticed", "survived", "explained", "unbuilt", "untried"]
-    print(f"{'':8} {'planted':>8}" + "".join(f"{c:>10}" for c in columns) + "   score")
+    columns = ["planted", "noticed", "survived", "explained", "unbuilt", "untried"]
+    print(f"{'':8}" + "".join(f"{c:>10}" for c in columns) + "   score")
     for row, counts in sorted(table.items(), key=lambda item: item[0] == "all"):
         tried = counts["noticed"] + counts["survived"]
         score = f"{100 * counts['noticed'] / tried:6.1f} %" if tried else ""
-        planted = counts.total() - counts["explained"]
-        print(f"{row:8} {planted:8}" + "".join(f"{counts[c]:10}" for c in columns) + f"  {score}")
+        print(f"{row:8}" + "".join(f"{counts[c]:10}" for c in columns) + f"  {score}")
     for fault in survivors:
         print(f"\nsurvived: {fault}\n    {fault.reason or 'NO REASON GIVEN'}")
 
