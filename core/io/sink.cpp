@@ -5,9 +5,13 @@
 namespace tevpf {
 
 namespace {
+#ifdef TEVPF_TEST_HOOKS
+constexpr std::size_t kBuffer = 4096;  // even small files exceed it
+#else
 // One long write is faster than several short ones: ten thousand parameters fit in one. The unused
 // part of the buffer costs nothing, because it is never touched.
 constexpr std::size_t kBuffer = std::size_t{1024} * 1024;
+#endif
 constexpr std::uint64_t kMaxWrite = std::uint64_t{1} << 30;  // fits size_t everywhere
 }  // namespace
 

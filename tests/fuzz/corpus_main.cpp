@@ -6,10 +6,10 @@
 #include <cstdlib>
 #include <cstring>
 #include <filesystem>
-#include <fstream>
-#include <iterator>
 #include <string>
 #include <vector>
+
+#include "support/read_file.h"
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size);
 
@@ -38,8 +38,7 @@ int main(int argc, char** argv) {
   const std::size_t step = argc > 2 ? std::strtoul(argv[2], nullptr, 10) : 1;
   std::size_t inputs = 0;
   for (const auto& entry : std::filesystem::directory_iterator(argc > 1 ? argv[1] : ".")) {
-    std::ifstream file(entry.path(), std::ios::binary);
-    const std::string bytes{std::istreambuf_iterator<char>(file), {}};
+    const std::string bytes = read_file(entry.path().string());
     std::printf("%s\n", entry.path().string().c_str());
     std::fflush(stdout);
     run(bytes);

@@ -8,7 +8,6 @@
 #include <cstdlib>
 #include <cstring>
 #include <filesystem>
-#include <fstream>
 #include <iterator>
 #include <map>
 #include <string>
@@ -19,6 +18,7 @@
 #include "include/tevpf_access.h"
 #include "include/tevpf_message.h"
 #include "support/drive.h"
+#include "support/read_file.h"
 
 namespace {
 
@@ -153,15 +153,10 @@ class Session {
     expect(TEV8R1_PF_open(copy.c_str()), PF_NORMAL, "opening a copy");
     check_elements();
     expect(TEV8R1_PF_save(again.c_str()), PF_NORMAL, "saving a copy of it");
-    require(bytes_of(copy) == bytes_of(again), "a copy of a copy");
+    require(read_file(copy) == read_file(again), "a copy of a copy");
     expect(TEV8R1_PF_close(0), PF_NORMAL, "closing a copy");
     expect(TEV8R1_PF_change_file(own.c_str()), PF_NORMAL, "back to the file");
     for (const std::string& path : {copy, again}) std::filesystem::remove(path);
-  }
-
-  static std::string bytes_of(const std::string& path) {
-    std::ifstream in(path, std::ios::binary);
-    return {std::istreambuf_iterator<char>(in), {}};
   }
 
   // ---- Checks ----

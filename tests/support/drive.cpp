@@ -4,7 +4,6 @@
 #include <cstdio>
 #include <cstdlib>
 #include <cstring>
-#include <fstream>
 #include <functional>
 #include <span>
 #include <vector>
@@ -13,6 +12,7 @@
 #include "core/library.h"
 #include "support/list_check.h"
 #include "support/param_def.h"
+#include "support/read_file.h"
 #include "support/table_check.h"
 
 std::uint8_t Choices::next() {
@@ -208,21 +208,17 @@ void read_everything(const std::string& text) {
 
 bool save_and_compare(const std::string& folder) {
   const std::string copy = folder + "/copy", again = folder + "/again";
-  const auto read = [](const std::string& path) {
-    std::ifstream in(path, std::ios::binary);
-    return std::string(std::istreambuf_iterator<char>(in), {});
-  };
   char own[TEVPF_FILE_NAME_SIZE];
   TEV8R1_turn_off_interactive();
   TEV8R1_PF_inq_current_file(own);
   const bool saved = TEV8R1_PF_save(copy.c_str()) == PF_NORMAL;
-  if (const std::string bytes = read(copy); saved && !bytes.empty()) {
+  if (const std::string bytes = read_file(copy); saved && !bytes.empty()) {
     const TEVPF_STATUS opened = TEV8R1_PF_open(copy.c_str());
     // A table too wide for the heap stays without its default row; what follows it is not read.
     require(opened == PF_NORMAL || opened == PF_NOMEM, "a saved file opens");
     require_rules();
     require(TEV8R1_PF_save(again.c_str()) == PF_NORMAL, "a saved file can be saved");
-    require(opened == PF_NOMEM || read(again) == bytes, "a saved file holds what was saved");
+    require(opened == PF_NOMEM || read_file(again) == bytes, "a saved file holds what was saved");
     TEV8R1_PF_close(0);
     TEV8R1_PF_change_file(own);
   }

@@ -5,7 +5,6 @@
 
 #include <filesystem>
 #include <fstream>
-#include <iterator>
 #include <random>
 #include <set>
 #include <string>
@@ -15,6 +14,7 @@
 #include "lists/settle.h"
 #include "support/error_texts.h"
 #include "support/param_def.h"
+#include "support/read_file.h"
 #include "support/state.h"
 #include "tables/settle.h"
 
@@ -46,16 +46,8 @@ class TempDir {
   std::string path_;
 };
 
-inline std::string read_file(const std::string& path) {
-  std::ifstream in(path, std::ios::binary);
-  return {std::istreambuf_iterator<char>(in), {}};
-}
-
 // The lines of a report, however the system ends them.
-inline std::string read_text(const std::string& path) {
-  std::ifstream in(path);
-  return {std::istreambuf_iterator<char>(in), {}};
-}
+inline std::string read_text(const std::string& path) { return read_file(path, std::ios::in); }
 
 inline void write_file(const std::string& path, const std::string& bytes) {
   if (std::filesystem::is_regular_file(path)) std::filesystem::remove(path);
