@@ -23,6 +23,13 @@ struct Link : sqlite3_vtab {
   std::uint64_t generation = 0;    // of the file when the relation was found
   std::vector<std::size_t> marks;  // by savepoint: changes of the file when it was set
 
+  // SQLite ends the transaction of CREATE VIRTUAL TABLE here as well, but does not begin it: what is
+  // done with a table that is as new as this is noted by itself.
+  bool is_new = false;
+  bool writes = false;  // takes part in the file's transaction
+  bool reads_until_end =
+      false;  // new, and read: what was read must not change before it is written
+
   // The relation as it is now, after the file may have been read again.
   Relation& current() {
     if (relation == nullptr || generation != file->generation()) {
@@ -36,6 +43,23 @@ struct Link : sqlite3_vtab {
       }
     }
     return *relation;
+  }
+
+  void begin_reading(Lock& lock) {
+    if (!is_new || reads_until_end) return;
+    file->begin_reading(connection, lock);
+    reads_until_end = true;
+  }
+  void begin_writing(Lock& lock) {
+    if (writes) return;
+    file->begin_writing(connection, lock);
+    writes = true;
+  }
+  // The transaction is over. True if it is to be ended for the file.
+  bool end() noexcept {
+    is_new = false;
+    if (std::exchange(reads_until_end, false)) file->end_reading(connection);
+    return std::exchange(writes, false);
   }
 };
 
@@ -115,14 +139,23 @@ int connect(sqlite3* connection, void* files, int argc, const char* const* argv,
 // A function of its own: were it the same as connect, the module would be a table, too.
 int create(sqlite3* connection, void* files, int argc, const char* const* argv,
            sqlite3_vtab** table_out, char** message) {
-  return connect(connection, files, argc, argv, table_out, message);
+  const int result = connect(connection, files, argc, argv, table_out, message);
+  if (result == SQLITE_OK) link_of(*table_out).is_new = true;
+  return result;
 }
 
-// The element stays in its file.
 int disconnect(sqlite3_vtab* table) {
   const Lock lock(library_mutex());
-  delete &link_of(table);
+  Link& link = link_of(table);
+  if (link.end()) link.file->rollback();
+  delete &link;
   return SQLITE_OK;
+}
+
+// The element stays in its file. SQLite would not commit what this table has changed before.
+int destroy(sqlite3_vtab* table) {
+  if (Lock lock(library_mutex()); link_of(table).writes) return SQLITE_LOCKED;
+  return disconnect(table);
 }
 
 // ---- Reading ------------------------------------------------------------------------------------
@@ -152,6 +185,7 @@ int close_cursor(sqlite3_vtab_cursor* cursor) {
 int filter(sqlite3_vtab_cursor* cursor, int plan, const char*, int argc, sqlite3_value** argv) {
   return locked(cursor->pVtab, [&](Link& link, Lock& lock) {
     Read& read = read_of(cursor);
+    link.begin_reading(lock);
     if (!read.is_active) {
       link.file->begin_reading(link.connection, lock);
       read.is_active = true;
@@ -213,7 +247,8 @@ void change(Link& link, int argc, sqlite3_value** argv, sqlite3_int64* id_out) {
 }
 
 int update(sqlite3_vtab* table, int argc, sqlite3_value** argv, sqlite3_int64* id_out) {
-  return locked(table, [&](Link& link, Lock&) {
+  return locked(table, [&](Link& link, Lock& lock) {
+    link.begin_writing(lock);
     try {
       change(link, argc, argv, id_out);
     } catch (const std::bad_alloc&) {
@@ -225,27 +260,34 @@ int update(sqlite3_vtab* table, int argc, sqlite3_value** argv, sqlite3_int64* i
 
 int begin(sqlite3_vtab* table) {
   return locked(table, [](Link& link, Lock& lock) {
-    link.file->begin_writing(link.connection, lock);
     link.marks.clear();
+    link.begin_writing(lock);
   });
 }
 
 int sync(sqlite3_vtab* table) {
-  return locked(table, [](Link& link, Lock&) { link.file->save(); });
+  return locked(table, [](Link& link, Lock&) {
+    if (link.writes) link.file->save();
+  });
 }
 
 int commit(sqlite3_vtab* table) {
-  return locked(table, [](Link& link, Lock&) { link.file->commit(); });
+  return locked(table, [](Link& link, Lock&) {
+    if (link.end()) link.file->commit();
+  });
 }
 
 int rollback(sqlite3_vtab* table) {
-  return locked(table, [](Link& link, Lock&) { link.file->rollback(); });
+  return locked(table, [](Link& link, Lock&) {
+    if (link.end()) link.file->rollback();
+  });
 }
 
 int savepoint(sqlite3_vtab* table, int number) {
   return locked(table, [=](Link& link, Lock&) {
-    link.marks.resize(static_cast<std::size_t>(number) + 1, link.file->journal().size());
-    link.marks.back() = link.file->journal().size();
+    const std::size_t changes = link.file->changes_of(link.connection);
+    link.marks.resize(static_cast<std::size_t>(number) + 1, changes);
+    link.marks.back() = changes;
   });
 }
 
@@ -254,7 +296,7 @@ int release(sqlite3_vtab*, int) { return SQLITE_OK; }
 int rollback_to(sqlite3_vtab* table, int number) {
   return locked(table, [=](Link& link, Lock&) {
     const auto place = static_cast<std::size_t>(number);
-    if (place < link.marks.size()) link.file->journal().undo_to(link.marks[place]);
+    if (link.writes && place < link.marks.size()) link.file->journal().undo_to(link.marks[place]);
   });
 }
 
@@ -265,7 +307,7 @@ constexpr sqlite3_module make_module() {
   m.xConnect = connect;
   m.xBestIndex = best_index;
   m.xDisconnect = disconnect;
-  m.xDestroy = disconnect;
+  m.xDestroy = destroy;
   m.xOpen = open_cursor;
   m.xClose = close_cursor;
   m.xFilter = filter;

@@ -52,6 +52,10 @@ class SharedFile {
   void begin_reading(Connection connection, Lock& lock);
   void end_reading(Connection connection) noexcept;
   void begin_writing(Connection connection, Lock& lock);  // once for each of its tables
+  // Changes of its transaction, so far.
+  std::size_t changes_of(Connection connection) const noexcept {
+    return writer_ == connection ? journal_.size() : 0;
+  }
 
   // ---- Of the connection that writes ----
   Journal& journal() noexcept { return journal_; }

@@ -100,6 +100,26 @@ def two_connections():
     refused(sqlite3.OperationalError, "in use by another connection", a.execute, "delete from p")
     half.close()
     a.rollback()
+    # A table that is made meanwhile ends no transaction of others.
+    a.execute("update p set n = 3 where id = 1")
+    late = connect()
+    refused(sqlite3.OperationalError, "in use by another connection", values, late)
+    late.close()
+    a.rollback()
+    assert values(b) == [2, 7, 0] and on_disk()[0] == "1,2"
+    # One that is made in a transaction takes part in it, and is not dropped with what it has changed.
+    for end, n in ("rollback", 2), ("commit", 5):
+        b.execute("begin")
+        b.execute("create virtual table again using tevpf('lab.pf', 'parts')")
+        assert values(b, "select n from again where id = 1") == [2] and values(a) == [2, 7, 0]
+        refused(sqlite3.OperationalError, "in use by another connection", a.execute, "update p set n = n")
+        a.rollback()
+        b.execute("update again set n = n + 3 where id = 1")
+        refused(sqlite3.OperationalError, "in use by another connection", values, a)
+        refused(sqlite3.OperationalError, "locked", b.execute, "drop table again")
+        b.execute(end)
+        assert values(a) == [n, 7, 0] and on_disk()[0] == f"1,{n}"
+    b.execute("drop table again")
     tool("sql", "lab.pf", "update parts set n = 20 where id = 1")
     assert values(a) == [20, 7, 0] and values(b) == [20, 7, 0]
     tool("sql", "lab.pf", "delete from parts where id = 3")
