@@ -39,8 +39,11 @@ struct ItemProbes {
   bool is_last_less(const SequenceGroup& group, std::int32_t b) const noexcept {
     return less(group.last[b]);
   }
-  std::int32_t count_less_in(SequenceBlocks&, SequenceGroup& group, std::int32_t b) const noexcept {
-    return count_less_in(group.chunk(b));
+  std::int32_t count_less_in(SequenceBlocks&, SequenceGroup& group, std::int32_t b,
+                             std::int32_t count) const noexcept {
+    SequenceChunk chunk = group.chunk(b);
+    chunk.count = count;
+    return count_less_in(chunk);
   }
   std::int32_t count_less_in(const SequenceChunk& chunk) const noexcept {
     if (chunk.items == nullptr) {
@@ -138,16 +141,16 @@ struct KeyProbes {
     return less(load(group.last_key[b]), group.last[b]);
   }
 
-  std::int32_t count_less_in(SequenceBlocks& blocks, SequenceGroup& group,
-                             std::int32_t b) const noexcept {
+  std::int32_t count_less_in(SequenceBlocks& blocks, SequenceGroup& group, std::int32_t b,
+                             std::int32_t count) const noexcept {
     const SequenceChunk chunk = group.chunk(b);
     const Key* const keys = keys_of_block(blocks, group, b, key_of);
     prefetch(chunk.items, chunk.count);  // whoever searches will read or insert an item
     if (keys == nullptr) {
-      return count_less_far(chunk.count, [&](std::int32_t i) { return is_item_less(chunk[i]); });
+      return count_less_far(count, [&](std::int32_t i) { return is_item_less(chunk[i]); });
     }
     prefetch(keys, chunk.count);
-    return count_less(chunk.count, [&](std::int32_t i) { return less(keys[i], chunk[i]); });
+    return count_less(count, [&](std::int32_t i) { return less(keys[i], chunk[i]); });
   }
   std::int32_t count_less_in(const SequenceChunk& chunk) const noexcept {
     return count_less(chunk.count, [&](std::int32_t i) { return is_item_less(chunk[i]); });
@@ -203,7 +206,8 @@ SequencePlace search_sequence(const Sequence& sequence, std::int32_t count,
   if (count <= 0) return sequence.place_at(0);
   if (sequence.blocks == nullptr) return {probes.count_less_in(sequence.chunk_at(count, 0))};
   SequenceBlocks& blocks = *sequence.blocks;
-  // The last group, and the last block, are not compared: what is not in an earlier one is there.
+  // The last group, the last block and the last item of a block are not compared: what is not in
+  // front of them is there. So a search ends at an item, or at the end of all, whatever `less` says.
   probes.get_ready(blocks);
   const std::int32_t g = count_less(
       blocks.num_groups - 1, [&](std::int32_t i) { return probes.is_group_less(blocks, i); });
@@ -211,12 +215,14 @@ SequencePlace search_sequence(const Sequence& sequence, std::int32_t count,
   probes.get_ready(group);
   const std::int32_t b =
       count_less(group.count - 1, [&](std::int32_t i) { return probes.is_last_less(group, i); });
-  const std::int32_t offset = probes.count_less_in(blocks, group, b);
+  const bool is_last = g == blocks.num_groups - 1 && b == group.count - 1;
+  const std::int32_t compared = group.items_of(b) - (is_last ? 0 : 1);
+  const std::int32_t offset = probes.count_less_in(blocks, group, b, compared);
   return {blocks.starts[g] + group.start[b] + offset, g, b, offset};
 }
 
-// The place of the first item for which less(item) is false, or of the end. less must be false for
-// all items behind that one.
+// The place of the first item for which less(item) is false, or of the end. If less is true for an
+// item behind that one, any item may be found, or the end.
 template <class Less>
 SequencePlace search_items(const Sequence& sequence, std::int32_t count, Less less) noexcept {
   return search_sequence(sequence, count, ItemProbes<Less>{less});

@@ -146,6 +146,7 @@ class Model {
     const SequenceChunk chunk = sequence_.chunk_at(count(), some);
     ASSERT_LE(chunk.count, count() - some);
     ASSERT_EQ(chunk[chunk.count - 1], items_[static_cast<std::size_t>(some + chunk.count - 1)]);
+    search_without_order();
   }
 
   int in_blocks = 0;  // comparisons made in that state
@@ -170,6 +171,26 @@ class Model {
     EXPECT_EQ(by_item.position, expected - items_.begin());
     EXPECT_EQ(by_key.position, by_item.position);
     return by_key;
+  }
+
+  // Whatever the answers, a search ends at an item or at the end of all.
+  void search_without_order() {
+    const std::int32_t wanted = pick(3);
+    const auto is_less = [&](std::int32_t item) { return (item * 7 + wanted) % 3 != 0; };
+    for (const SequencePlace& place :
+         {search_items(sequence_, count(), is_less),
+          search_keys(sequence_, count(), key_of(),
+                      [&](Key, std::int32_t item) { return is_less(item); })}) {
+      ASSERT_TRUE(place.position >= 0 && place.position <= count());
+      if (place.position == count()) continue;
+      if (place.group >= 0) {
+        const SequenceGroup& group = *sequence_.blocks->groups[place.group];
+        ASSERT_LT(place.offset, group.items_of(place.block));
+      }
+      const std::int32_t item = items_[static_cast<std::size_t>(place.position)];
+      ASSERT_EQ(sequence_.at(place), item);
+      ASSERT_EQ(key_at(sequence_, place, key_of()), key_of()(item));
+    }
   }
 
   // A sequence that has just become blocks may take over the keys of all items.
