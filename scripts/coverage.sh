@@ -12,15 +12,16 @@ case ${1:-} in
 esac
 scripts/install-packages.sh build tool test fuzz
 
+# Counters that lie in the profile's own pages count for processes that are ended, too.
+flags="-fprofile-instr-generate -fcoverage-mapping -mllvm -runtime-counter-relocation"
 cmake --preset dev -B build/coverage -DTEVPF_STRICT=OFF -DTEVPF_BUILD_EXAMPLES=OFF -DTEVPF_BUILD_ONCE=ON \
   -DCMAKE_C_COMPILER=clang -DCMAKE_CXX_COMPILER=clang++ -DCMAKE_CXX_FLAGS_DEBUG=-O1 \
-  -DCMAKE_C_FLAGS="-fprofile-instr-generate -fcoverage-mapping" \
-  -DCMAKE_CXX_FLAGS="-fprofile-instr-generate -fcoverage-mapping" >/dev/null
+  -DCMAKE_C_FLAGS="$flags" -DCMAKE_CXX_FLAGS="$flags" >/dev/null
 cmake --build build/coverage --parallel "$(nproc)"
 mkdir -p build/coverage/raw
 rm -f build/coverage/raw/*
 # What is installed and what programs include is tested elsewhere.
-LLVM_PROFILE_FILE=$PWD/build/coverage/raw/%2m.profraw ctest --test-dir build/coverage \
+LLVM_PROFILE_FILE=$PWD/build/coverage/raw/%m%c.profraw ctest --test-dir build/coverage \
   --parallel "$(nproc)" --exclude-regex '^(package|example)' --progress --output-on-failure
 llvm-profdata merge -sparse build/coverage/raw/*.profraw -o build/coverage/all.profdata
 scripts/coverage.py build/coverage "$@"

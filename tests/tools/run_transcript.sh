@@ -16,6 +16,12 @@ folder=$(mktemp -d)
 trap 'rm -rf "$folder" "$folder".{expected,actual}' EXIT
 cd "$folder" || exit 1
 
+# limited BLOCKS COMMAND...: the command may write files of so many KiB, and no coverage profile.
+limited() (
+  ulimit -f "$1"
+  LLVM_PROFILE_FILE=/dev/null "${@:2}"
+)
+
 if [[ $transcript == *.md ]]; then
   ln -s "$(dirname "$transcript")/examples" "${@:3}" .
   awk '/^```/ { inside = $0 == "```console"; next } inside' "$transcript"
