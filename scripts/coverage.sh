@@ -14,6 +14,7 @@ scripts/install-packages.sh build tool test fuzz
 
 # Counters that lie in the profile's own pages count for processes that are ended, too.
 flags="-fprofile-instr-generate -fcoverage-mapping -mllvm -runtime-counter-relocation"
+flags+=" -Wno-unused-command-line-argument"  # of the linker
 cmake --preset dev -B build/coverage -DTEVPF_STRICT=OFF -DTEVPF_BUILD_EXAMPLES=OFF -DTEVPF_BUILD_ONCE=ON \
   -DCMAKE_C_COMPILER=clang -DCMAKE_CXX_COMPILER=clang++ -DCMAKE_CXX_FLAGS_DEBUG=-O1 \
   -DCMAKE_C_FLAGS="$flags" -DCMAKE_CXX_FLAGS="$flags" >/dev/null

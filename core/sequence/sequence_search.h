@@ -63,21 +63,21 @@ void prefetch(const T* array, std::int32_t count) noexcept {
 
 // The parts of a block that a search without keys tells apart in its first step.
 #ifdef TEVPF_TEST_HOOKS
-inline constexpr std::int32_t kParts = 2;
+inline constexpr std::int32_t kFirstStepParts = 2;
 #else
-inline constexpr std::int32_t kParts = 8;
+inline constexpr std::int32_t kFirstStepParts = 8;
 #endif
 
 // count_less for what lies far apart in memory: the first step is wider, since its cache misses
 // overlap.
 template <class IsLess>
 std::int32_t count_less_far(std::int32_t length, IsLess is_less) noexcept {
-  const std::int32_t part = length / kParts;
+  const std::int32_t part = length / kFirstStepParts;
   std::int32_t first = 0;
-  for (std::int32_t probe = 1; part > 0 && probe < kParts; ++probe) {
+  for (std::int32_t probe = 1; part > 0 && probe < kFirstStepParts; ++probe) {
     first += part * static_cast<std::int32_t>(is_less(probe * part - 1));
   }
-  const std::int32_t rest = length - (kParts - 1) * part;
+  const std::int32_t rest = length - (kFirstStepParts - 1) * part;
   return first + count_less(rest, [&](std::int32_t i) { return is_less(first + i); });
 }
 
