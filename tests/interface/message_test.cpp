@@ -67,6 +67,8 @@ TEST(MessageTest, SentencesUseTheTextsOfTheirFailureOnly) {
       {PF_RANGE, {"900", ""}, "900 is out of range"},
       {PF_RANGE, {"900", "Thrust"}, "'Thrust': 900 is out of range"},
       {PF_BADARG, {"1\t2\x7F", "integer"}, "'1\\t2\\x7f' is not a number of type integer"},
+      {PF_BADARG, {"\r", "short"}, "'\\r' is not a number of type short"},
+      {PF_BADARG, {"x", "real"}, "'x' is not a number of type real"},
       {PF_BADARG, {"Thrust", ""}, "an argument is invalid"},
       {PF_BADPOS, {"-1", "3"}, "position -1 is out of range; the number of entries is 3"},
       {PF_BADPOS, {"Thrust", ""}, "the position is out of range"},

@@ -306,10 +306,29 @@ TEST_F(TableRules, WithoutRowsAndColumns) {
   EXPECT_EQ(pointer, nullptr);
   EXPECT_EQ(TEV8R1_convert_row("t", -5), -5);
   EXPECT_EQ(TEV8R1_convert_row("other", 3), -1);
-  define({col("a", kInt)});
+  expect_answer(TEV8R1_get_cur_row_ptr(&table(), &pointer, &number), PF_NOCURROW, kEmpty);
+  define({indexed(col("a", kInt))});
+  expect_answer(TEV8R1_create_index(&table(), &column(0)), PF_NORMAL, kUntouched);
+  EXPECT_EQ(table().row_wid, 4);
+  expect_answer(TEV8R1_adjust_data(&table(), 4, 4, 0, &column(0).def), PF_NORMAL, kUntouched);
+  EXPECT_EQ(table().row_wid, 4);
   expect_answer(TEV8R1_PF_get_value("t", "x", &value, &value), PF_NOTFOUND, kEmpty);
   EXPECT_EQ(add({"7"}), PF_NORMAL);
   expect_answer(TEV8R1_PF_get_value("t", "x", &value, &number), PF_NOCOLUMN, {"x", ""});
+  expect_answer(TEV8R1_PF_move_row("t", 0, 0), PF_BADPOS, {"0", "1"});
+}
+
+// Equal values of a column that need not be unique are no fault until somebody asks.
+TEST_F(TableRules, EqualValuesAreFoundInAnIndexOnly) {
+  define({indexed(col("a", kInt)), col("b", kInt)});
+  const auto ask = [&](int i) { return TEV8R1_check_unique_values(&table(), &column(i)); };
+  ASSERT_OK(add({"7", "1"}));
+  expect_answer(ask(0), PF_NORMAL, kUntouched);
+  ASSERT_OK(add({"8", "1"}));
+  expect_answer(ask(0), PF_NORMAL, kUntouched);
+  ASSERT_OK(add({"7", "1"}));
+  expect_answer(ask(0), PF_NOTUNIQUE, kEmpty);
+  expect_answer(ask(1), PF_NORMAL, kUntouched);
 }
 
 TEST_F(TableRules, SearchKeysChangeNoAnswer) {
