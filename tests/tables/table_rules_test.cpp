@@ -1,6 +1,9 @@
 // Single rules of tables that random sequences do not reach: refused definitions, formats, tolerances
 // and values that are no numbers, the probes of a search, stored patterns, and limits of counts.
+#include <algorithm>
 #include <limits>
+#include <numeric>
+#include <random>
 
 #include "support/table_fixture.h"
 #include "tables/columns.h"
@@ -292,6 +295,31 @@ TEST_F(TableRules, AnIndexBuiltIsOrderedExactly) {
     ASSERT_OK(add({text}));
   ASSERT_OK(redefine("text", indexed(col("text", kText, 20))));
   EXPECT_EQ(order(0), (std::vector{4, 1, 5, 2, 0, 3}));
+}
+
+TEST_F(TableRules, ARowLeavesAnIndexOfAnyLength) {
+  std::mt19937 random(4);
+  for (const std::int32_t count : {1, 2, 63, 64, 65, 129, 200}) {
+    std::vector<std::int32_t> index(static_cast<std::size_t>(count));
+    std::iota(index.begin(), index.end(), 0);
+    std::shuffle(index.begin(), index.end(), random);
+    for (std::int32_t row = 0; row <= count; ++row) {  // the last one is not in it
+      SCOPED_TRACE(testing::Message() << row << " of " << count);
+      std::vector<std::int32_t> some = index, expected;
+      for (const std::int32_t entry : index)
+        if (entry != row) expected.push_back(entry - (entry > row ? 1 : 0));
+      EXPECT_EQ(TEV8R1_remove_index(some.data(), row, count), PF_NORMAL);
+      some.resize(expected.size());
+      ASSERT_EQ(some, expected);
+
+      some.push_back(-1);
+      expected.insert(expected.begin() + std::min(row, count - 1), row);
+      EXPECT_EQ(TEV8R1_insert_index_value(some.data(), static_cast<std::int32_t>(some.size()) - 1,
+                                          std::min(row, count - 1), row),
+                PF_NORMAL);
+      ASSERT_EQ(some, expected);
+    }
+  }
 }
 
 TEST_F(TableRules, WithoutRowsAndColumns) {
