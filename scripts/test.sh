@@ -23,7 +23,7 @@ declare -A packages=([dev]="test python" [asan]="test python" [x86]="test x86" [
 # Said in both cases, because a build folder remembers what it was told.
 declare -A options=([dev]="-DTEVPF_BUILD_PYTHON=ON -DTEVPF_BUILD_ONCE=ON"
   [asan]="-DTEVPF_BUILD_TOOL=$all -DTEVPF_BUILD_PYTHON=$all -DTEVPF_BUILD_EXAMPLES=$all"
-  [x86]=-DTEVPF_BUILD_TOOL=$all [mingw]=-DTEVPF_BUILD_TOOL=$all)
+  [x86]="-DTEVPF_BUILD_TOOL=$all -DTEVPF_BUILD_EXAMPLES=$all" [mingw]=-DTEVPF_BUILD_TOOL=$all)
 # For a compiler cache to keep what is compiled with precompiled headers.
 export CCACHE_SLOPPINESS=${CCACHE_SLOPPINESS:-pch_defines,time_macros}
 groups=(build tool)

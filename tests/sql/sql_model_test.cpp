@@ -207,6 +207,7 @@ TEST_F(SqlNamesTest, EveryElementAndColumnIsReachedWhateverItsName) {
   EXPECT_EQ(columns.text(0) + columns.text(1) + columns.text(2), "1010100");
 }
 
-INSTANTIATE_TEST_SUITE_P(Seeds, SqlModelTest, testing::Range(1U, 9U));
+INSTANTIATE_TEST_SUITE_P(Seeds, SqlModelTest,
+                         testing::Range(TEVPF_FIRST_SEED, 9u, TEVPF_SEED_STEP));
 
 }  // namespace

@@ -718,7 +718,8 @@ TEST_P(TableModelTest, RandomSequencesEqualAPlainModel) {
   }
 }
 
-INSTANTIATE_TEST_SUITE_P(Seeds, TableModelTest, testing::Range(1u, 21u));
+INSTANTIATE_TEST_SUITE_P(Seeds, TableModelTest,
+                         testing::Range(TEVPF_FIRST_SEED, 21u, TEVPF_SEED_STEP));
 
 }  // namespace
 }  // namespace tevpf
