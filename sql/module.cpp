@@ -26,9 +26,8 @@ struct Link : sqlite3_vtab {
   // SQLite ends the transaction of CREATE VIRTUAL TABLE here as well, but does not begin it: what is
   // done with a table that is as new as this is noted by itself.
   bool is_new = false;
-  bool writes = false;  // takes part in the file's transaction
-  bool reads_until_end =
-      false;  // new, and read: what was read must not change before it is written
+  bool writes = false;           // takes part in the file's transaction
+  bool reads_until_end = false;  // new, and read: what was read stays until it is written
 
   // The relation as it is now, after the file may have been read again.
   Relation& current() {
