@@ -189,6 +189,7 @@ class Sources {
 
   void add(const std::string& path, const std::string& schema) {
     for (const Source& other : sources_) {
+      refuse_same_file(other.file.name(), path);
       if (other.schema == schema) {
         throw Failure(kRefused, visible(path) + ": two files have the name " + in_quotes(schema) +
                                     " in SQL; rename or link one of them");
