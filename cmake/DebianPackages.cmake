@@ -1,7 +1,9 @@
 # Run by CPack: makes Debian's packages with debhelper, from what cmake/Package.cmake wrote.
 set(folder "${CPACK_TEVPF_DEBIAN_FOLDER}")
 file(GLOB old "${folder}/*.deb")
-file(REMOVE ${old})
+if(old)
+  file(REMOVE ${old})
+endif()
 # debhelper gives the compiler another home folder.
 find_program(ccache ccache)
 if(ccache)
